@@ -1,0 +1,72 @@
+# What every target of this project shares, and the three kinds of target that it has: rooms, tests, programs.
+
+set(CMAKE_CXX_STANDARD 20)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/bin")
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/bin")
+set(CMAKE_ARCHIVE_OUTPUT_DIRECTORY "${CMAKE_BINARY_DIR}/lib")
+set(CMAKE_BUILD_RPATH "$ORIGIN")
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+
+find_program(CCACHE ccache)
+if(CCACHE)
+    set(CMAKE_CXX_COMPILER_LAUNCHER "${CCACHE}")
+endif()
+
+add_library(GraphPlotsOptions INTERFACE)
+target_compile_options(GraphPlotsOptions INTERFACE
+    -Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast -Werror)
+if(GRAPHPLOTS_SANITIZE)
+    target_compile_options(GraphPlotsOptions INTERFACE
+        -fsanitize=${GRAPHPLOTS_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
+    target_link_options(GraphPlotsOptions INTERFACE -fsanitize=${GRAPHPLOTS_SANITIZE})
+endif()
+
+# Adds the folders of one root ("src" or "host"), each a room with a CMakeLists.txt of its own.
+function(graphplots_add_rooms root)
+    foreach(room IN LISTS ARGN)
+        add_subdirectory(${root}/${room})
+    endforeach()
+endfunction()
+
+# graphplots_room(Name [SHARED|INTERFACE] SOURCES ... LINKS ... [PRIVATE_LINKS ...] [QT])
+# One folder, one library. Includes are written "Folder/Class.h" from the root that holds the folder.
+function(graphplots_room name)
+    cmake_parse_arguments(ROOM "SHARED;INTERFACE;QT" "" "SOURCES;LINKS;PRIVATE_LINKS" ${ARGN})
+    get_filename_component(root "${CMAKE_CURRENT_SOURCE_DIR}/.." ABSOLUTE)
+    if(ROOM_INTERFACE)
+        add_library(${name} INTERFACE)
+        target_include_directories(${name} INTERFACE "${root}")
+        target_link_libraries(${name} INTERFACE ${ROOM_LINKS})
+        return()
+    endif()
+    if(ROOM_SHARED)
+        add_library(${name} SHARED ${ROOM_SOURCES})
+    else()
+        add_library(${name} STATIC ${ROOM_SOURCES})
+    endif()
+    target_include_directories(${name} PUBLIC "${root}")
+    target_link_libraries(${name} PUBLIC ${ROOM_LINKS} PRIVATE GraphPlotsOptions ${ROOM_PRIVATE_LINKS})
+    if(ROOM_QT)
+        set_target_properties(${name} PROPERTIES AUTOMOC ON AUTORCC ON)
+        target_compile_definitions(${name} PRIVATE QT_NO_KEYWORDS QT_NO_CAST_TO_ASCII)
+    endif()
+endfunction()
+
+# graphplots_test(Name SOURCES ... LINKS ... [QT]): one executable a mirrored folder, its cases known to CTest.
+function(graphplots_test name)
+    cmake_parse_arguments(TEST "QT" "" "SOURCES;LINKS" ${ARGN})
+    add_executable(${name} ${TEST_SOURCES})
+    target_link_libraries(${name} PRIVATE GraphPlotsOptions TestSupport ${TEST_LINKS})
+    if(TEST_QT)
+        set_target_properties(${name} PROPERTIES AUTOMOC ON)
+        target_compile_definitions(${name} PRIVATE QT_NO_KEYWORDS)
+        target_link_libraries(${name} PRIVATE TestSupportQt)
+    else()
+        target_link_libraries(${name} PRIVATE GTest::gtest_main)
+    endif()
+    gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST PROPERTIES TIMEOUT 300
+        ENVIRONMENT "GRAPHPLOTS_TEST_DATA=${GRAPHPLOTS_TEST_DATA}")
+endfunction()

@@ -1,0 +1,52 @@
+#pragma once
+
+#include "ChannelSystem/IChannelBlock.h"
+#include "Channels/VRotationUnwrapper.h"
+#include "Channels/VSampleStore.h"
+
+#include <cstdint>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <span>
+#include <vector>
+
+namespace Channels
+{
+
+struct BlockWindow;
+
+/// Copies the samples of an input block into a store of its own as they come, with rotations made continuous. Keeps at
+/// least the window that it was given; when the window grows it fetches what the input still has of the time before.
+/// A channel's block asks it to catch up, on the reader's thread. Thread-safe.
+class VCacheFeed
+{
+public:
+    /// i_pWindow null: everything that the input has.
+    VCacheFeed(std::shared_ptr<ChannelSystem::IChannelBlock> i_pInput, std::optional<RotationPart> i_Rotation,
+               std::shared_ptr<const BlockWindow> i_pWindow);
+
+    const std::shared_ptr<VSampleStore>& GetSamples() const { return m_pSamples; }
+
+    void CatchUp();
+
+private:
+    void StartLocked(std::int64_t i_Tick);
+    void AppendLocked(const TQL::TickRange& i_rRange);
+    void PrependLocked(const TQL::TickRange& i_rRange);
+    bool ReadLocked(const TQL::TickRange& i_rRange);
+    VRotationUnwrapper BackwardsUnwrapperLocked() const;
+
+    const std::shared_ptr<ChannelSystem::IChannelBlock> m_pInput;
+    const std::optional<RotationPart> m_Rotation;
+    const std::shared_ptr<const BlockWindow> m_pWindow;
+    const std::int64_t m_Period;
+    const std::size_t m_Components;
+    const std::shared_ptr<VSampleStore> m_pSamples;
+    std::mutex m_Mutex;
+    std::vector<float> m_Scratch;                  // guarded by m_Mutex
+    std::optional<VRotationUnwrapper> m_Unwrapper; // guarded by m_Mutex
+    bool m_bStarted = false;                       // guarded by m_Mutex
+};
+
+} // namespace Channels

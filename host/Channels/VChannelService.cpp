@@ -1,0 +1,194 @@
+#include "Channels/VChannelService.h"
+
+#include "Channels/VCacheChannel.h"
+#include "TQL/HashMix.h"
+
+#include <algorithm>
+#include <mutex>
+#include <set>
+#include <utility>
+
+namespace Channels
+{
+
+namespace
+{
+
+std::uint64_t HashId(const TQL::IChannelInstanceId& i_rId)
+{
+    std::uint64_t hash = TQL::HashMix(0, TQL::HashText(i_rId.DataContextName));
+    hash = TQL::HashMix(hash, TQL::HashText(i_rId.TypeName));
+    hash = TQL::HashMix(hash, i_rId.First);
+    hash = TQL::HashMix(hash, i_rId.Second);
+    return TQL::HashMix(hash, TQL::HashText(i_rId.Text));
+}
+
+/// The id of a derived channel: the same in every run for the same operation on the same inputs.
+TQL::IChannelInstanceId MakeDerivedId(std::string_view i_Operation, std::uint64_t i_RecordHash,
+                                      const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs,
+                                      std::string i_DisplayName)
+{
+    std::uint64_t hash = 0;
+    for (const std::shared_ptr<TQL::IChannel>& rpInput : i_rInputs)
+        hash = TQL::HashMix(hash, HashId(rpInput->GetInstanceId()));
+    return {i_rInputs.front()->GetInstanceId().DataContextName, std::string(i_Operation), i_RecordHash, hash,
+            std::move(i_DisplayName)};
+}
+
+std::string TypeDisplayNameOf(const TQL::IChannel& i_rChannel)
+{
+    TQL::ParameterValue value;
+    if (i_rChannel.GetParameters()->Read("", "TypeDisplayName", value).IsError())
+        return {};
+    const std::string* pText = std::get_if<std::string>(&value);
+    return pText ? *pText : std::string();
+}
+
+} // namespace
+
+VChannelService::VChannelService()
+    : m_pSubTypes(std::make_shared<VSubTypeTable>())
+    , m_pContextListChanged(std::make_shared<NotificationSystem::VChangeSignal>())
+    , m_pTypeListChanged(std::make_shared<NotificationSystem::VChangeSignal>())
+{
+}
+
+void VChannelService::AddContext(std::shared_ptr<VChannelContext> i_pContext)
+{
+    std::shared_ptr<VChannelContext> pOld;
+    {
+        const std::unique_lock lock(m_Mutex);
+        std::shared_ptr<VChannelContext>& rpPlace = m_Contexts[i_pContext->GetName()];
+        pOld = std::exchange(rpPlace, i_pContext);
+    }
+    if (pOld && pOld != i_pContext)
+        pOld->Retire();
+    m_pContextListChanged->Invoke();
+    m_pTypeListChanged->Invoke();
+}
+
+TQL::IResult VChannelService::RemoveContext(std::string_view i_Name)
+{
+    std::shared_ptr<VChannelContext> pOld;
+    {
+        const std::unique_lock lock(m_Mutex);
+        const auto context = m_Contexts.find(i_Name);
+        if (context == m_Contexts.end())
+            return TQL::Result::NotFound;
+        pOld = std::move(context->second);
+        m_Contexts.erase(context);
+    }
+    pOld->Retire();
+    m_pContextListChanged->Invoke();
+    m_pTypeListChanged->Invoke();
+    return TQL::Result::Ok;
+}
+
+std::vector<std::shared_ptr<VChannelContext>> VChannelService::GetContexts() const
+{
+    const std::shared_lock lock(m_Mutex);
+    std::vector<std::shared_ptr<VChannelContext>> contexts;
+    for (const auto& [name, pContext] : m_Contexts)
+        contexts.push_back(pContext);
+    return contexts;
+}
+
+std::shared_ptr<VChannelContext> VChannelService::FindContext(std::string_view i_Name) const
+{
+    const std::shared_lock lock(m_Mutex);
+    const auto context = m_Contexts.find(i_Name);
+    return context == m_Contexts.end() ? nullptr : context->second;
+}
+
+std::shared_ptr<ChannelSystem::IChannelContext> VChannelService::GetContextByName(std::string_view i_Name) const
+{
+    return FindContext(i_Name);
+}
+
+std::vector<std::string> VChannelService::GetChannelTypes(std::uint64_t i_Mask, std::string_view i_Context) const
+{
+    std::set<std::string, std::less<>> present;
+    for (const std::shared_ptr<VChannelContext>& rpContext : GetContexts())
+    {
+        if (!i_Context.empty() && rpContext->GetName() != i_Context)
+            continue;
+        const std::shared_ptr<const VChannelContext::ChannelList> pChannels = rpContext->GetChannels();
+        for (const std::shared_ptr<VSourceChannel>& rpChannel : *pChannels)
+            present.insert(rpChannel->GetInstanceId().TypeName);
+    }
+    std::vector<std::string> types;
+    for (const ChannelType& rType : GetChannelTypeTable())
+        if ((rType.Flags & i_Mask) == 0 && present.contains(rType.Name))
+            types.emplace_back(rType.Name);
+    return types;
+}
+
+std::shared_ptr<TQL::IChannelParameters> VChannelService::GetTypeParameters(std::string_view i_TypeName) const
+{
+    const ChannelType* pType = FindChannelType(i_TypeName);
+    if (!pType)
+        return nullptr;
+    auto pParameters = std::make_shared<VChannelParameters>();
+    DefineTypeParameters(*pType, *pParameters);
+    return pParameters;
+}
+
+std::shared_ptr<TQL::IChannel>
+VChannelService::CreateDerivedChannel(std::string_view i_Operation,
+                                      const ChannelSystem::VDerivedChannelParameters& i_rParameters,
+                                      const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs)
+{
+    if (i_Operation != VCacheChannel::Operation || i_rInputs.size() != 1 || !i_rInputs.front())
+        return nullptr;
+    const std::shared_ptr<TQL::IChannel>& rpInput = i_rInputs.front();
+    const auto pContext = FindContext(rpInput->GetInstanceId().DataContextName);
+    const bool bKeepAll = !pContext || pContext->GetType() != ChannelSystem::EContextType::Live;
+    auto id = MakeDerivedId(i_Operation, i_rParameters.Hash, i_rInputs, TypeDisplayNameOf(*rpInput));
+    const auto pChannel = std::make_shared<VCacheChannel>(std::move(id), rpInput, bKeepAll);
+    pChannel->ConnectParameters();
+    RememberDerived(pChannel);
+    return pChannel;
+}
+
+/// Makes the channel known to GetChannel while it lives.
+void VChannelService::RememberDerived(const std::shared_ptr<TQL::IChannel>& i_rpChannel)
+{
+    const std::unique_lock lock(m_Mutex);
+    m_Derived.emplace(i_rpChannel->GetInstanceId(), i_rpChannel);
+    if (m_Derived.size() < m_PruneAt)
+        return;
+    std::erase_if(m_Derived, [](const auto& i_rEntry) { return i_rEntry.second.expired(); });
+    m_PruneAt = std::max<std::size_t>(64, 2 * m_Derived.size());
+}
+
+std::shared_ptr<TQL::IChannel> VChannelService::GetChannel(const TQL::IChannelInstanceId& i_rId) const
+{
+    const std::shared_lock lock(m_Mutex);
+    if (const auto context = m_Contexts.find(i_rId.DataContextName); context != m_Contexts.end())
+        if (auto pChannel = context->second->FindChannel(i_rId))
+            return pChannel;
+    const auto [first, end] = m_Derived.equal_range(i_rId);
+    for (auto entry = first; entry != end; ++entry)
+        if (auto pChannel = entry->second.lock())
+            return pChannel;
+    return nullptr;
+}
+
+void VChannelService::SetSelectionManager(std::shared_ptr<TQL::IChannelSelectionManager> i_pSelectionManager)
+{
+    const std::unique_lock lock(m_Mutex);
+    m_pSelectionManager = std::move(i_pSelectionManager);
+}
+
+std::shared_ptr<TQL::IChannelSelectionManager> VChannelService::GetSelectionManager() const
+{
+    const std::shared_lock lock(m_Mutex);
+    return m_pSelectionManager;
+}
+
+TQL::IResult VChannelService::GetSubTypeTable(std::uint16_t i_SubTypeId, TQL::SubTypeRecord& o_rRecord) const
+{
+    return m_pSubTypes->Find(i_SubTypeId, o_rRecord);
+}
+
+} // namespace Channels

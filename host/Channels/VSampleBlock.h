@@ -1,0 +1,57 @@
+#pragma once
+
+#include "ChannelSystem/IChannelBlock.h"
+#include "Channels/VSampleStore.h"
+
+#include <atomic>
+#include <cstdint>
+#include <memory>
+
+namespace Channels
+{
+
+class VCacheFeed;
+
+/// How much of the newest samples a block shows; set by a parameter of the channel while others read.
+struct BlockWindow
+{
+    std::atomic<std::int64_t> Ticks{0}; ///< 0: everything
+};
+
+/// A store as the readers of a channel see it: all of it, or the newest part that a window asks for. What GetRange has
+/// reported can be read until it is asked again, although the window moves on with every sample. Any thread.
+class VSampleBlock : public ChannelSystem::IChannelBlock
+{
+public:
+    /// i_Levels is from 1 to VSummaryPyramid::LevelCount; above 1 the store has to keep summaries. i_pWindow and
+    /// i_pFeed may be null; a feed is asked to catch up before a range is reported.
+    VSampleBlock(std::shared_ptr<VSampleStore> i_pSamples, std::uint32_t i_Levels,
+                 std::shared_ptr<const BlockWindow> i_pWindow = nullptr, std::shared_ptr<VCacheFeed> i_pFeed = nullptr);
+
+    const std::shared_ptr<VSampleStore>& GetSamples() const { return m_pSamples; }
+    bool ShowsAll() const { return m_pWindow == nullptr; }
+
+    // IChannelBlock
+    const ChannelSystem::ChannelBlockShape& GetShape() const override { return m_Shape; }
+    const std::shared_ptr<ChannelSystem::IChannelStore>& GetStore() const override { return m_pStore; }
+    void GetRange(TQL::TickRange& o_rRange) const override;
+    TQL::IResult ReadSamples(const TQL::TickRange& i_rRange, std::span<float> o_Samples,
+                             std::uint32_t i_Flag = 0) const override;
+    std::size_t ReadSummary(const TQL::TickRange& i_rRange, std::uint32_t i_Level, std::span<LodRecord> o_Records,
+                            std::uint32_t i_Flag = 1) const override;
+    TQL::IResult ReadComponent(const TQL::TickRange& i_rRange, std::span<float> o_Samples, std::uint32_t i_Component,
+                               std::uint32_t i_Flag = 0) const override;
+    TQL::IResult Summarise(const TQL::TickRange& i_rRange, std::span<LodRecord> o_Records) const override;
+
+private:
+    std::int64_t Floor() const;
+
+    const std::shared_ptr<VSampleStore> m_pSamples;
+    const std::shared_ptr<ChannelSystem::IChannelStore> m_pStore; // the same object
+    const std::shared_ptr<const BlockWindow> m_pWindow;
+    const std::shared_ptr<VCacheFeed> m_pFeed;
+    ChannelSystem::ChannelBlockShape m_Shape;
+    mutable std::atomic<std::int64_t> m_ReportedFirst;
+};
+
+} // namespace Channels

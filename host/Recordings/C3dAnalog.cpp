@@ -1,0 +1,116 @@
+#include "Recordings/C3dSamples.h"
+
+#include "Recordings/C3dText.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstdint>
+#include <utility>
+
+namespace Recordings
+{
+
+namespace
+{
+
+struct Calibration
+{
+    double Offset = 0.0;
+    double Scale = 1.0;
+};
+
+// Whether integers of the analog section, and the offsets with them, count from 0 to 65535. Files that do not say so
+// tell it by a 16-bit converter whose zero is the middle of that range.
+bool IsUnsigned(const VC3dParameters& i_rParameters, std::size_t i_Channels)
+{
+    const std::string format = C3dCapitals(i_rParameters.Text("ANALOG", "FORMAT"));
+    if (!format.empty())
+        return format.starts_with("UNSIGNED");
+    if (i_rParameters.Number("ANALOG", "BITS").value_or(0.0) != 16.0)
+        return false;
+    const auto offsets = i_rParameters.Numbers("ANALOG", "OFFSET", i_Channels, EWordKind::Unsigned);
+    return std::any_of(offsets.begin(), offsets.end(),
+                       [](double i_Offset) { return i_Offset == 32767.0 || i_Offset == 32768.0; });
+}
+
+std::vector<Calibration> ReadCalibrations(const VC3dParameters& i_rParameters, std::size_t i_Channels,
+                                          EWordKind i_Integers, std::vector<std::string>& o_rWarnings)
+{
+    const double general = i_rParameters.Number("ANALOG", "GEN_SCALE").value_or(1.0);
+    const std::vector<double> scales = i_rParameters.Numbers("ANALOG", "SCALE", i_Channels);
+    const std::vector<double> offsets = i_rParameters.Numbers("ANALOG", "OFFSET", i_Channels, i_Integers);
+    if (scales.size() < i_Channels)
+        o_rWarnings.push_back("The file gives a scale for " + std::to_string(scales.size()) + " of " +
+                              std::to_string(i_Channels) + " analog channels; the others are shown as stored.");
+    std::vector<Calibration> calibrations(i_Channels);
+    for (std::size_t i = 0; i < i_Channels; ++i)
+    {
+        calibrations[i].Scale = (i < scales.size() ? scales[i] : 1.0) * general;
+        calibrations[i].Offset = i < offsets.size() ? offsets[i] : 0.0;
+    }
+    return calibrations;
+}
+
+RecordedChannel MakeAnalog(std::string i_Label, const C3dLayout& i_rLayout, const VRecording& i_rRecording)
+{
+    const auto perFrame = static_cast<std::int64_t>(i_rLayout.AnalogSamplesPerFrame);
+    RecordedChannel channel;
+    channel.Kind = EChannelKind::Analog;
+    channel.Name = std::move(i_Label);
+    channel.ComponentNames = {""};
+    channel.Rate = i_rLayout.Rate * static_cast<double>(perFrame);
+    channel.SamplePeriod =
+        i_rRecording.FramePeriod % perFrame == 0 ? i_rRecording.FramePeriod / perFrame : PeriodOfRate(channel.Rate);
+    channel.FirstTick = i_rRecording.Range.First;
+    channel.Samples.resize(i_rLayout.Frames * i_rLayout.AnalogSamplesPerFrame);
+    return channel;
+}
+
+void AddChannels(const C3dSource& i_rSource, VRecording& io_rRecording)
+{
+    const std::size_t count = i_rSource.Layout.AnalogChannels;
+    const std::vector<std::string> units = i_rSource.Parameters.Texts("ANALOG", "UNITS", count);
+    std::vector<std::string> labels =
+        UniqueLabels(i_rSource.Parameters.Texts("ANALOG", "LABELS", count), count, "Analog");
+    for (std::size_t i = 0; i < count; ++i)
+    {
+        io_rRecording.Channels.push_back(MakeAnalog(std::move(labels[i]), i_rSource.Layout, io_rRecording));
+        io_rRecording.Channels.back().Units = i < units.size() ? units[i] : std::string();
+    }
+}
+
+} // namespace
+
+void AddC3dAnalog(const C3dSource& i_rSource, VRecording& io_rRecording)
+{
+    const C3dLayout& rLayout = i_rSource.Layout;
+    const std::size_t count = rLayout.AnalogChannels;
+    if (count == 0 || rLayout.AnalogSamplesPerFrame == 0)
+        return;
+    const std::size_t firstChannel = io_rRecording.Channels.size();
+    AddChannels(i_rSource, io_rRecording);
+
+    const EWordKind integers = IsUnsigned(i_rSource.Parameters, count) ? EWordKind::Unsigned : EWordKind::Signed;
+    const EWordKind kind = rLayout.bReal ? EWordKind::Real : integers;
+    const std::vector<Calibration> calibrations =
+        ReadCalibrations(i_rSource.Parameters, count, integers, io_rRecording.Warnings);
+    std::vector<float*> samples; // of each channel
+    for (std::size_t i = 0; i < count; ++i)
+        samples.push_back(io_rRecording.Channels[firstChannel + i].Samples.data());
+    std::vector<float> words(count * rLayout.AnalogSamplesPerFrame);
+    for (std::size_t frame = 0; frame < rLayout.Frames; ++frame)
+    {
+        const std::size_t place =
+            rLayout.DataOffset + frame * rLayout.FrameBytes() + rLayout.Points * 4 * rLayout.WordBytes();
+        i_rSource.Header.Decoder.Decode(kind, i_rSource.File.subspan(place, words.size() * rLayout.WordBytes()), words);
+        for (std::size_t i = 0; i < words.size(); ++i)
+        {
+            const std::size_t channel = i % count;
+            const double raw = static_cast<double>(words[i]);
+            const double value = (raw - calibrations[channel].Offset) * calibrations[channel].Scale;
+            *samples[channel]++ = static_cast<float>(value);
+        }
+    }
+}
+
+} // namespace Recordings

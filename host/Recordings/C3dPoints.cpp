@@ -1,0 +1,90 @@
+#include "Recordings/C3dSamples.h"
+
+#include "Recordings/C3dText.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <limits>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace Recordings
+{
+
+namespace
+{
+
+constexpr std::size_t WordsPerPoint = 4;
+constexpr std::size_t ComponentsPerPoint = 3;
+
+// The fourth word holds the camera mask in its high byte and the residual in the low one, also where it is stored as a
+// real; the sign bit of the two together says that the point is invalid.
+bool IsMissing(float i_FourthWord)
+{
+    if (i_FourthWord < 0.0f)
+        return true;
+    return i_FourthWord >= 32768.0f && i_FourthWord < 65536.0f;
+}
+
+void WritePoint(const float* i_pWords, double i_Scale, float* o_pSample)
+{
+    if (IsMissing(i_pWords[3]))
+    {
+        std::fill_n(o_pSample, ComponentsPerPoint, std::numeric_limits<float>::quiet_NaN());
+        return;
+    }
+    for (std::size_t i = 0; i < ComponentsPerPoint; ++i)
+        o_pSample[i] = static_cast<float>(static_cast<double>(i_pWords[i]) * i_Scale);
+}
+
+RecordedChannel MakeMarker(std::string i_Label, const C3dLayout& i_rLayout, const VRecording& i_rRecording)
+{
+    RecordedChannel channel;
+    channel.Kind = EChannelKind::Marker;
+    channel.Subject = SubjectOfLabel(i_Label);
+    channel.Name = std::move(i_Label);
+    channel.ComponentNames = {"X", "Y", "Z"};
+    channel.Rate = i_rLayout.Rate;
+    channel.SamplePeriod = i_rRecording.FramePeriod;
+    channel.FirstTick = i_rRecording.Range.First;
+    channel.Samples.resize(i_rLayout.Frames * ComponentsPerPoint);
+    return channel;
+}
+
+} // namespace
+
+void AddC3dPoints(const C3dSource& i_rSource, VRecording& io_rRecording)
+{
+    const C3dLayout& rLayout = i_rSource.Layout;
+    const std::size_t firstChannel = io_rRecording.Channels.size();
+    const std::string units = i_rSource.Parameters.Text("POINT", "UNITS");
+    for (std::string& rLabel :
+         UniqueLabels(i_rSource.Parameters.Texts("POINT", "LABELS", rLayout.Points), rLayout.Points, "Point"))
+    {
+        io_rRecording.Channels.push_back(MakeMarker(std::move(rLabel), rLayout, io_rRecording));
+        io_rRecording.Channels.back().Units = units;
+    }
+
+    std::vector<float*> samples; // of each point
+    for (std::size_t point = 0; point < rLayout.Points; ++point)
+        samples.push_back(io_rRecording.Channels[firstChannel + point].Samples.data());
+    const EWordKind kind = rLayout.bReal ? EWordKind::Real : EWordKind::Signed;
+    const double scale = rLayout.bReal ? 1.0 : rLayout.PointScale;
+    std::vector<float> words(rLayout.Points * WordsPerPoint);
+    for (std::size_t frame = 0; frame < rLayout.Frames; ++frame)
+    {
+        const auto bytes = i_rSource.File.subspan(rLayout.DataOffset + frame * rLayout.FrameBytes(),
+                                                  words.size() * rLayout.WordBytes());
+        i_rSource.Header.Decoder.Decode(kind, bytes, words);
+        const float* pWords = words.data();
+        for (float*& rpSample : samples)
+        {
+            WritePoint(pWords, scale, rpSample);
+            pWords += WordsPerPoint;
+            rpSample += ComponentsPerPoint;
+        }
+    }
+}
+
+} // namespace Recordings

@@ -1,0 +1,100 @@
+#include "Services/VSelectionSource.h"
+
+#include <algorithm>
+
+namespace Services
+{
+namespace
+{
+
+class VSelection : public TQL::ISelection
+{
+public:
+    explicit VSelection(std::vector<TQL::SelectionItem> i_Items) : m_Items(std::move(i_Items)) {}
+
+    std::vector<TQL::SelectionItem> Items(TQL::ESelectionKind i_Kind) const override
+    {
+        std::vector<TQL::SelectionItem> items;
+        std::ranges::copy_if(m_Items, std::back_inserter(items),
+                             [i_Kind](const TQL::SelectionItem& i_rItem) { return i_rItem.Kind == i_Kind; });
+        return items;
+    }
+
+private:
+    const std::vector<TQL::SelectionItem> m_Items;
+};
+
+void Append(std::vector<TQL::SelectionItem>& o_rItems, const std::vector<TQL::SelectionItem>& i_rAdded)
+{
+    for (const TQL::SelectionItem& rItem : i_rAdded)
+        if (std::ranges::find(o_rItems, rItem) == o_rItems.end())
+            o_rItems.push_back(rItem);
+}
+
+} // namespace
+
+VSelectionSource::VSelectionSource(ThreadCheckPointer i_pCheck)
+    : m_pCheck(std::move(i_pCheck))
+    , m_pChanged(std::make_shared<NotificationSystem::VMultiCallbackPostal<void(bool)>>())
+{
+}
+
+std::shared_ptr<const TQL::ISelection> VSelectionSource::GetSelection() const
+{
+    CheckUiThread(m_pCheck, "ISelectionSource::GetSelection");
+    return std::make_shared<const VSelection>(m_Items);
+}
+
+void VSelectionSource::Set(const std::vector<TQL::SelectionItem>& i_rItems)
+{
+    CheckUiThread(m_pCheck, "ISelectionSource::Set");
+    std::vector<TQL::SelectionItem> items;
+    Append(items, i_rItems);
+    Replace(std::move(items));
+}
+
+void VSelectionSource::Add(const std::vector<TQL::SelectionItem>& i_rItems)
+{
+    CheckUiThread(m_pCheck, "ISelectionSource::Add");
+    std::vector<TQL::SelectionItem> items = m_Items;
+    Append(items, i_rItems);
+    Replace(std::move(items));
+}
+
+std::uint64_t VSelectionSource::RootSegment(std::uint64_t i_Subject) const
+{
+    CheckUiThread(m_pCheck, "ISelectionSource::RootSegment");
+    return m_RootSegment ? m_RootSegment(i_Subject) : 0;
+}
+
+TQL::IResult VSelectionSource::GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const
+{
+    CheckUiThread(m_pCheck, "ISelectionSource::GetDevices");
+    o_rItems = m_Devices;
+    return TQL::Result::Ok;
+}
+
+void VSelectionSource::SetRootSegments(RootSegmentFunction i_Function)
+{
+    m_RootSegment = std::move(i_Function);
+}
+
+void VSelectionSource::SetDevices(std::vector<TQL::SelectionItem> i_Devices)
+{
+    m_Devices = std::move(i_Devices);
+}
+
+void VSelectionSource::RaiseForced()
+{
+    m_pChanged->Invoke(true);
+}
+
+void VSelectionSource::Replace(std::vector<TQL::SelectionItem> i_Items)
+{
+    if (m_Items == i_Items)
+        return;
+    m_Items = std::move(i_Items);
+    m_pChanged->Invoke(false);
+}
+
+} // namespace Services

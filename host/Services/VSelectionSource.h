@@ -1,0 +1,45 @@
+#pragma once
+
+#include "ChannelSystem/ISelectionSource.h"
+#include "NotificationSystem/VMultiCallbackPostal.h"
+#include "Services/VThreadCheck.h"
+
+#include <functional>
+#include <memory>
+#include <vector>
+
+namespace Services
+{
+
+/// What is selected in the host. Items are kept in the order in which they were selected, each once. Owned by the host
+/// services. UI thread; Changed is raised inside Set and Add, after the selection has changed.
+class VSelectionSource : public TQL::ISelectionSource
+{
+public:
+    using RootSegmentFunction = std::function<std::uint64_t(std::uint64_t)>;
+
+    explicit VSelectionSource(ThreadCheckPointer i_pCheck = nullptr);
+
+    std::shared_ptr<const TQL::ISelection> GetSelection() const override;
+    void Set(const std::vector<TQL::SelectionItem>& i_rItems) override; ///< an equal selection raises nothing
+    void Add(const std::vector<TQL::SelectionItem>& i_rItems) override;
+    std::shared_ptr<TQL::IMultiCallbackPostal<void(bool)>> Changed() const override { return m_pChanged; }
+    std::uint64_t RootSegment(std::uint64_t i_Subject) const override; ///< 0 until SetRootSegments
+    TQL::IResult GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const override;
+
+    void SetRootSegments(RootSegmentFunction i_Function);
+    void SetDevices(std::vector<TQL::SelectionItem> i_Devices);
+    /// Asks subscribers to look again though the selection is the same.
+    void RaiseForced();
+
+private:
+    void Replace(std::vector<TQL::SelectionItem> i_Items);
+
+    const ThreadCheckPointer m_pCheck;
+    const std::shared_ptr<NotificationSystem::VMultiCallbackPostal<void(bool)>> m_pChanged;
+    std::vector<TQL::SelectionItem> m_Items;
+    std::vector<TQL::SelectionItem> m_Devices;
+    RootSegmentFunction m_RootSegment;
+};
+
+} // namespace Services

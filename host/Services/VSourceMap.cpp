@@ -1,0 +1,67 @@
+#include "Services/VSourceMap.h"
+
+#include "Services/VTimeSource.h"
+
+namespace Services
+{
+
+using namespace OrvanePluginInterface;
+
+VSourceMap::VSourceMap(std::shared_ptr<TQL::IChangeSignal> i_pChanged, ThreadCheckPointer i_pCheck)
+    : m_pChanged(std::move(i_pChanged)), m_pCheck(std::move(i_pCheck))
+{
+}
+
+std::set<std::string> VSourceMap::GetNames() const
+{
+    CheckUiThread(m_pCheck, "ISourceMap::GetNames");
+    std::set<std::string> names;
+    for (const auto& [name, pSource] : Copy())
+        names.insert(name);
+    return names;
+}
+
+std::shared_ptr<ITimeSource> VSourceMap::Find(std::string_view i_Name) const
+{
+    CheckUiThread(m_pCheck, "ISourceMap::Find");
+    return FindSource(i_Name);
+}
+
+void VSourceMap::ForEach(
+    const std::function<void(const std::string&, const std::shared_ptr<ITimeSource>&)>& i_rVisit) const
+{
+    CheckUiThread(m_pCheck, "ISourceMap::ForEach");
+    for (const auto& [name, pSource] : Copy())
+        i_rVisit(name, pSource);
+}
+
+void VSourceMap::Insert(const std::string& i_rName, std::shared_ptr<VTimeSource> i_pSource)
+{
+    const std::lock_guard lock(m_Mutex);
+    m_Sources.insert_or_assign(i_rName, std::move(i_pSource));
+}
+
+bool VSourceMap::Erase(std::string_view i_Name)
+{
+    const std::lock_guard lock(m_Mutex);
+    const auto found = m_Sources.find(i_Name);
+    if (found == m_Sources.end())
+        return false;
+    m_Sources.erase(found);
+    return true;
+}
+
+std::shared_ptr<VTimeSource> VSourceMap::FindSource(std::string_view i_Name) const
+{
+    const std::lock_guard lock(m_Mutex);
+    const auto found = m_Sources.find(i_Name);
+    return found == m_Sources.end() ? nullptr : found->second;
+}
+
+VSourceMap::Sources VSourceMap::Copy() const
+{
+    const std::lock_guard lock(m_Mutex);
+    return m_Sources;
+}
+
+} // namespace Services

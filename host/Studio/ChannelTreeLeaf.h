@@ -1,0 +1,20 @@
+#pragma once
+
+#include "ChannelSystem/ISelectionSource.h"
+
+#include <QtCore/QString>
+#include <QtCore/QStringList>
+
+namespace Studio
+{
+
+/// One channel as the tree shows it: the branches above it from the top ("Walker1", "Markers"), its own text, and what
+/// is selected when it is ticked.
+struct ChannelTreeLeaf
+{
+    QStringList Branches;
+    QString Text;
+    TQL::SelectionItem Item;
+};
+
+} // namespace Studio

@@ -1,0 +1,53 @@
+#pragma once
+
+#include "TQL/IResult.h"
+
+#include <cstdint>
+#include <optional>
+#include <span>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace Studio
+{
+
+enum class ECommand
+{
+    Window,   ///< open the studio
+    Channels, ///< list the channels of a file
+    Export,   ///< write channels as a table
+    Snapshot, ///< write a picture of a Graph Plots window
+    Help
+};
+
+/// What the words after the program's name ask for. Paths are UTF-8, as given.
+struct CommandLine
+{
+    ECommand Command = ECommand::Window;
+    std::vector<std::string> Files;
+    bool bLive = false;
+    std::uint32_t Subjects = 2; ///< of the simulated capture
+    bool bJson = false;
+    std::string CsvPath;
+    std::string PicturePath;
+    std::vector<std::string> Patterns;               ///< of channel names; empty: the command's own choice
+    std::optional<std::pair<int, int>> Size;         ///< of the picture, pixels
+    std::optional<std::pair<double, double>> Range;  ///< of the time axis, frames
+    std::optional<std::pair<double, double>> Values; ///< of the value axes, in the channels' units
+    std::optional<int> AfterMilliseconds;            ///< to wait before the picture is taken
+    std::string ModulePath;                          ///< empty: the module beside the program
+    bool bCheck = false;                             ///< watch how the module keeps the rules of a host
+};
+
+inline constexpr std::uint32_t MostSubjects = 16;
+inline constexpr int LargestPicture = 16384; ///< pixels, width or height
+
+/// Reads the words after the program's name. On failure o_rError says in one line what is wrong and what to do.
+[[nodiscard]] TQL::IResult ParseCommandLine(std::span<const std::string> i_Words, CommandLine& o_rCommandLine,
+                                            std::string& o_rError);
+
+/// The text of --help, several lines.
+std::string HelpText();
+
+} // namespace Studio

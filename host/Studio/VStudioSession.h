@@ -1,0 +1,97 @@
+#pragma once
+
+#include "Recordings/VRecording.h"
+#include "Services/VHostServices.h"
+#include "TQL/IResult.h"
+
+#include <QtCore/QPointer>
+#include <QtWidgets/QWidget>
+
+#include <cstdint>
+#include <filesystem>
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+namespace Channels
+{
+class VChannelContext;
+class VChannelService;
+} // namespace Channels
+
+namespace Services
+{
+class VContextTimeFeed;
+class VPluginHost;
+} // namespace Services
+
+namespace Studio
+{
+
+class VLiveCapture;
+
+/// What the studio has open: the host's services, the recordings and the live capture as contexts with their times, and
+/// the module. It knows no windows; contents are made for whoever gives a frame. Made after the application object and
+/// destroyed before it, after all windows. UI thread.
+class VStudioSession
+{
+public:
+    struct Options
+    {
+        bool bCheck = false;       ///< watch how the module keeps the rules of its host
+        std::string UserDirectory; ///< UTF-8; empty: the desktop's
+    };
+
+    explicit VStudioSession(const Options& i_rOptions);
+    ~VStudioSession();
+    VStudioSession(const VStudioSession&) = delete;
+    VStudioSession& operator=(const VStudioSession&) = delete;
+
+    Services::VHostServices& Host() { return *m_pHost; }
+    Channels::VChannelService& Channels() { return *m_pChannels; }
+
+    /// Reads a recording and adds it. On failure o_rError is one line, and everything else stays as it was.
+    [[nodiscard]] TQL::IResult OpenFile(const std::filesystem::path& i_rPath, std::string& o_rContextName,
+                                        std::string& o_rError);
+
+    /// Adds a recording as a context and a time source in review mode; returns their name.
+    std::string AddRecording(Recordings::VRecording i_Recording);
+
+    /// Starts the simulated capture as the context "Live", in place of one that runs. The capture begins with
+    /// i_HistoryFrames frames behind it.
+    void StartLive(std::uint32_t i_Subjects, std::int64_t i_HistoryFrames = 0);
+    void StopLive(); ///< the context stays, with what it has
+    void SetLivePaused(bool i_bPaused);
+    bool IsLivePaused() const; ///< false when there is no capture
+
+    /// Makes a context the current one. False for an unknown name.
+    bool ShowContext(const std::string& i_rName);
+    std::string CurrentContextName() const; ///< empty when there is none
+    /// The context that is current, null when there is none.
+    std::shared_ptr<Channels::VChannelContext> CurrentContext() const;
+
+    /// Loads the module that makes the contents. The message is one line.
+    [[nodiscard]] TQL::IResult LoadModule(const std::filesystem::path& i_rPath, std::string& o_rError);
+
+    /// Makes a Graph Plots content as a child of the frame.
+    [[nodiscard]] TQL::IResult OpenContent(const QPointer<QWidget>& i_rpFrame, QPointer<QWidget>& o_rpContent,
+                                           std::string& o_rError);
+
+    /// Ends the capture, closes the contents and unloads the module. The windows may be open still.
+    void Close();
+
+    /// What the strict host found wrong so far.
+    std::vector<std::string> Faults() const { return m_pHost->Faults(); }
+
+private:
+    void AddContext(const std::shared_ptr<Channels::VChannelContext>& i_rpContext, int i_TimeMode);
+
+    std::unique_ptr<Services::VHostServices> m_pHost;
+    std::shared_ptr<Channels::VChannelService> m_pChannels;
+    std::map<std::string, std::unique_ptr<Services::VContextTimeFeed>> m_TimeFeeds; ///< by context name
+    std::unique_ptr<VLiveCapture> m_pCapture;
+    std::unique_ptr<Services::VPluginHost> m_pPlugin;
+};
+
+} // namespace Studio

@@ -1,0 +1,268 @@
+#include "GraphPlotSystem/TraceRingFill.h"
+
+#include "ChannelSystem/IChannelBlock.h"
+
+#include <algorithm>
+#include <memory>
+#include <utility>
+
+namespace GraphPlotUI
+{
+
+using ChannelSystem::IChannelBlock;
+using TQL::AlignDown;
+using TQL::AlignUp;
+using TQL::TickRange;
+
+namespace
+{
+
+constexpr std::int64_t Capacity = TraceTexelRing::Capacity;
+
+/// Holds a lease on the series behind a block while it is read.
+class StoreLease
+{
+public:
+    StoreLease(std::shared_ptr<ChannelSystem::IChannelStore> i_pStore, std::int64_t i_Tick)
+        : m_pStore(std::move(i_pStore)), m_Token(m_pStore ? m_pStore->AcquireLease(i_Tick) : 0)
+    {
+    }
+    ~StoreLease()
+    {
+        if (m_pStore)
+            m_pStore->ReleaseLease(m_Token);
+    }
+    StoreLease(const StoreLease&) = delete;
+    StoreLease& operator=(const StoreLease&) = delete;
+
+    std::uint64_t Token() const { return m_Token; }
+
+private:
+    std::shared_ptr<ChannelSystem::IChannelStore> m_pStore;
+    std::uint64_t m_Token;
+};
+
+/// No rows yet, the first to come at i_Tick.
+RingExtent EmptyAt(std::int64_t i_Tick)
+{
+    return {0, 0, i_Tick, i_Tick, i_Tick, i_Tick};
+}
+
+TickRange Intersect(const TickRange& i_rA, const TickRange& i_rB)
+{
+    return {std::max(i_rA.First, i_rB.First), std::min(i_rA.Last, i_rB.Last)};
+}
+
+/// One fill: what the ring is brought to, and from what.
+struct FillJob
+{
+    const IChannelBlock& rBlock;
+    TickRange Allowed; ///< what the block has and the limit allows
+    TickRange Wanted;  ///< the request inside that
+    std::int64_t BlockLast;
+    std::int64_t GridOffset;
+    std::int64_t Stride;
+
+    std::int64_t RowsOf(std::int64_t i_First, std::int64_t i_Last) const
+    {
+        return (i_Last - i_First - 1 + Stride) / Stride;
+    }
+};
+
+/// Makes the ring's texels fit its source. Here only, when new rows have been read: a failed read must leave all.
+void FitTexels(TraceTexelRing& i_rRing)
+{
+    i_rRing.Texels.resize(std::size_t{i_rRing.Source.ComponentCount} * TraceTexelRing::Capacity);
+}
+
+/// Reads the rows of a range into the scratch of its level. False when the block gives less.
+bool ReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, const TickRange& i_rRange)
+{
+    const RingSource& rSource = i_rRing.Source;
+    const std::size_t values =
+        static_cast<std::size_t>(i_rJob.RowsOf(i_rRange.First, i_rRange.Last)) * rSource.ComponentCount;
+    if (rSource.Level == 0)
+    {
+        i_rRing.SampleScratch.resize(values);
+        return i_rJob.rBlock.ReadSamples(i_rRange, i_rRing.SampleScratch).IsSuccess();
+    }
+    i_rRing.RecordScratch.resize(values);
+    return i_rJob.rBlock.ReadSummary(i_rRange, rSource.Level - 1u, i_rRing.RecordScratch) >= values;
+}
+
+void WriteReadRows(TraceTexelRing& i_rRing, std::int64_t i_RowOffset)
+{
+    FitTexels(i_rRing);
+    const auto offset = static_cast<std::uint32_t>(i_RowOffset);
+    if (i_rRing.Source.Level == 0)
+        WriteRows(i_rRing, std::span<const float>(i_rRing.SampleScratch), offset);
+    else
+        WriteRows(i_rRing, std::span<const ChannelSystem::LodRecord>(i_rRing.RecordScratch), offset);
+}
+
+/// Drops the rows at either end that the block no longer has or the limit forbids.
+void TrimRing(RingExtent& i_rExtent, const FillJob& i_rJob)
+{
+    const std::int64_t stride = i_rJob.Stride;
+    const std::int64_t first = AlignDown(i_rJob.Allowed.First, stride, i_rJob.GridOffset);
+    if (i_rExtent.FirstTick < first)
+    {
+        const std::int64_t dropped = std::min((first - i_rExtent.FirstTick) / stride, std::int64_t{i_rExtent.RowCount});
+        i_rExtent.Start = (i_rExtent.Start + static_cast<std::uint32_t>(dropped)) & TraceTexelRing::RowMask;
+        i_rExtent.RowCount -= static_cast<std::uint32_t>(dropped);
+        i_rExtent.FirstTick += dropped * stride;
+        i_rExtent.ValidFirstTick = i_rExtent.FirstTick;
+        i_rExtent.EndTick = std::max(i_rExtent.EndTick, i_rExtent.FirstTick);
+    }
+    // A row that summarises ticks which the block has lost goes with them; a whole row across the limit stays.
+    const std::int64_t last =
+        i_rJob.BlockLast < i_rExtent.EndTick
+            ? AlignDown(std::min(i_rJob.BlockLast, i_rJob.Allowed.Last), stride, i_rJob.GridOffset)
+            : AlignUp(i_rJob.Allowed.Last, stride, i_rJob.GridOffset);
+    if (i_rExtent.EndTick > last)
+    {
+        const std::int64_t kept = std::max(std::int64_t{0}, (last - i_rExtent.FirstTick) / stride);
+        i_rExtent.RowCount = static_cast<std::uint32_t>(std::min(kept, std::int64_t{i_rExtent.RowCount}));
+        i_rExtent.EndTick = i_rExtent.FirstTick + i_rExtent.RowCount * stride;
+        i_rExtent.ValidEndTick = i_rExtent.EndTick;
+    }
+}
+
+/// The rows before the ring's first. False when they could not be read.
+bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+{
+    RingExtent& rExtent = i_rRing.Extent;
+    const std::int64_t stride = i_rJob.Stride;
+    const bool bSummary = i_rRing.Source.Level > 0;
+    const std::int64_t wanted =
+        bSummary ? AlignDown(i_rJob.Wanted.First, stride, i_rJob.GridOffset) : i_rJob.Wanted.First;
+    // Rows that the newest 4096 would push out again are not worth their reading.
+    const std::int64_t last = bSummary ? AlignUp(i_rJob.Wanted.Last, stride, i_rJob.GridOffset) : i_rJob.Wanted.Last;
+    const std::int64_t first = std::max(wanted, last - Capacity * stride);
+    if (first >= rExtent.FirstTick)
+        return true;
+    if (!ReadRows(i_rRing, i_rJob, {first, rExtent.FirstTick}))
+        return false;
+    const std::int64_t rows = i_rJob.RowsOf(first, rExtent.FirstTick);
+    if (rows >= Capacity)
+    {
+        rExtent = EmptyAt(first);
+        rExtent.EndTick = first + Capacity * stride;
+    }
+    else if (rExtent.RowCount + rows > Capacity)
+    {
+        rExtent.RowCount = static_cast<std::uint32_t>(Capacity - rows);
+        rExtent.EndTick = rExtent.FirstTick + rExtent.RowCount * stride;
+        rExtent.ValidEndTick = std::min(rExtent.ValidEndTick, rExtent.EndTick);
+    }
+    rExtent.Start = (rExtent.Start - static_cast<std::uint32_t>(rows)) & TraceTexelRing::RowMask;
+    rExtent.FirstTick = first;
+    WriteReadRows(i_rRing, 0);
+    return true;
+}
+
+/// The rows after the ring's last, from that row on where it is incomplete. False when they could not be read.
+bool Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+{
+    RingExtent& rExtent = i_rRing.Extent;
+    const std::int64_t stride = i_rJob.Stride;
+    if (rExtent.EndTick >= i_rJob.Wanted.Last)
+        return true;
+    const std::int64_t first =
+        i_rRing.Source.Level > 0 ? AlignDown(rExtent.EndTick, stride, i_rJob.GridOffset) : rExtent.EndTick;
+    const std::int64_t rows = std::min(i_rJob.RowsOf(first, i_rJob.Wanted.Last), Capacity);
+    const std::int64_t last = std::min(i_rJob.Wanted.Last, first + rows * stride);
+    if (!ReadRows(i_rRing, i_rJob, {first, last}))
+        return false;
+    if (rows >= Capacity)
+        rExtent = EmptyAt(first);
+    if (rExtent.RowCount == 0)
+        rExtent.FirstTick = first;
+    else if (rExtent.EndTick < rExtent.FirstTick + rExtent.RowCount * stride)
+        --rExtent.RowCount;
+    const std::int64_t overflow = rExtent.RowCount + rows - Capacity;
+    if (overflow > 0)
+    {
+        rExtent.Start = (rExtent.Start + static_cast<std::uint32_t>(overflow)) & TraceTexelRing::RowMask;
+        rExtent.RowCount -= static_cast<std::uint32_t>(overflow);
+        rExtent.FirstTick += overflow * stride;
+        rExtent.ValidFirstTick = std::max(rExtent.ValidFirstTick, rExtent.FirstTick);
+    }
+    rExtent.EndTick = last;
+    WriteReadRows(i_rRing, rExtent.RowCount);
+    return true;
+}
+
+/// Whether the rows held can be kept for the job.
+bool IsContinued(const TraceTexelRing& i_rRing, const RingSource& i_rSource, const FillJob& i_rJob)
+{
+    const RingExtent& rExtent = i_rRing.Extent;
+    return rExtent.RowCount > 0 && i_rRing.Source == i_rSource && i_rJob.Wanted.First <= rExtent.EndTick &&
+           i_rJob.Wanted.Last >= rExtent.FirstTick;
+}
+
+} // namespace
+
+bool FillRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const TickRange& i_rAvailable,
+              const TickRange& i_rRequested, const TickRange& i_rLimit, std::uint8_t i_Level)
+{
+    const ChannelSystem::ChannelBlockShape& rShape = i_rBlock.GetShape();
+    if (rShape.SamplePeriod <= 0 || !rShape.pLayout || rShape.pLayout->ComponentCount == 0)
+        return false;
+    const TickRange allowed = Intersect(i_rAvailable, i_rLimit);
+    const TickRange wanted = Intersect(i_rRequested, allowed);
+    if (wanted.First >= wanted.Last || i_Level > rShape.SummaryPeriods.size())
+        return false;
+
+    const StoreLease lease(i_rBlock.GetStore(), allowed.First);
+    const RingSource source = {rShape.pLayout->ComponentCount, rShape.FormatTag, rShape.SamplePeriod, lease.Token(),
+                               i_Level};
+    const FillJob job = {i_rBlock, allowed, wanted, i_rAvailable.Last, rShape.GridOffset, source.Stride()};
+    const RingExtent extentBefore = i_rRing.Extent;
+    const RingSource sourceBefore = i_rRing.Source;
+    if (IsContinued(i_rRing, source, job))
+    {
+        TrimRing(i_rRing.Extent, job);
+        if (!Prepend(i_rRing, job))
+        {
+            i_rRing.Extent = extentBefore;
+            return false;
+        }
+        const bool bPrepended = i_rRing.Extent.FirstTick < extentBefore.FirstTick;
+        if (Append(i_rRing, job))
+            return true;
+        if (!bPrepended)
+            i_rRing.Extent = extentBefore;
+        return false;
+    }
+    i_rRing.Source = source;
+    i_rRing.Extent = EmptyAt(wanted.First);
+    if (Append(i_rRing, job))
+        return true;
+    i_rRing.Source = sourceBefore;
+    i_rRing.Extent = extentBefore;
+    return false;
+}
+
+void UpdateRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const TickRange& i_rAvailable,
+                const TickRange& i_rRequested, const TickRange& i_rLimit, std::uint8_t i_Level)
+{
+    if (!FillRing(i_rRing, i_rBlock, i_rAvailable, i_rRequested, i_rLimit, i_Level))
+        return;
+    const RingExtent& rExtent = i_rRing.Extent;
+    const bool bLow = i_rRequested.First < rExtent.ValidFirstTick;
+    const bool bHigh = i_rRequested.Last > rExtent.ValidEndTick;
+    const std::int64_t free = Capacity - rExtent.RowCount;
+    if ((!bLow && !bHigh) || free == 0)
+        return;
+    const std::int64_t extra = i_rRing.Source.Stride() * (bLow && bHigh ? free / 2 : free);
+    const std::int64_t validFirst = std::clamp(rExtent.ValidFirstTick, rExtent.FirstTick, rExtent.EndTick);
+    const std::int64_t validLast = std::clamp(rExtent.ValidEndTick, validFirst, rExtent.EndTick);
+    const TickRange widened = {validFirst - (bLow ? extra : 0), validLast + (bHigh ? extra : 0)};
+    // Mostly there is nothing more to have, which a glance tells without another lease.
+    const TickRange wanted = Intersect(Intersect(widened, i_rLimit), i_rAvailable);
+    if (wanted.First < rExtent.FirstTick || wanted.Last > rExtent.EndTick)
+        (void)FillRing(i_rRing, i_rBlock, i_rAvailable, widened, i_rLimit, i_Level);
+}
+
+} // namespace GraphPlotUI

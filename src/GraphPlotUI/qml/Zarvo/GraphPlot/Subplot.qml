@@ -1,0 +1,75 @@
+import QtQuick
+import Zarvo.GraphPlot 1.0
+
+// One subplot with its value axis and the names of its traces. screenOrigin is where it stands in the framebuffer item.
+Item {
+    id: root
+
+    required property var traceManager
+    property point screenOrigin
+    property real axisWidth: 80
+    property real pixelRatio: 1
+    property var traceIds
+    property string label
+    property string units
+    property point valueRange
+    property var legend: []
+
+    ValueAxis {
+        width: root.axisWidth
+        height: root.height
+        screenRect: Qt.rect(root.screenOrigin.x, root.screenOrigin.y, width, height)
+        valueRange: root.valueRange
+        label: root.label
+        units: root.units
+    }
+
+    Item {
+        id: plotArea
+        x: root.axisWidth
+        width: root.width - root.axisWidth
+        height: root.height
+
+        SubplotRenderType {
+            id: plot
+            anchors.fill: parent
+            screenRect: Qt.rect(root.screenOrigin.x + plotArea.x, root.screenOrigin.y, plotArea.width, plotArea.height)
+            liveContext: root.traceManager.liveContext
+            relativeTimeDisplay: root.traceManager.relativeTimeDisplay
+            valueRangeX: root.traceManager.timeRange
+            valueRangeY: root.valueRange
+            gapOpacity: root.traceManager.gapOpacity
+            traceIds: root.traceIds
+
+            GraphRenderTypeRegistration {}
+        }
+
+        TimeRangeMouseArea {
+            anchors.fill: parent
+            traceManager: root.traceManager
+        }
+
+        Column {
+            anchors { top: parent.top; right: parent.right; margins: 6 }
+            Repeater {
+                model: root.legend.slice(0, 6)
+                delegate: Text {
+                    required property var modelData
+                    anchors.right: parent.right
+                    text: modelData.name
+                    color: modelData.colour
+                    font.pixelSize: 11
+                    style: Text.Outline
+                    styleColor: "black"
+                }
+            }
+            Text {
+                anchors.right: parent.right
+                visible: root.legend.length > 6
+                text: qsTr("and %1 more").arg(root.legend.length - 6)
+                color: "#a0a0a0"
+                font.pixelSize: 11
+            }
+        }
+    }
+}

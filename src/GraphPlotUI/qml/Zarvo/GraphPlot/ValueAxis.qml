@@ -1,0 +1,40 @@
+import QtQuick
+import Zarvo.GraphPlot 1.0
+
+// The value axis to the left of a subplot: ticks by its render type, labels and title as text.
+Item {
+    id: root
+
+    property rect screenRect
+    property point valueRange
+    property string label
+    property string units
+
+    ValueAxisRenderType {
+        id: axis
+        anchors.fill: parent
+        screenRect: root.screenRect
+        valueRange: root.valueRange
+        ticksOnFarEdge: true
+
+        GraphRenderTypeRegistration {}
+    }
+
+    TickLabels {
+        vertical: true
+        renderType: axis
+        length: root.height
+    }
+
+    Text {
+        x: 2
+        y: (root.height + width) / 2
+        rotation: -90
+        transformOrigin: Item.TopLeft
+        width: Math.min(implicitWidth, root.height)
+        elide: Text.ElideRight
+        text: root.units === "" ? root.label : `${root.label} (${root.units})`
+        color: "#d0d0d0"
+        font.pixelSize: 12
+    }
+}

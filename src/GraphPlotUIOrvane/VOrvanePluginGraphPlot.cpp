@@ -1,0 +1,91 @@
+#include "GraphPlotUIOrvane/VOrvanePluginGraphPlot.h"
+
+#include "CoreGraphics/Resources.h"
+#include "GraphPlotUIOrvane/QmlTypes.h"
+#include "GraphPlotUIOrvane/VOrvaneGraphPlotWindowContentFactory.h"
+#include "OrvanePluginInterface/IHostCoreServices.h"
+#include "OrvanePluginInterface/IHostUiServices.h"
+#include "OrvanePluginInterface/ITimeController.h"
+
+#include <QtCore/QDir>
+#include <QtQml/QQmlEngine>
+
+namespace GraphPlotUI
+{
+namespace
+{
+
+const std::string& EmptyText()
+{
+    static const std::string s_Empty;
+    return s_Empty;
+}
+
+/// The folder beside this room that holds another room's sources, for development builds only.
+QString SourceFolder(const char* i_pRoom)
+{
+    return QDir::cleanPath(QStringLiteral(GRAPHPLOTS_SOURCE_FOLDER) + QLatin1Char('/') + QLatin1String(i_pRoom));
+}
+
+template <typename T, typename TServices>
+std::shared_ptr<T> Fetch(TServices& i_rServices, void (TServices::*i_pGetter)(std::shared_ptr<T>&))
+{
+    std::shared_ptr<T> pService;
+    (i_rServices.*i_pGetter)(pService);
+    return pService;
+}
+
+} // namespace
+
+using OrvanePluginInterface::IHostCoreServices;
+using OrvanePluginInterface::IHostUiServices;
+
+const std::string& VOrvanePluginGraphPlot::QueryText1() const
+{
+    return EmptyText();
+}
+
+const std::string& VOrvanePluginGraphPlot::QueryText2() const
+{
+    return EmptyText();
+}
+
+bool VOrvanePluginGraphPlot::LoadQmlModules(IHostCoreServices&, IHostUiServices& i_rUi)
+{
+    RegisterResources();
+    RegisterGraphPlotTypes();
+    const auto pEngineHost = Fetch(i_rUi, &IHostUiServices::GetQmlEngineHost);
+    QQmlEngine* pEngine = pEngineHost->GetEngine();
+    if (pEngine)
+        AddResourceImportPath(*pEngine);
+    if (pEngine && i_rUi.IsDevelopmentBuild())
+        pEngine->addImportPath(SourceFolder("GraphPlotUI/qml"));
+    // The property must exist, with no value, before any QML is loaded.
+    pEngineHost->SetRootContextProperty("rootContextTraceFactory", nullptr);
+    return true;
+}
+
+bool VOrvanePluginGraphPlot::Initialise(IHostCoreServices& i_rCore, IHostUiServices& i_rUi)
+{
+    const auto pResources = Fetch(i_rUi, &IHostUiServices::GetResources);
+    pResources->AddSearchFolder(SourceFolder("GraphPlotUI").toStdString());
+
+    GraphPlotServices services;
+    services.pUiPostalService = Fetch(i_rCore, &IHostCoreServices::GetUiPostalService);
+    services.pWorkerPostalService = Fetch(i_rCore, &IHostCoreServices::GetWorkerPostalService);
+    services.pChannelService = Fetch(i_rCore, &IHostCoreServices::GetChannelService);
+    services.pResources = pResources;
+    services.pEngineHost = Fetch(i_rUi, &IHostUiServices::GetQmlEngineHost);
+    services.bChannelBrowser = i_rCore.HasChannelBrowser();
+    Fetch(i_rUi, &IHostUiServices::GetContentRegistry)
+        ->RegisterContent(VOrvaneGraphPlotWindowContentFactory::Name(),
+                          TQL::MakeShared<VOrvaneGraphPlotWindowContentFactory>(std::move(services)));
+    return true;
+}
+
+void VOrvanePluginGraphPlot::UnloadResources()
+{
+    UnregisterResources();
+}
+
+} // namespace GraphPlotUI

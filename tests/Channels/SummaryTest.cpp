@@ -1,0 +1,178 @@
+#include "Channels/Summary.h"
+#include "Reference.h"
+
+#include <algorithm>
+#include <array>
+
+namespace ChannelsTest
+{
+
+namespace
+{
+
+LodRecord Reduce(std::span<const float> i_Samples)
+{
+    Channels::Accumulator accumulator;
+    Channels::Reduce(i_Samples, accumulator);
+    return accumulator.Result();
+}
+
+} // namespace
+
+TEST(Summary, OneComponentAgreesWithTheSlowWay)
+{
+    static constexpr float huge = std::numeric_limits<float>::max();
+    struct Case
+    {
+        const char* pName;
+        std::vector<float> Samples;
+    };
+    std::vector<Case> cases{
+        {"nothing", {}},
+        {"one", {3.5f}},
+        {"one missing", {NaN}},
+        {"all missing", std::vector<float>(1000, NaN)},
+        {"negative only", std::vector<float>(100, -7.0f)},
+        {"infinite ones are samples", {1.0f, Infinity, NaN, 2.0f}},
+        {"negative infinity", std::vector<float>(40, -Infinity)},
+        {"both infinities have no mean", {Infinity, -Infinity, 1.0f}},
+        {"missing at the first and last place", {NaN, 1.0f, 2.0f, NaN}},
+        {"a sum beyond float", std::vector<float>(512, huge)},
+        {"a sum beyond float both ways",
+         []
+         {
+             std::vector<float> samples(512, huge);
+             std::fill_n(samples.begin(), 256, -huge);
+             return samples;
+         }()},
+        {"denormal", std::vector<float>(300, std::numeric_limits<float>::denorm_min())},
+    };
+    for (std::size_t length = 1; length < 70; ++length)
+        cases.push_back({"odd lengths", RandomSamples(length, static_cast<std::uint32_t>(length))});
+    for (const std::size_t length : {255u, 256u, 257u, 511u, 1023u, 4097u, 100003u})
+        cases.push_back({"long", RandomSamples(length, static_cast<std::uint32_t>(length))});
+    for (const Case& rCase : cases)
+        EXPECT_TRUE(IsSame(Reduce(rCase.Samples), SlowSummary(rCase.Samples)))
+            << rCase.pName << ", " << rCase.Samples.size() << " samples";
+}
+
+TEST(Summary, MeanStaysRightOverALongRun)
+{
+    // A float that sums one by one stops growing at 2^24.
+    std::vector<float> samples(std::size_t{3} << 23, 1.0f);
+    EXPECT_EQ(Reduce(samples).Mean, 1.0f);
+    for (std::size_t i = 0; i < samples.size(); i += 2)
+        samples[i] = 100000.0f;
+    EXPECT_EQ(Reduce(samples).Mean, 50000.5f);
+}
+
+TEST(Summary, InterleavedComponentsAgreeWithTheSlowWay)
+{
+    for (const std::size_t width : {1u, 2u, 3u, 4u, 5u, 6u, 7u, 12u})
+        for (const std::size_t rows : {0u, 1u, 3u, 4u, 5u, 15u, 16u, 255u, 256u, 260u, 1001u})
+        {
+            const std::vector<float> samples = RandomSamples(rows * width, 7);
+            std::vector<Channels::Accumulator> all(width);
+            Channels::Reduce(samples.data(), rows, width, all);
+            for (std::size_t c = 0; c < width; ++c)
+            {
+                const auto expected = SlowSummary(std::span(samples).subspan(rows == 0 ? 0 : c), width);
+                EXPECT_TRUE(IsSame(all[c].Result(), expected)) << width << " wide, " << rows << " rows, " << c;
+                Channels::Accumulator one;
+                Channels::Reduce(samples.data() + c, rows, width, std::span(&one, 1));
+                EXPECT_TRUE(IsSame(one.Result(), expected)) << "alone";
+            }
+        }
+}
+
+TEST(Summary, BucketsCoverEverySampleOnce)
+{
+    for (const std::size_t length : {1u, 255u, 256u, 257u, 1000u})
+    {
+        const std::vector<float> samples = RandomSamples(length, 3);
+        std::vector<LodRecord> records((length + 255) / 256);
+        Channels::ReduceBuckets(samples, 256, records);
+        for (std::size_t i = 0; i < records.size(); ++i)
+            EXPECT_TRUE(IsSame(records[i], SlowSummary(std::span(samples).subspan(
+                                               i * 256, std::min<std::size_t>(256, length - i * 256)))));
+        EXPECT_TRUE(IsSame(Channels::Combine(records), SlowSummary(samples)));
+    }
+    EXPECT_TRUE(IsSame(Channels::Combine({}), LodRecord{}));
+}
+
+TEST(Summary, RecordsOfFewRowsAgreeWithTheSlowWay)
+{
+    // Every pattern of missing samples among four rows of two components.
+    for (unsigned pattern = 0; pattern < 256; ++pattern)
+    {
+        std::array<float, 8> rows{};
+        for (unsigned i = 0; i < rows.size(); ++i)
+            rows[i] = (pattern >> i & 1) != 0 ? NaN : static_cast<float>(i) - 3.0f;
+        const std::span<const float> all(rows);
+        std::array<LodRecord, 4> pairs;
+        Channels::SummarisePairs(rows.data(), 2, 2, pairs.data());
+        std::array<Channels::PackedRecord, 4> packed;
+        Channels::SummariseFours(rows.data(), 2, 1, packed.data());
+        Channels::SummariseFours(rows.data(), 2, 1, packed.data() + 2);
+        std::array<Channels::PackedRecord, 2> combined;
+        Channels::CombinePairs(packed.data(), 2, 1, combined.data());
+        for (std::size_t c = 0; c < 2; ++c)
+        {
+            EXPECT_TRUE(IsSame(pairs[c], SlowSummary(all.subspan(c, 3), 2))) << pattern;
+            EXPECT_TRUE(IsSame(pairs[2 + c], SlowSummary(all.subspan(4 + c), 2))) << pattern;
+            LodRecord four;
+            Channels::Unpack(&packed[c], 1, &four);
+            EXPECT_TRUE(IsSame(four, SlowSummary(all.subspan(c), 2))) << pattern;
+            LodRecord twice;
+            Channels::Unpack(&combined[c], 1, &twice);
+            four.Count *= 2;
+            EXPECT_TRUE(IsSame(twice, four)) << pattern;
+        }
+    }
+}
+
+TEST(Summary, RecordsOfFewRowsForEveryWidthAndOfExtremeValues)
+{
+    constexpr float huge = std::numeric_limits<float>::max();
+    for (std::size_t width = 1; width <= 13; ++width)
+    {
+        constexpr std::size_t records = 5;
+        std::vector<float> rows = RandomSamples(records * 4 * width, static_cast<std::uint32_t>(width));
+        std::fill_n(rows.begin(), 2 * width, huge);
+        rows[rows.size() - 1] = Infinity;
+        std::vector<LodRecord> pairs(2 * records * width);
+        Channels::SummarisePairs(rows.data(), width, 2 * records, pairs.data());
+        std::vector<Channels::PackedRecord> packed(records * width);
+        Channels::SummariseFours(rows.data(), width, records, packed.data());
+        std::vector<LodRecord> fours(packed.size());
+        Channels::Unpack(packed.data(), packed.size(), fours.data());
+        const std::span<const float> all(rows);
+        for (std::size_t i = 0; i < pairs.size(); ++i)
+        {
+            const std::size_t first = i / width * 2 * width;
+            ASSERT_TRUE(IsSame(pairs[i], SlowSummary(all.subspan(first + i % width, 2 * width - i % width), width)))
+                << width << " wide, pair " << i;
+        }
+        for (std::size_t i = 0; i < fours.size(); ++i)
+        {
+            const std::size_t first = i / width * 4 * width;
+            ASSERT_TRUE(IsSame(fours[i], SlowSummary(all.subspan(first + i % width, 4 * width - i % width), width)))
+                << width << " wide, four " << i;
+        }
+    }
+}
+
+TEST(Summary, CombiningWeighsByCount)
+{
+    const std::array<Channels::PackedRecord, 4> records{{{1.0f, 1.0f, 1.0f, 3}, {5.0f, 5.0f, 5.0f, 1}, {}, {}}};
+    std::array<Channels::PackedRecord, 2> combined;
+    Channels::CombinePairs(records.data(), 1, 2, combined.data());
+    EXPECT_EQ(combined[0].Mean, 2.0f);
+    EXPECT_EQ(combined[0].Count, 4u);
+    EXPECT_EQ(combined[1].Count, 0u);
+    EXPECT_EQ(combined[1].Mean, 0.0f);
+    EXPECT_EQ(combined[1].Maximum, -Infinity);
+    EXPECT_EQ(combined[1].Minimum, Infinity);
+}
+
+} // namespace ChannelsTest

@@ -1,0 +1,138 @@
+#include <gtest/gtest.h>
+
+#include <QtCore/QFile>
+#include <QtCore/QJsonArray>
+#include <QtCore/QJsonDocument>
+#include <QtCore/QProcess>
+#include <QtCore/QProcessEnvironment>
+#include <QtCore/QTemporaryDir>
+
+#include "Recordings/C3dWriter.h"
+#include "Simulation/RecordWalk.h"
+#include "Simulation/VWalkSimulator.h"
+
+#include <cstdlib>
+#include <string>
+
+namespace
+{
+
+struct StudioRun
+{
+    int Status = -1;
+    QByteArray Output;
+    QByteArray Error;
+};
+
+/// The real program, without a display.
+StudioRun RunStudio(const QStringList& i_rArguments)
+{
+    QProcess process;
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    for (const char* pName : {"DISPLAY", "WAYLAND_DISPLAY", "QT_QPA_PLATFORM"})
+        environment.remove(QString::fromLatin1(pName));
+    process.setProcessEnvironment(environment);
+    process.start(QStringLiteral(STUDIO_PROGRAM), i_rArguments);
+    EXPECT_TRUE(process.waitForFinished(60'000)) << process.errorString().toStdString();
+    EXPECT_EQ(process.exitStatus(), QProcess::NormalExit);
+    return {process.exitCode(), process.readAllStandardOutput(), process.readAllStandardError()};
+}
+
+class StudioProgram : public ::testing::Test
+{
+protected:
+    void SetUp() override
+    {
+        const Simulation::VWalkSimulator simulator({1, 1});
+        std::string error;
+        ASSERT_TRUE(
+            Recordings::WriteC3d(Simulation::RecordWalk(simulator, 0, 60), Path("walk.c3d").toStdString(), error)
+                .IsSuccess())
+            << error;
+        QFile text(Path("text.c3d"));
+        ASSERT_TRUE(text.open(QIODevice::WriteOnly));
+        text.write("not a recording\n");
+    }
+
+    QString Path(const char* i_pName) const { return m_Folder.filePath(QString::fromLatin1(i_pName)); }
+
+    QTemporaryDir m_Folder;
+};
+
+TEST_F(StudioProgram, ListsChannels)
+{
+    const StudioRun table = RunStudio({"channels", Path("walk.c3d")});
+    EXPECT_EQ(table.Status, 0);
+    EXPECT_EQ(table.Error, "");
+    EXPECT_EQ(table.Output.count('\n'), 1 + 53 + 16);
+    EXPECT_TRUE(table.Output.contains("Walker1:LFHD"));
+
+    const StudioRun json = RunStudio({"channels", "--json", Path("walk.c3d")});
+    EXPECT_EQ(json.Status, 0);
+    EXPECT_EQ(QJsonDocument::fromJson(json.Output).array().size(), 53 + 16);
+}
+
+TEST_F(StudioProgram, ExportsATable)
+{
+    const StudioRun run = RunStudio(
+        {"export", Path("walk.c3d"), "--csv", Path("o.csv"), "--channel", "Walker1:LFHD", "--channel", "Fz1"});
+    EXPECT_EQ(run.Status, 0) << run.Error.toStdString();
+    EXPECT_EQ(run.Error, "");
+    QFile file(Path("o.csv"));
+    ASSERT_TRUE(file.open(QIODevice::ReadOnly));
+    const QByteArray content = file.readAll();
+    EXPECT_EQ(content.left(content.indexOf('\n')), "time,Walker1:LFHD.X,Walker1:LFHD.Y,Walker1:LFHD.Z,Fz1");
+    EXPECT_EQ(content.count('\n'), 1 + 600);
+}
+
+TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
+{
+    const QString walk = Path("walk.c3d");
+    const struct
+    {
+        QStringList Arguments;
+        const char* pPart;
+    } rows[] = {
+        {{"--frob"}, "unknown option --frob"},
+        {{"channels", Path("missing.c3d")}, "missing.c3d"},
+        {{"channels", m_Folder.path()}, "folder"},
+        {{"channels", Path("text.c3d")}, "text.c3d"},
+        {{"export", walk, "--csv", Path("no/such/o.csv")}, "o.csv"},
+        {{"export", walk, "--csv", Path("o.csv"), "--channel", "Nobody*"}, "Nobody*"},
+        {{"snapshot", walk, "--out", Path("p.png")}, "no display: DISPLAY is not set; run it under xvfb-run"},
+        {{walk}, "no display"},
+    };
+    for (const auto& rRow : rows)
+    {
+        const StudioRun run = RunStudio(rRow.Arguments);
+        const std::string words = rRow.Arguments.join(' ').toStdString();
+        EXPECT_EQ(run.Status, 2) << words;
+        EXPECT_EQ(run.Output, "") << words;
+        EXPECT_TRUE(run.Error.startsWith("graphplots-studio: ")) << words << ": " << run.Error.toStdString();
+        EXPECT_EQ(run.Error.count('\n'), 1) << words << ": " << run.Error.toStdString();
+        EXPECT_TRUE(run.Error.contains(rRow.pPart)) << words << ": " << run.Error.toStdString();
+    }
+    EXPECT_FALSE(QFile::exists(Path("o.csv")));
+    EXPECT_FALSE(QFile::exists(Path("p.png")));
+}
+
+TEST_F(StudioProgram, RealRecordingsAreListed)
+{
+    const char* pData = std::getenv("GRAPHPLOTS_TEST_DATA");
+    const QString folder = QString::fromLocal8Bit(pData ? pData : "");
+    static const struct
+    {
+        const char* pFile;
+        int Channels;
+    } rows[] = {{"sprintbasket.c3d", 26}, {"Gait.c3d", 33 + 28}, {"Dec_real.c3d", 36 + 16}, {"sgi_real.c3d", 36 + 16}};
+    if (folder.isEmpty() || !QFile::exists(folder + "/Gait.c3d"))
+        GTEST_SKIP() << "no folder with real recordings";
+    for (const auto& rRow : rows)
+    {
+        const StudioRun run = RunStudio({"channels", "--json", folder + "/" + rRow.pFile});
+        EXPECT_EQ(run.Status, 0) << rRow.pFile << ": " << run.Error.toStdString();
+        EXPECT_EQ(QJsonDocument::fromJson(run.Output).array().size(), rRow.Channels) << rRow.pFile;
+    }
+}
+
+} // namespace

@@ -1,0 +1,60 @@
+#include "TQL/Log.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace
+{
+
+using TQL::ELogSeverity;
+
+TEST(Log, FormatsOnlyWhatTheThresholdAdmits)
+{
+    std::vector<std::string> lines;
+    auto pSink = TQL::Log::AddSink([&](const TQL::LogMessage& i_rMessage) {
+        lines.push_back(std::string(i_rMessage.Category) + ' ' + std::to_string(static_cast<int>(i_rMessage.Severity)) +
+                        ' ' + std::string(i_rMessage.Text));
+    });
+    TQL::VLogCategory& rCategory = TQL::Log::GetCategory("LogTest");
+    EXPECT_EQ(&rCategory, &TQL::Log::GetCategory("LogTest"));
+
+    TQL::Log::Format(rCategory, ELogSeverity::Detail, "Test", 1, "hidden %1%", 1);
+    TQL::Log::Format(rCategory, ELogSeverity::Warning, "Test", 2, "%2% after %1%", "a", 7);
+    TQL::Log::Format(rCategory, ELogSeverity::Information, "Test", 3, "[%1%]", 1, 2);
+    TQL::Log::SetThreshold(rCategory, ELogSeverity::Detail);
+    TQL::Log::Format(rCategory, ELogSeverity::Detail, "Test", 4, "shown");
+    EXPECT_EQ(lines, (std::vector<std::string>{"LogTest 3 7 after a", "LogTest 2 [%1%]", "LogTest 6 shown"}))
+        << "a failure of formatting falls back to the bare text as an error";
+
+    pSink.reset();
+    const auto pOther = TQL::Log::AddSink([](const TQL::LogMessage&) {});
+    TQL::Log::Format(rCategory, ELogSeverity::Error, "Test", 5, "nobody");
+    EXPECT_EQ(lines.size(), 3u);
+}
+
+TEST(Log, SinksSeeOneMessageAtATime)
+{
+    int inside = 0;
+    int overlaps = 0;
+    int count = 0;
+    const auto pSink = TQL::Log::AddSink([&](const TQL::LogMessage&) {
+        overlaps += ++inside > 1 ? 1 : 0;
+        ++count;
+        --inside;
+    });
+    const TQL::VLogCategory& rCategory = TQL::Log::GetCategory("LogTest");
+    std::vector<std::jthread> threads;
+    for (int t = 0; t < 4; ++t)
+        threads.emplace_back([&rCategory] {
+            for (int i = 0; i < 500; ++i)
+                TQL::Log::Write(rCategory, ELogSeverity::Error, "x", "Test", 1);
+        });
+    threads.clear();
+    EXPECT_EQ(overlaps, 0);
+    EXPECT_EQ(count, 2000);
+}
+
+} // namespace

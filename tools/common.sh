@@ -1,0 +1,41 @@
+# Shared by the scripts of this folder; to be sourced. Leaves the caller in the project's root.
+set -euo pipefail
+
+root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
+cd "$root"
+
+say() { printf '== %s\n' "$*"; }
+
+wanted_packages() { grep -v '^#' "$root/tools/packages.txt"; }
+
+# As many compilers at once as there are cores, but never more than the memory carries.
+jobs() {
+    local cores memory
+    cores=$(nproc)
+    memory=$(awk '/MemAvailable/ { print int($2 / 1500000) }' /proc/meminfo)
+    if [ "$memory" -lt 1 ]; then memory=1; fi
+    if [ "$memory" -lt "$cores" ]; then echo "$memory"; else echo "$cores"; fi
+}
+
+# build PRESET [TARGET...]: configures once, then builds.
+build() {
+    local preset=$1
+    shift
+    if [ ! -f "build/$preset/build.ninja" ]; then
+        say "configuring $preset"
+        cmake --preset "$preset" >"$(mktemp -t graphplots-configure.XXXXXX)"
+    fi
+    say "building $preset"
+    local targets=()
+    for target in "$@"; do targets+=(--target "$target"); done
+    cmake --build --preset "$preset" --parallel "$(jobs)" "${targets[@]}"
+}
+
+# Runs a command with a display: the one that there is, else a virtual one.
+with_display() {
+    if [ -n "${DISPLAY:-}" ]; then
+        "$@"
+    else
+        xvfb-run --auto-servernum --server-args='-screen 0 1600x1000x24' "$@"
+    fi
+}
