@@ -36,6 +36,6 @@ with_display() {
     if [ -n "${DISPLAY:-}" ]; then
         "$@"
     else
-        xvfb-run --auto-servernum --server-args='-screen 0 1600x1000x24' "$@"
+        xvfb-run --auto-servernum --server-args='-screen 0 1600x1000x24 -noreset' "$@"
     fi
 }

@@ -62,17 +62,19 @@ void Store(Floats i_Record, LodRecord* o_pRecord)
 template <std::size_t TRows, typename TRecord>
 void SummariseFour(const float* i_pRows, std::size_t i_Width, std::size_t i_Used, TRecord* o_pRecords)
 {
-    constexpr float scale = 0.25f; // so that no sum leaves the range of float
+    constexpr float share = 1.0f / TRows; // taken before adding, so that no sum leaves the range of float
     Lanes lanes;
-    Floats sum{};
+    Floats mean{};
     for (std::size_t row = 0; row < TRows; ++row)
     {
         const Floats values = Load(i_pRows + row * i_Width);
         lanes.Add(values);
-        sum += reinterpret_cast<Floats>(reinterpret_cast<Words>(values * scale) & (values == values));
+        mean += reinterpret_cast<Floats>(reinterpret_cast<Words>(values * share) & (values == values));
     }
-    const Floats count = __builtin_convertvector(lanes.Count, Floats);
-    const Floats mean = sum / (scale * (lanes.Count == 0 ? count + 1.0f : count));
+    if constexpr (TRows == 2) // without a division: one missing sample leaves half the mean
+        mean += reinterpret_cast<Floats>(reinterpret_cast<Words>(mean) & (lanes.Count == 1));
+    else
+        mean /= share * __builtin_convertvector(lanes.Count == 0 ? lanes.Count + 1 : lanes.Count, Floats);
     const Floats counts = reinterpret_cast<Floats>(lanes.Count);
     const Floats frontLow = __builtin_shufflevector(mean, lanes.Maximum, 0, 4, 1, 5);
     const Floats frontHigh = __builtin_shufflevector(mean, lanes.Maximum, 2, 6, 3, 7);

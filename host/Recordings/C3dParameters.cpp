@@ -107,7 +107,7 @@ bool VC3dParameters::ReadContent(std::span<const std::byte> i_Content, C3dParame
     for (std::size_t i = 0; i < dimensions; ++i)
     {
         o_rParameter.Dimensions.push_back(std::to_integer<std::size_t>(i_Content[2 + i]));
-        bytes = std::min(bytes * o_rParameter.Dimensions.back(), data.size() + 1);
+        bytes *= o_rParameter.Dimensions.back(); // at most 4 x 255^7: no overflow
     }
     if (bytes > data.size())
         return false;

@@ -181,7 +181,8 @@ TQL::IResult VPluginHost::Unload()
     return TQL::Result::OkButPartial;
 }
 
-/// Takes out what keeps objects of the module from inside the host: root context properties, factories, QML singletons.
+/// Takes out what keeps objects of the module from inside the host: root context properties, factories,
+/// compiled components.
 void VPluginHost::DropFromHost()
 {
     VQmlEngineHost& rEngineHost = *m_rServices.EngineHost();

@@ -32,7 +32,6 @@ void VQmlEngineHost::SetRootContextProperty(const std::string& i_rName, QObject*
 
 void VQmlEngineHost::ReleaseUnused()
 {
-    m_pEngine->clearSingletons();
     m_pEngine->clearComponentCache();
     m_pEngine->collectGarbage();
 }

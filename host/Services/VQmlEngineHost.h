@@ -24,8 +24,8 @@ public:
     /// The names of the properties that have an object now.
     const std::set<std::string>& PropertiesWithObject() const { return m_NamesWithObject; }
 
-    /// Lets go of all that the engine keeps for later: singletons, compiled components, garbage. Before a module goes,
-    /// when none of its scenes is left.
+    /// Lets go of compiled components and garbage; before a module goes. Singletons of QML stay: clearing them takes
+    /// the engine's own "Qt" along, and then no further scene works.
     void ReleaseUnused();
 
 private:

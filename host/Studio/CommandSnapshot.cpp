@@ -141,6 +141,9 @@ private:
                         (errors.empty() ? std::string("no reason given")
                                         : errors.front().toString().simplified().toStdString()));
         }
+        if (!DrawsWithOpenGL(*m_pQuickWidget))
+            return Fail("no picture without OpenGL, which this display does not offer; run it on a desktop or under "
+                        "xvfb-run");
         if (!bEnded)
             return Fail("the window had no data within " + std::to_string(patience.count() / 1000) +
                         " s; choose a channel with samples by --channel");
@@ -164,8 +167,7 @@ private:
 
     bool Save()
     {
-        return SavePicture(m_pQuickWidget->grabFramebuffer(), QString::fromStdString(m_rCommandLine.PicturePath),
-                           m_rError)
+        return SavePicture(m_pQuickWidget->grabFramebuffer(), PathFromText(m_rCommandLine.PicturePath), m_rError)
             .IsSuccess();
     }
 

@@ -1,13 +1,16 @@
 #include "Studio/PlotContent.h"
 
-#include <QtCore/QDir>
-#include <QtCore/QFileInfo>
-#include <QtCore/QSaveFile>
+#include "Recordings/VFileReplacement.h"
+#include "Studio/Paths.h"
+
+#include <QtCore/QBuffer>
+#include <QtCore/QByteArray>
 #include <QtCore/QVariant>
-#include <QtGui/QImageWriter>
 #include <QtQml/QQmlContext>
 #include <QtQml/QQmlEngine>
 #include <QtQuick/QQuickItem>
+#include <QtQuick/QQuickWindow>
+#include <QtQuick/QSGRendererInterface>
 #include <QtQuickWidgets/QQuickWidget>
 
 namespace Studio
@@ -47,6 +50,12 @@ bool HasTraceData(QQuickWidget& i_rQuickWidget)
     return pManager && pManager->property("haveTraceData").toBool();
 }
 
+bool DrawsWithOpenGL(QQuickWidget& i_rQuickWidget)
+{
+    const QQuickWindow* pWindow = i_rQuickWidget.quickWindow();
+    return pWindow && pWindow->rendererInterface()->graphicsApi() == QSGRendererInterface::OpenGL;
+}
+
 TQL::IResult SetTimeRange(QQuickWidget& i_rQuickWidget, const QPointF& i_rRange)
 {
     return WriteProperty(FindTraceManager(i_rQuickWidget), "timeRange", i_rRange);
@@ -57,29 +66,20 @@ TQL::IResult SetValueRange(QQuickWidget& i_rQuickWidget, const QPointF& i_rRange
     return WriteProperty(i_rQuickWidget.rootObject(), "valueRangeOverride", i_rRange);
 }
 
-TQL::IResult SavePicture(const QImage& i_rPicture, const QString& i_rPath, std::string& o_rError)
+TQL::IResult SavePicture(const QImage& i_rPicture, const std::filesystem::path& i_rPath, std::string& o_rError)
 {
-    const auto fail = [&](const QString& i_rReason)
+    QByteArray bytes;
+    QBuffer buffer(&bytes);
+    if (i_rPicture.isNull() || !buffer.open(QIODevice::WriteOnly) || !i_rPicture.save(&buffer, "png"))
     {
-        o_rError = QStringLiteral("cannot write the picture %1: %2").arg(i_rPath, i_rReason).toStdString();
-        return TQL::Result::FileIOFailure;
-    };
-    if (i_rPicture.isNull())
-        return fail(QStringLiteral("the window gave no picture"));
-    const QFileInfo info(i_rPath);
-    if (info.isDir())
-        return fail(QStringLiteral("it is a folder; give the name of a file"));
-    if (!info.absoluteDir().exists())
-        return fail(QStringLiteral("the folder %1 does not exist; make it first").arg(info.absolutePath()));
-    QSaveFile file(i_rPath);
-    if (!file.open(QIODevice::WriteOnly))
-        return fail(file.errorString());
-    QImageWriter writer(&file, "png");
-    if (!writer.write(i_rPicture))
-        return fail(file.error() != QFileDevice::NoError ? file.errorString() : writer.errorString());
-    if (!file.commit())
-        return fail(file.errorString());
-    return TQL::Result::Ok;
+        o_rError = TextFromPath(i_rPath.filename()) + ": the window gave no picture; try again with a longer --after";
+        return TQL::Result::NotAvailable;
+    }
+    Recordings::VFileReplacement file(i_rPath);
+    TQL::IResult result = file.Open(o_rError);
+    if (result.IsSuccess())
+        result = file.Write(bytes.toStdString(), o_rError);
+    return result.IsSuccess() ? file.Commit(o_rError) : result;
 }
 
 } // namespace Studio

@@ -3,9 +3,9 @@
 #include "TQL/IResult.h"
 
 #include <QtCore/QPointF>
-#include <QtCore/QString>
 #include <QtGui/QImage>
 
+#include <filesystem>
 #include <string>
 
 class QObject;
@@ -27,6 +27,9 @@ QObject* FindTraceManager(QQuickWidget& i_rQuickWidget);
 /// Whether some channel has data in the window.
 bool HasTraceData(QQuickWidget& i_rQuickWidget);
 
+/// False where Qt Quick had to fall back to drawing without OpenGL: the traces are missing then. Once it is shown.
+bool DrawsWithOpenGL(QQuickWidget& i_rQuickWidget);
+
 /// The time axis, in frames. NotSupported when the content does not offer it.
 [[nodiscard]] TQL::IResult SetTimeRange(QQuickWidget& i_rQuickWidget, const QPointF& i_rRange);
 
@@ -35,6 +38,7 @@ bool HasTraceData(QQuickWidget& i_rQuickWidget);
 
 /// Writes a PNG file; a file that was there is replaced only when all of the new one is on the disk. o_rError is one
 /// line.
-[[nodiscard]] TQL::IResult SavePicture(const QImage& i_rPicture, const QString& i_rPath, std::string& o_rError);
+[[nodiscard]] TQL::IResult SavePicture(const QImage& i_rPicture, const std::filesystem::path& i_rPath,
+                                       std::string& o_rError);
 
 } // namespace Studio

@@ -19,7 +19,7 @@ namespace
 
 std::atomic<bool> bStarted = false;
 
-constexpr const char* displayAdvice = "; run it under xvfb-run, or set QT_QPA_PLATFORM=offscreen";
+constexpr const char* displayAdvice = "; run it on a desktop or under xvfb-run";
 
 TQL::ELogSeverity SeverityOf(QtMsgType i_Type)
 {
@@ -59,7 +59,10 @@ void HandleMessage(QtMsgType i_Type, const QMessageLogContext& i_rContext, const
 {
     if (i_Type == QtFatalMsg)
         GiveUp(i_rText);
-    TQL::Log::Write(TQL::Log::GetCategory("Qt"), SeverityOf(i_Type), i_rText.toStdString(),
+    // A missing folder of the desktop's is nothing that an operator of this program could mend.
+    const bool bDesktop = i_rText.startsWith(QLatin1String("QStandardPaths:"));
+    const TQL::ELogSeverity severity = bDesktop ? TQL::ELogSeverity::Detail : SeverityOf(i_Type);
+    TQL::Log::Write(TQL::Log::GetCategory("Qt"), severity, i_rText.toStdString(),
                     i_rContext.file ? i_rContext.file : "Qt", i_rContext.line);
 }
 

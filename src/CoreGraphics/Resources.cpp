@@ -19,7 +19,7 @@ namespace
 
 constexpr const char* c_ShaderSuffix = "glsl";
 constexpr const char* c_BuiltInRoot = ":";
-constexpr int c_VersionMessageLine = 60; // named in the texts that support works with
+constexpr int c_VersionMessageLine = 60; // goes with this message wherever the code moves
 
 void ScanFolder(const std::string& i_rFolder, EShaderKind i_Kind,
                 std::map<std::string, std::shared_ptr<VShader>>& o_rShaders)

@@ -4,7 +4,9 @@
 
 #include <algorithm>
 #include <memory>
+#include <span>
 #include <utility>
+#include <vector>
 
 namespace GraphPlotUI
 {
@@ -75,6 +77,15 @@ void FitTexels(TraceTexelRing& i_rRing)
     i_rRing.Texels.resize(std::size_t{i_rRing.Source.ComponentCount} * TraceTexelRing::Capacity);
 }
 
+/// Room for so many values in a scratch that keeps its size: what is read next overwrites it.
+template <typename T>
+std::span<T> Room(std::vector<T>& i_rScratch, std::size_t i_Values)
+{
+    if (i_rScratch.size() < i_Values)
+        i_rScratch.resize(i_Values);
+    return std::span(i_rScratch).first(i_Values);
+}
+
 /// Reads the rows of a range into the scratch of its level. False when the block gives less.
 bool ReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, const TickRange& i_rRange)
 {
@@ -82,22 +93,20 @@ bool ReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, const TickRange& i
     const std::size_t values =
         static_cast<std::size_t>(i_rJob.RowsOf(i_rRange.First, i_rRange.Last)) * rSource.ComponentCount;
     if (rSource.Level == 0)
-    {
-        i_rRing.SampleScratch.resize(values);
-        return i_rJob.rBlock.ReadSamples(i_rRange, i_rRing.SampleScratch).IsSuccess();
-    }
-    i_rRing.RecordScratch.resize(values);
-    return i_rJob.rBlock.ReadSummary(i_rRange, rSource.Level - 1u, i_rRing.RecordScratch) >= values;
+        return i_rJob.rBlock.ReadSamples(i_rRange, Room(i_rRing.SampleScratch, values)).IsSuccess();
+    return i_rJob.rBlock.ReadSummary(i_rRange, rSource.Level - 1u, Room(i_rRing.RecordScratch, values)) >= values;
 }
 
-void WriteReadRows(TraceTexelRing& i_rRing, std::int64_t i_RowOffset)
+/// Writes the rows that were read last.
+void WriteReadRows(TraceTexelRing& i_rRing, std::int64_t i_Rows, std::int64_t i_RowOffset)
 {
     FitTexels(i_rRing);
+    const auto values = static_cast<std::size_t>(i_Rows) * i_rRing.Source.ComponentCount;
     const auto offset = static_cast<std::uint32_t>(i_RowOffset);
     if (i_rRing.Source.Level == 0)
-        WriteRows(i_rRing, std::span<const float>(i_rRing.SampleScratch), offset);
+        WriteRows(i_rRing, std::span<const float>(i_rRing.SampleScratch).first(values), offset);
     else
-        WriteRows(i_rRing, std::span<const ChannelSystem::LodRecord>(i_rRing.RecordScratch), offset);
+        WriteRows(i_rRing, std::span<const ChannelSystem::LodRecord>(i_rRing.RecordScratch).first(values), offset);
 }
 
 /// Drops the rows at either end that the block no longer has or the limit forbids.
@@ -157,7 +166,7 @@ bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
     }
     rExtent.Start = (rExtent.Start - static_cast<std::uint32_t>(rows)) & TraceTexelRing::RowMask;
     rExtent.FirstTick = first;
-    WriteReadRows(i_rRing, 0);
+    WriteReadRows(i_rRing, rows, 0);
     return true;
 }
 
@@ -189,7 +198,7 @@ bool Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
         rExtent.ValidFirstTick = std::max(rExtent.ValidFirstTick, rExtent.FirstTick);
     }
     rExtent.EndTick = last;
-    WriteReadRows(i_rRing, rExtent.RowCount);
+    WriteReadRows(i_rRing, rows, rExtent.RowCount);
     return true;
 }
 

@@ -4,6 +4,7 @@
 #include <bit>
 #include <cstddef>
 #include <cstring>
+#include <type_traits>
 
 namespace GraphPlotUI
 {
@@ -63,22 +64,15 @@ bool IsMissing(const TraceTexel& i_rTexel)
     return IsMissing(i_rTexel.Maximum);
 }
 
-/// Writes one texel with its distance and tells whether it has data.
-bool MakeTexel(TraceTexel& o_rTexel, float i_Sample, float i_Distance)
+/// A record with the distance 1. Lane 1 of the result tells that it has no data.
+Words StoreRecord(TraceTexel& o_rTexel, const LodRecord& i_rRecord)
 {
-    const bool bMissing = IsMissing(i_Sample);
-    o_rTexel = {i_Sample, bMissing ? -Infinity : i_Sample, bMissing ? Infinity : i_Sample, i_Distance};
-    return !bMissing;
+    const Floats values = Load(&i_rRecord);
+    StoreNext(o_rTexel, values);
+    return NotFinite(values);
 }
 
-bool MakeTexel(TraceTexel& o_rTexel, const LodRecord& i_rRecord, float i_Distance)
-{
-    o_rTexel = {i_rRecord.Mean, i_rRecord.Maximum, i_rRecord.Minimum, i_Distance};
-    return !IsMissing(i_rRecord.Maximum);
-}
-
-/// Writes texels as they are where every one has data and follows one with data. False when one has none; what was
-/// written is worth nothing then.
+/// Writes texels as if each had data and followed one with data. False when one has none: see WriteGaps.
 bool WriteGapless(TraceTexel* o_pTexels, const float* i_pSamples, std::size_t i_Count)
 {
     Words missing = {};
@@ -94,19 +88,22 @@ bool WriteGapless(TraceTexel* o_pTexels, const float* i_pSamples, std::size_t i_
     }
     bool bMissing = (missing[0] | missing[1] | missing[2] | missing[3]) != 0;
     for (; i < i_Count; ++i)
-        bMissing = !MakeTexel(o_pTexels[i], i_pSamples[i], 1.0f) || bMissing;
+    {
+        o_pTexels[i] = {i_pSamples[i], i_pSamples[i], i_pSamples[i], 1.0f};
+        bMissing = IsMissing(i_pSamples[i]) || bMissing;
+    }
     return !bMissing;
 }
 
 bool WriteGapless(TraceTexel* o_pTexels, const LodRecord* i_pRecords, std::size_t i_Count)
 {
     Words missing = {};
-    for (std::size_t i = 0; i < i_Count; ++i)
-    {
-        const Floats values = Load(&i_pRecords[i]);
-        missing |= NotFinite(values);
-        StoreNext(o_pTexels[i], values);
-    }
+    std::size_t i = 0;
+    for (; i + 8 <= i_Count; i += 8) // by eight, so that the loop costs less than what it does
+        for (std::size_t k = i; k < i + 8; ++k)
+            missing |= StoreRecord(o_pTexels[k], i_pRecords[k]);
+    for (; i < i_Count; ++i)
+        missing |= StoreRecord(o_pTexels[i], i_pRecords[i]);
     return missing[1] == 0;
 }
 
@@ -121,9 +118,22 @@ struct RowBlock
     std::uint32_t RowsBefore; ///< that the ring holds before source row 0
 };
 
-/// The rows one by one, with what the columns count on the way.
+/// Gives a texel the marks of a row without data where it has none. True when it has data.
 template <typename TSource>
-void WriteWithGaps(TraceTexelRing& i_rRing, const RowBlock<TSource>& i_rBlock)
+bool MarkMissing(TraceTexel& i_rTexel)
+{
+    const bool bMissing = IsMissing(i_rTexel);
+    if constexpr (std::is_same_v<TSource, float>) // a summary record comes with them
+    {
+        i_rTexel.Maximum = bMissing ? -Infinity : i_rTexel.Maximum;
+        i_rTexel.Minimum = bMissing ? Infinity : i_rTexel.Minimum;
+    }
+    return !bMissing;
+}
+
+/// Goes over a block that was written as if it had no gaps, with what the columns count on the way.
+template <typename TSource>
+void WriteGaps(TraceTexelRing& i_rRing, const RowBlock<TSource>& i_rBlock)
 {
     const std::size_t columns = i_rRing.Source.ComponentCount;
     const auto firstRow = static_cast<std::int32_t>(i_rBlock.FirstRow);
@@ -133,26 +143,24 @@ void WriteWithGaps(TraceTexelRing& i_rRing, const RowBlock<TSource>& i_rBlock)
     {
         RingColumn& rColumn = i_rRing.Columns[c];
         std::int32_t lastData = firstRow - static_cast<std::int32_t>(rColumn.Distance);
+        std::int32_t firstData = endRow;
         std::int32_t lastGap = 0;
         std::int32_t longest = 1;
         TraceTexel* pTexel = i_rBlock.pTexels + c;
-        const TSource* pSource = i_rBlock.pSource + c;
-        for (std::int32_t row = firstRow; row < endRow; ++row)
+        for (std::int32_t row = firstRow; row < endRow; ++row, pTexel += columns)
         {
             const std::int32_t distance = row - lastData;
-            const bool bData = MakeTexel(*pTexel, *pSource, static_cast<float>(distance));
+            const bool bData = MarkMissing<TSource>(*pTexel);
+            pTexel->Distance = static_cast<float>(distance);
             const std::int32_t step = bData && lastData >= firstHeld ? distance : 1;
             lastGap = step > 1 ? row + 1 : lastGap;
             longest = std::max(longest, step);
             lastData = bData ? row : lastData;
-            pTexel += columns;
-            pSource += columns;
+            firstData = std::min(firstData, bData ? row : endRow);
         }
         rColumn.Distance = static_cast<float>(endRow - lastData);
-        for (std::uint32_t row = i_rBlock.FirstRow; row < i_rBlock.EndRow && rColumn.FirstData == RingColumn::NoRow;
-             ++row)
-            if (!IsMissing(i_rBlock.pTexels[(row - i_rBlock.FirstRow) * columns + c]))
-                rColumn.FirstData = row;
+        if (firstData < endRow)
+            rColumn.FirstData = std::min(rColumn.FirstData, static_cast<std::uint32_t>(firstData));
         if (lastGap != 0)
             rColumn.LastGap = static_cast<std::uint32_t>(lastGap);
         rColumn.LongestStep = std::max(rColumn.LongestStep, static_cast<std::uint32_t>(longest));
@@ -183,17 +191,20 @@ void CloseGapsBefore(TraceTexelRing& i_rRing, const RowBlock<TSource>& i_rBlock)
 template <typename TSource>
 void WriteRun(TraceTexelRing& i_rRing, RowBlock<TSource> i_Run)
 {
-    constexpr std::uint32_t blockRows = 8;
+    constexpr std::uint32_t blockRows = 12;
     const std::size_t columns = i_rRing.Source.ComponentCount;
     const std::uint32_t endRow = i_Run.EndRow;
+    bool bAfterGapless = false;
     while (i_Run.FirstRow < endRow)
     {
         i_Run.EndRow = std::min(i_Run.FirstRow + blockRows, endRow);
         const std::size_t texels = (i_Run.EndRow - i_Run.FirstRow) * columns;
-        if (WriteGapless(i_Run.pTexels, i_Run.pSource, texels))
+        const bool bGapless = WriteGapless(i_Run.pTexels, i_Run.pSource, texels);
+        if (!bGapless)
+            WriteGaps(i_rRing, i_Run);
+        else if (!bAfterGapless)
             CloseGapsBefore(i_rRing, i_Run);
-        else
-            WriteWithGaps(i_rRing, i_Run);
+        bAfterGapless = bGapless;
         i_Run.pTexels += texels;
         i_Run.pSource += texels;
         i_Run.FirstRow = i_Run.EndRow;

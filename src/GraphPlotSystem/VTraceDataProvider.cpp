@@ -4,16 +4,13 @@
 #include "CoreGraphics/Texture2D.h"
 #include "GraphPlotSystem/TraceRingFill.h"
 
-#include <algorithm>
 #include <utility>
 
 namespace GraphPlotUI
 {
 
 using TQL::IChannelInstanceId;
-using TQL::IResult;
 using TQL::ITraceId;
-namespace Result = TQL::Result;
 
 VTraceDataProvider::VTraceDataProvider(std::shared_ptr<TQL::IPostalService> i_pUiPostalService)
     : m_pDataChanged(std::make_shared<NotificationSystem::VChangeSignal>(i_pUiPostalService))

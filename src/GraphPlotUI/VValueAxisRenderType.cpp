@@ -6,6 +6,14 @@
 namespace GraphPlotUI
 {
 
+namespace
+{
+
+// The axis line of the far edge stands on the very edge of the viewport, where rounding decides whether it is clipped.
+constexpr double EdgeInset = 1.0 / 64.0;
+
+} // namespace
+
 VValueAxisRenderType::VValueAxisRenderType(QQuickItem* i_pParent)
     : VAxisRenderType(i_pParent)
 {
@@ -42,7 +50,7 @@ void VValueAxisRenderType::UpdateViewMatrix()
     const AxisRange& rRange = GetRange();
     QMatrix4x4 view;
     view.scale(1.0f, static_cast<float>(rRange.PixelsPerUnit()), 1.0f);
-    view.translate(static_cast<float>(0.5 - GetScaledRect().x()),
+    view.translate(static_cast<float>(0.5 - EdgeInset - GetScaledRect().x()),
                    static_cast<float>(0.5 * rRange.UnitsPerPixel() - rRange.Minimum), 0.0f);
     SetView(view);
 }

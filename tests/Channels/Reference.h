@@ -4,13 +4,14 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <cstddef>
 #include <cstdint>
 #include <limits>
 #include <random>
 #include <span>
-#include <string>
+#include <tuple>
 #include <vector>
 
 namespace ChannelsTest
@@ -57,8 +58,8 @@ inline ::testing::AssertionResult IsSame(const LodRecord& i_rActual, const LodRe
         return ::testing::AssertionSuccess();
     const auto text = [](const LodRecord& i_rRecord)
     {
-        return "(" + std::to_string(i_rRecord.Mean) + ", " + std::to_string(i_rRecord.Maximum) + ", " +
-               std::to_string(i_rRecord.Minimum) + ", " + std::to_string(i_rRecord.Count) + ")";
+        return ::testing::PrintToString(
+            std::make_tuple(i_rRecord.Mean, i_rRecord.Maximum, i_rRecord.Minimum, i_rRecord.Count));
     };
     return ::testing::AssertionFailure() << text(i_rActual) << " instead of " << text(i_rExpected);
 }

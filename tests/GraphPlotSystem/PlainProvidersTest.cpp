@@ -100,7 +100,7 @@ TEST_F(PlainTexts, ChannelsThatLookTheSameShareASubType)
 {
     const std::vector<TQL::ComponentGroup> mm{UnitOf({{Millimetre, 1}})};
     auto idOf = [&, number = 0u](const char* i_pType, const char* i_pInstance, const char* i_pComponents,
-                                       const std::vector<TQL::ComponentGroup>& i_rGroups) mutable
+                                 const std::vector<TQL::ComponentGroup>& i_rGroups) mutable
     {
         const auto pChannel = MakeChannel(number++, i_pType, i_pInstance, i_pComponents, i_rGroups);
         EXPECT_TRUE(pTexts->Update(pChannel).IsSuccess());

@@ -63,7 +63,7 @@ TEST(AxisRangeTest, FindsRoundDivisions)
         {{0.0, 1.0, 1000}, 0.05, 0.2, 4, 1.0},
         {{0.0, 100.0, 1000}, 5.0, 20.0, 4, 1.0}, // gap 1, equal to the power of ten
         {{0.0, 30.0, 1000}, 1.0, 5.0, 5, 0.14 / 0.24},
-        {{0.0, 10.0, 1000}, 0.2, 1.0, 5, 0.03 / 0.08}, // gap 0.1, an odd power of ten: step 0.05
+        {{0.0, 10.0, 1000}, 0.2, 1.0, 5, 0.025 / 0.075}, // gap 0.1, an odd power of ten: step 0.05
         {{0.0, 3.0, 1000}, 0.05, 0.2, 4, 0.004 / 0.024},
         {{0.0, 499.9, 1000}, 5.0, 20.0, 4, 0.0}, // minors all but ten pixels apart
         {{0.0, 500.0, 1000}, 20.0, 100.0, 5, 1.0},
@@ -152,7 +152,7 @@ TEST(AxisRangeTest, NarrowRangesGetFinerMajors)
         // Only 100 fits: major 5, minor 1, which is exactly the gap and still drawn.
         {{95.0, 105.0, 100}, 5.0, 1.0, true},
         // One refinement does not do: the second one divides the other way round.
-        {{0.1, 0.9, 27}, 0.25, 0.0625, false},
+        {{0.1, 0.9, 27}, 0.25, 0.05, false},
         // Two refinements at most, then it stays as it is.
         {{0.11, 0.14, 10}, 0.01, 0.0025, false},
     };

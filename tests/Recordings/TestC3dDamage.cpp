@@ -31,6 +31,13 @@ C3dSpec DamageSpec()
     return spec;
 }
 
+// Where a name stands for the first time.
+std::vector<std::byte>::iterator PlaceOf(const std::string& i_rName, std::vector<std::byte>& io_rBytes)
+{
+    return std::search(io_rBytes.begin(), io_rBytes.end(), i_rName.begin(), i_rName.end(),
+                       [](std::byte i_Byte, char i_Character) { return static_cast<char>(i_Byte) == i_Character; });
+}
+
 // What must hold of any file: an error in one line, or samples that the file has room for.
 void ReadAnything(const std::vector<std::byte>& i_rBytes, const std::string& i_rWhat)
 {
@@ -142,10 +149,17 @@ TEST(C3dDamage, SaysWhatIsWrong)
         {"the parameter section is damaged behind POINT. ", // the type of the first parameter
          [](const BuiltC3d&, Bytes& io_r)
          {
-             const std::string name = "USED";
-             const auto at = std::search(io_r.begin(), io_r.end(), name.begin(), name.end(),
-                                         [](std::byte i_A, char i_B) { return static_cast<char>(i_A) == i_B; });
-             *(at + 6) = std::byte{9};
+             *(PlaceOf("USED", io_r) + 6) = std::byte{9};
+         }},
+        {"the parameter section is damaged behind FRAMES. ", // a list longer than the section
+         [](const BuiltC3d&, Bytes& io_r)
+         {
+             std::fill_n(PlaceOf("LABELS", io_r) + 10, 2, std::byte{255});
+         }},
+        {"the parameter section is damaged behind USED. ", // a record that points into itself
+         [](const BuiltC3d&, Bytes& io_r)
+         {
+             *(PlaceOf("SCALE", io_r) + 5) = std::byte{3};
          }},
         {"the file ends before its first frame is complete. ",
          [](const BuiltC3d& i_rBuilt, Bytes& io_r)

@@ -209,11 +209,11 @@ TEST(C3dKinds, UnsignedAnalog)
         float Value;
     };
     const Case cases[] = {
-        {"said", "UNSIGNED", 0, 0xFFF0, 0xFFF1, 1.0f},
+        {"said", "UNSIGNED", 0, 0xFFF0, 0x0010, -65504.0f},
         {"said, offset 0", "unsigned", 0, 0, 0xFFFF, 65535.0f},
         {"said to be signed", "SIGNED", 16, 0, 0xFFFF, -1.0f},
-        {"signed against its bits", "SIGNED", 16, 0x8000, 0x8001, 1.0f},
-        {"by bits and offset", "", 16, 0x8000, 0xFFFF, 32767.0f},
+        {"signed against its bits", "SIGNED", 16, 0x8000, 0x0001, 32769.0f},
+        {"by bits and offset", "", 16, 0x8000, 0x7FFF, -1.0f},
         {"bits alone", "", 16, 0, 0xFFFF, -1.0f},
         {"nothing said", "", 0, 0, 0xFFFE, -2.0f},
         {"12 bits", "", 12, 2048, 4095, 2047.0f},
@@ -293,7 +293,7 @@ TEST(C3dKinds, FrameNumbersAndRates)
     const Case cases[] = {
         {0, 120.0, 10, 0, 1125000, 112500}, // counts from 0: taken as the first frame
         {1, 120.0, 10, 0, 1125000, 112500}, {121, 100.0, 1, 162000000, 1350000, 1350000},
-        {1, 59.94, 7, 0, 2252252, 321750}, // 2252252 / 7 is whole no more: nearest to the rate
+        {1, 59.94, 8, 0, 2252252, 281532}, // not 2252252 / 8, which is no whole number: nearest to the rate
         {1, 1e-9, 1, 0, 1350000, 1350000}, // no usable rate
     };
     for (const Case& rCase : cases)

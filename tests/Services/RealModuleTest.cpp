@@ -2,12 +2,15 @@
 #include "Services/VContextTimeFeed.h"
 #include "Services/VHostServices.h"
 #include "Services/VPluginHost.h"
+#include "Services/VQmlEngineHost.h"
 #include "Services/VTimeController.h"
 #include "support/LogGuard.h"
 
 #include <gmock/gmock.h>
 
 #include <QtCore/QCoreApplication>
+#include <QtQml/QQmlEngine>
+#include <QtQml/QQmlError>
 #include <QtWidgets/QVBoxLayout>
 
 namespace Services
@@ -34,6 +37,14 @@ TEST(RealModule, LivesTwiceInTheStrictHostWithoutAFault)
     pWalk->SetFrames(10, 500);
     const VContextTimeFeed walkFeed(pWalk, rTime.AddSource("Walk", OrvanePluginInterface::ETimeMode::Review),
                                     services.Ledger());
+
+    std::string warnings; // of the scenes; a broken binding shows nowhere else
+    QObject::connect(services.EngineHost()->GetEngine(), &QQmlEngine::warnings,
+                     [&](const QList<QQmlError>& i_rErrors)
+                     {
+                         for (const QQmlError& rError : i_rErrors)
+                             warnings += rError.toString().toStdString() + "\n";
+                     });
 
     VPluginHost host(services);
     for (int life = 0; life < 2; ++life)
@@ -65,6 +76,7 @@ TEST(RealModule, LivesTwiceInTheStrictHostWithoutAFault)
             delete pContent.data();
         EXPECT_EQ(host.Unload(), TQL::Result::Ok) << "life " << life;
         EXPECT_TRUE(pContent.isNull());
+        EXPECT_EQ(warnings, "") << "life " << life;
         EXPECT_THAT(services.Faults(), ElementsAre()) << "life " << life;
         rTime.SetCurrentSource("");
         QCoreApplication::processEvents();

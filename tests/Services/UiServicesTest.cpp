@@ -48,7 +48,8 @@ TEST(VQmlEngineHost, ANullObjectLeavesThePropertyPresent)
     EXPECT_EQ(Evaluate(rEngine, look), "object true");
     EXPECT_THAT(host.PropertiesWithObject(), ElementsAre());
     host.ReleaseUnused();
-    EXPECT_EQ(Evaluate(rEngine, look), "object true") << "the engine is still of use";
+    EXPECT_EQ(Evaluate(rEngine, look), "object true");
+    EXPECT_EQ(Evaluate(rEngine, "Qt.point(3, 4).y"), "4") << "the engine is still of use";
 }
 
 TEST(VContentRegistry, KeepsAFactoryUntilItIsUnregistered)

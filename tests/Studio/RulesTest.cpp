@@ -3,6 +3,7 @@
 #include "Simulation/RecordWalk.h"
 #include "Studio/ChannelTable.h"
 #include "Studio/ContextNames.h"
+#include "Studio/Paths.h"
 #include "Studio/TimeText.h"
 #include "Studio/VContextSelection.h"
 #include "Studio/VFrameClock.h"
@@ -15,9 +16,12 @@
 #include <QtCore/QJsonArray>
 #include <QtCore/QJsonDocument>
 #include <QtCore/QJsonObject>
+#include <QtCore/QTemporaryDir>
 
 #include <chrono>
 #include <cmath>
+#include <filesystem>
+#include <fstream>
 #include <future>
 #include <limits>
 #include <map>
@@ -138,6 +142,24 @@ TEST(TimeText, TicksBecomeAClock)
                 {240 * 3600 * second, "240:00:00.000"}};
     for (const auto& rRow : rows)
         EXPECT_EQ(Studio::FormatTime(rRow.Ticks), rRow.pText);
+}
+
+TEST(Paths, TheSampleIsFoundBesideAnInstalledProgramAndInTheTree)
+{
+    for (const char* pPlace : {"share/graphplots/samples", "samples"})
+    {
+        const QTemporaryDir temporary;
+        const std::filesystem::path root = temporary.path().toStdString();
+        const bool bInstalled = std::string(pPlace) != "samples";
+        const auto program = root / (bInstalled ? "bin" : "build/dev/bin");
+        std::filesystem::create_directories(program);
+        EXPECT_EQ(Studio::FindSample(program), std::filesystem::path());
+        std::filesystem::create_directories(root / pPlace / "walk.c3d"); // a folder of that name is no sample
+        EXPECT_EQ(Studio::FindSample(program), std::filesystem::path());
+        std::filesystem::remove(root / pPlace / "walk.c3d");
+        std::ofstream(root / pPlace / "walk.c3d") << "sample";
+        EXPECT_EQ(Studio::FindSample(program), root / pPlace / "walk.c3d");
+    }
 }
 
 TEST(ContextNames, AreUniqueAndNeverReserved)

@@ -223,29 +223,35 @@ TEST_F(StudioSession, TheWindowFollowsContextTimeAndSelection)
 
 TEST(PlotContent, APictureIsWrittenWholeOrNotAtAll)
 {
-    QTemporaryDir folder;
+    const QTemporaryDir temporary;
+    const std::filesystem::path folder = temporary.path().toStdString();
     QImage picture(64, 48, QImage::Format_RGB32);
     picture.fill(Qt::darkGreen);
-    const QString path = folder.filePath(QStringLiteral("p.png"));
+    const auto path = folder / "p.png";
     std::string error;
     ASSERT_TRUE(Studio::SavePicture(picture, path, error).IsSuccess()) << error;
-    EXPECT_EQ(QImage(path).size(), picture.size());
+    const auto saved = [&]
+    {
+        return QImage(QString::fromStdString(path.string())).size();
+    };
+    EXPECT_EQ(saved(), picture.size());
 
     const struct
     {
         QImage Picture;
-        QString Path;
+        std::filesystem::path Path;
         const char* pPart;
-    } rows[] = {{picture, folder.filePath(QStringLiteral("no/such/p.png")), "does not exist; make it first"},
-                {picture, folder.path(), "it is a folder"},
+    } rows[] = {{picture, folder / "no" / "such" / "p.png", "folder that exists"},
+                {picture, folder, "this is a folder"},
+                {picture, "/dev/full", "space"},
                 {QImage(), path, "the window gave no picture"}};
     for (const auto& rRow : rows)
     {
         error.clear();
-        EXPECT_TRUE(Studio::SavePicture(rRow.Picture, rRow.Path, error).IsError());
+        EXPECT_TRUE(Studio::SavePicture(rRow.Picture, rRow.Path, error).IsError()) << rRow.Path;
         EXPECT_NE(error.find(rRow.pPart), std::string::npos) << error;
     }
-    EXPECT_EQ(QImage(path).size(), picture.size()) << "the old one is still there";
+    EXPECT_EQ(saved(), picture.size()) << "the old one is still there";
 }
 
 } // namespace
