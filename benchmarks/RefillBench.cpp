@@ -68,7 +68,7 @@ public:
         const std::int64_t stride = s_Period << i_Level;
         const TickRange ticks = {i_First * stride, (i_First + i_Rows) * stride};
         i_rRing.Extent.RowCount = 0;
-        if (!GraphPlotUI::FillRing(i_rRing, m_Block, m_Range, ticks, ticks, i_Level) ||
+        if (!GraphPlotUI::FillRing(i_rRing, m_Scratch, m_Block, m_Range, ticks, ticks, i_Level) ||
             i_rRing.Extent.RowCount != static_cast<std::uint32_t>(i_Rows))
             throw std::runtime_error("a refill did not give the rows that it was asked for");
         Keep(i_rRing.Texels);
@@ -77,6 +77,7 @@ public:
 private:
     std::shared_ptr<Channels::VSampleStore> m_pStore;
     Channels::VSampleBlock m_Block;
+    mutable GraphPlotUI::RingScratch m_Scratch;
     TickRange m_Range;
 };
 

@@ -59,6 +59,7 @@ TickRange Intersect(const TickRange& i_rA, const TickRange& i_rB)
 struct FillJob
 {
     const IChannelBlock& rBlock;
+    RingScratch& rScratch;
     TickRange Allowed; ///< what the block has and the limit allows
     TickRange Wanted;  ///< the request inside that
     std::int64_t BlockLast;
@@ -93,20 +94,20 @@ bool ReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, const TickRange& i
     const std::size_t values =
         static_cast<std::size_t>(i_rJob.RowsOf(i_rRange.First, i_rRange.Last)) * rSource.ComponentCount;
     if (rSource.Level == 0)
-        return i_rJob.rBlock.ReadSamples(i_rRange, Room(i_rRing.SampleScratch, values)).IsSuccess();
-    return i_rJob.rBlock.ReadSummary(i_rRange, rSource.Level - 1u, Room(i_rRing.RecordScratch, values)) >= values;
+        return i_rJob.rBlock.ReadSamples(i_rRange, Room(i_rJob.rScratch.Samples, values)).IsSuccess();
+    return i_rJob.rBlock.ReadSummary(i_rRange, rSource.Level - 1u, Room(i_rJob.rScratch.Records, values)) >= values;
 }
 
 /// Writes the rows that were read last.
-void WriteReadRows(TraceTexelRing& i_rRing, std::int64_t i_Rows, std::int64_t i_RowOffset)
+void WriteReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t i_Rows, std::int64_t i_RowOffset)
 {
     FitTexels(i_rRing);
     const auto values = static_cast<std::size_t>(i_Rows) * i_rRing.Source.ComponentCount;
     const auto offset = static_cast<std::uint32_t>(i_RowOffset);
     if (i_rRing.Source.Level == 0)
-        WriteRows(i_rRing, std::span<const float>(i_rRing.SampleScratch).first(values), offset);
+        WriteRows(i_rRing, std::span<const float>(i_rJob.rScratch.Samples).first(values), offset);
     else
-        WriteRows(i_rRing, std::span<const ChannelSystem::LodRecord>(i_rRing.RecordScratch).first(values), offset);
+        WriteRows(i_rRing, std::span<const ChannelSystem::LodRecord>(i_rJob.rScratch.Records).first(values), offset);
 }
 
 /// Drops the rows at either end that the block no longer has or the limit forbids.
@@ -166,7 +167,7 @@ bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
     }
     rExtent.Start = (rExtent.Start - static_cast<std::uint32_t>(rows)) & TraceTexelRing::RowMask;
     rExtent.FirstTick = first;
-    WriteReadRows(i_rRing, rows, 0);
+    WriteReadRows(i_rRing, i_rJob, rows, 0);
     return true;
 }
 
@@ -198,7 +199,7 @@ bool Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
         rExtent.ValidFirstTick = std::max(rExtent.ValidFirstTick, rExtent.FirstTick);
     }
     rExtent.EndTick = last;
-    WriteReadRows(i_rRing, rows, rExtent.RowCount);
+    WriteReadRows(i_rRing, i_rJob, rows, rExtent.RowCount);
     return true;
 }
 
@@ -212,8 +213,9 @@ bool IsContinued(const TraceTexelRing& i_rRing, const RingSource& i_rSource, con
 
 } // namespace
 
-bool FillRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const TickRange& i_rAvailable,
-              const TickRange& i_rRequested, const TickRange& i_rLimit, std::uint8_t i_Level)
+bool FillRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const IChannelBlock& i_rBlock,
+              const TickRange& i_rAvailable, const TickRange& i_rRequested, const TickRange& i_rLimit,
+              std::uint8_t i_Level)
 {
     const ChannelSystem::ChannelBlockShape& rShape = i_rBlock.GetShape();
     if (rShape.SamplePeriod <= 0 || !rShape.pLayout || rShape.pLayout->ComponentCount == 0)
@@ -226,7 +228,7 @@ bool FillRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const Tick
     const StoreLease lease(i_rBlock.GetStore(), allowed.First);
     const RingSource source = {rShape.pLayout->ComponentCount, rShape.FormatTag, rShape.SamplePeriod, lease.Token(),
                                i_Level};
-    const FillJob job = {i_rBlock, allowed, wanted, i_rAvailable.Last, rShape.GridOffset, source.Stride()};
+    const FillJob job = {i_rBlock, i_rScratch, allowed, wanted, i_rAvailable.Last, rShape.GridOffset, source.Stride()};
     const RingExtent extentBefore = i_rRing.Extent;
     const RingSource sourceBefore = i_rRing.Source;
     if (IsContinued(i_rRing, source, job))
@@ -253,10 +255,11 @@ bool FillRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const Tick
     return false;
 }
 
-void UpdateRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const TickRange& i_rAvailable,
-                const TickRange& i_rRequested, const TickRange& i_rLimit, std::uint8_t i_Level)
+void UpdateRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const IChannelBlock& i_rBlock,
+                const TickRange& i_rAvailable, const TickRange& i_rRequested, const TickRange& i_rLimit,
+                std::uint8_t i_Level)
 {
-    if (!FillRing(i_rRing, i_rBlock, i_rAvailable, i_rRequested, i_rLimit, i_Level))
+    if (!FillRing(i_rRing, i_rScratch, i_rBlock, i_rAvailable, i_rRequested, i_rLimit, i_Level))
         return;
     const RingExtent& rExtent = i_rRing.Extent;
     const bool bLow = i_rRequested.First < rExtent.ValidFirstTick;
@@ -271,7 +274,7 @@ void UpdateRing(TraceTexelRing& i_rRing, const IChannelBlock& i_rBlock, const Ti
     // Mostly there is nothing more to have, which a glance tells without another lease.
     const TickRange wanted = Intersect(Intersect(widened, i_rLimit), i_rAvailable);
     if (wanted.First < rExtent.FirstTick || wanted.Last > rExtent.EndTick)
-        (void)FillRing(i_rRing, i_rBlock, i_rAvailable, widened, i_rLimit, i_Level);
+        (void)FillRing(i_rRing, i_rScratch, i_rBlock, i_rAvailable, widened, i_rLimit, i_Level);
 }
 
 } // namespace GraphPlotUI

@@ -191,7 +191,7 @@ void CloseGapsBefore(TraceTexelRing& i_rRing, const RowBlock<TSource>& i_rBlock)
 template <typename TSource>
 void WriteRun(TraceTexelRing& i_rRing, RowBlock<TSource> i_Run)
 {
-    constexpr std::uint32_t blockRows = 12;
+    constexpr std::uint32_t blockRows = 8;
     const std::size_t columns = i_rRing.Source.ComponentCount;
     const std::uint32_t endRow = i_Run.EndRow;
     bool bAfterGapless = false;

@@ -88,8 +88,6 @@ struct TraceTexelRing
     std::vector<TraceTexel> Texels;
     std::vector<RingGaps> Gaps; ///< one a component
 
-    std::vector<float> SampleScratch;
-    std::vector<ChannelSystem::LodRecord> RecordScratch;
     std::vector<RingColumn> Columns; ///< one a component
 
     /// Texture row of the i-th row.

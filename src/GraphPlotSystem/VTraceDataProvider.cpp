@@ -2,7 +2,6 @@
 
 #include "ChannelSystem/IChannelBlock.h"
 #include "CoreGraphics/Texture2D.h"
-#include "GraphPlotSystem/TraceRingFill.h"
 
 #include <utility>
 
@@ -59,7 +58,7 @@ void VTraceDataProvider::UpdateTrace(const IChannelInstanceId& i_rChannel, const
         TQL::TickRange available;
         i_rBlock.GetRange(available);
         change = UpdateValueTable(m_Values[i_rChannel], i_rChannel, i_rBlock, available);
-        UpdateRing(rRecord.Ring, i_rBlock, available, i_rRequested, i_rLimit, i_Level);
+        UpdateRing(rRecord.Ring, m_Scratch, i_rBlock, available, i_rRequested, i_rLimit, i_Level);
     }
     if (change.bComponentAdded)
         m_pDataChanged->Invoke();

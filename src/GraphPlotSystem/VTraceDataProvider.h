@@ -2,6 +2,7 @@
 
 #include "GraphPlotSystem/ITraceDataStorage.h"
 #include "GraphPlotSystem/TraceColours.h"
+#include "GraphPlotSystem/TraceRingFill.h"
 #include "GraphPlotSystem/TraceTexelRing.h"
 #include "GraphPlotSystem/TraceValueTable.h"
 #include "GraphPlotSystem/VTraceInspector.h"
@@ -115,6 +116,7 @@ private:
     TraceColours m_Colours;
     std::int64_t m_LatestFrame = 0;
     RecordMap m_Records; ///< erased from on the render thread only, under both mutexes
+    RingScratch m_Scratch;
     std::int64_t m_TicksPerFrame = TQL::DefaultFramePeriod;
     std::set<TQL::ITraceId, TraceOrder> m_Inspected;
     std::map<TQL::ITraceId, VTraceInspector, TraceOrder> m_Inspectors;

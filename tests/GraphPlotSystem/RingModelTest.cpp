@@ -51,7 +51,7 @@ public:
         m_Log += "request [" + std::to_string(m_Window.First) + ", " + std::to_string(m_Window.Last) + ") level " +
                  std::to_string(m_Level) + (bFree ? " free" : "") + (m_Block.bFail ? " fails" : "") + "\nbefore " +
                  before + "\n";
-        GraphPlotUI::UpdateRing(m_Ring, m_Block, m_Block.Range(), request, limit, m_Level);
+        GraphPlotUI::UpdateRing(m_Ring, m_Scratch, m_Block, m_Block.Range(), request, limit, m_Level);
         m_Log += "after " + ExtentText(m_Ring);
         EXPECT_EQ(m_Block.Store().Open, 0);
         const TickRange available = m_Block.Range();
@@ -213,6 +213,7 @@ private:
     const std::uint32_t m_Components;
     MemoryBlock m_Block;
     TraceTexelRing m_Ring;
+    GraphPlotUI::RingScratch m_Scratch;
     std::vector<TraceTexel> m_Texture;
     TickRange m_Window; ///< samples
     std::uint8_t m_Level = 0;

@@ -25,17 +25,24 @@ namespace
 
 constexpr TickRange Everything = {-1'000'000'000, 1'000'000'000};
 
+/// One for all rings, as in the provider: what it holds from before must not matter.
+GraphPlotUI::RingScratch& Scratch()
+{
+    static GraphPlotUI::RingScratch scratch;
+    return scratch;
+}
+
 /// Request and limit in sample numbers of the block.
 void Update(TraceTexelRing& i_rRing, const MemoryBlock& i_rBlock, TickRange i_Samples, std::uint8_t i_Level = 0)
 {
     const TickRange ticks = i_rBlock.Ticks(i_Samples.First, i_Samples.Last);
-    UpdateRing(i_rRing, i_rBlock, i_rBlock.Range(), ticks, ticks, i_Level);
+    UpdateRing(i_rRing, Scratch(), i_rBlock, i_rBlock.Range(), ticks, ticks, i_Level);
 }
 
 void UpdateFreely(TraceTexelRing& i_rRing, const MemoryBlock& i_rBlock, TickRange i_Samples, std::uint8_t i_Level = 0)
 {
-    UpdateRing(i_rRing, i_rBlock, i_rBlock.Range(), i_rBlock.Ticks(i_Samples.First, i_Samples.Last), Everything,
-               i_Level);
+    UpdateRing(i_rRing, Scratch(), i_rBlock, i_rBlock.Range(), i_rBlock.Ticks(i_Samples.First, i_Samples.Last),
+               Everything, i_Level);
 }
 
 } // namespace
@@ -443,7 +450,7 @@ TEST(Ring, AFailedReadLeavesItAsItWas)
         TakeDirty(ring);
         const std::string before = RingText(ring);
         rCase.Change(block);
-        UpdateRing(ring, block, block.Range(), rCase.Ticks, rCase.Ticks, rCase.Level);
+        UpdateRing(ring, Scratch(), block, block.Range(), rCase.Ticks, rCase.Ticks, rCase.Level);
         EXPECT_EQ(RingText(ring), before);
         EXPECT_EQ(TakeDirty(ring), "none");
         EXPECT_EQ(block.Store().Open, 0);

@@ -83,8 +83,9 @@ TEST(TraceDrawListTest, AComponentBeyondTheColoursHasNone)
     Ring ring = MakeRing(2, 10);
     ring.Info.Colours.resize(1);
     provider.Add(MakeChannel("a"), ring);
-    const TraceDrawList list = BuildTraceDrawList(provider, Traces({{"a", 0}, {"a", 1}}),
-                                                  {MakeChannel("a"), std::nullopt}, {0, 10, 100}, 0.0);
+    const auto traces = Traces({{"a", 0}, {"a", 1}}); // the list refers to them
+    const TraceDrawList list =
+        BuildTraceDrawList(provider, traces, {MakeChannel("a"), std::nullopt}, {0, 10, 100}, 0.0);
     EXPECT_EQ(ToText(list), "a1- a0+");
 }
 
