@@ -26,7 +26,8 @@ Divisions Divide(const AxisRange& i_rRange, EDivisionMode i_Mode = EDivisionMode
     Divisions divisions;
     DivideRange(
         i_rRange, i_Mode,
-        [&](float i_Value, bool i_bIsMajor) {
+        [&](float i_Value, bool i_bIsMajor)
+        {
             if (i_bIsMajor)
                 divisions.Majors.push_back(static_cast<int>(divisions.Values.size()));
             divisions.Values.push_back(i_Value);

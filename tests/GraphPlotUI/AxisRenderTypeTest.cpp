@@ -63,7 +63,8 @@ TEST(AxisRenderTypeTest, EveryChangeThatMovesTicksRebuildsThem)
 {
     VTimeAxisRenderType axis;
     QSignalSpy ticks(&axis, &VAxisRenderType::TicksChanged);
-    const auto changes = [&](const char* pProperty, const QVariant& i_rValue) {
+    const auto changes = [&](const char* pProperty, const QVariant& i_rValue)
+    {
         ticks.clear();
         axis.setProperty(pProperty, i_rValue);
         return ticks.count();

@@ -19,7 +19,7 @@ constexpr int FramesPerSample = 1;
 enum class EGaps
 {
     None,
-    Some,      ///< short ones all over
+    Some, ///< short ones all over
     HeadAndTail,
     Long,      ///< most of the middle
     Everywhere ///< every other row
@@ -171,8 +171,8 @@ TEST_F(SkippedDrawsTest, ThePictureStaysTheSameToThePixel)
             Show(rScene);
             Look(rScene, rView);
             bFocus = !bFocus;
-            m_Subplot.setFocusChannelOrTraceId(
-                bFocus ? QVariant::fromValue(TQL::ITraceId(MakeChannel("a"), 0)) : QVariant());
+            m_Subplot.setFocusChannelOrTraceId(bFocus ? QVariant::fromValue(TQL::ITraceId(MakeChannel("a"), 0))
+                                                      : QVariant());
             const QImage all = RenderWith(false);
             const QImage skipped = RenderWith(true);
             ASSERT_EQ(all, skipped);
@@ -199,7 +199,8 @@ TEST_F(SkippedDrawsTest, WhereTheRingStartsDoesNotShow)
 
 TEST_F(SkippedDrawsTest, WhatIsNotDrawnIsNotBound)
 {
-    const auto binds = [&](const Scene& i_rScene, const View& i_rView) {
+    const auto binds = [&](const Scene& i_rScene, const View& i_rView)
+    {
         Show(i_rScene);
         Look(i_rScene, i_rView);
         m_pProvider->Binds = 0;

@@ -13,7 +13,10 @@ namespace
 
 constexpr float Infinity = std::numeric_limits<float>::infinity();
 
-VertexList Points(std::initializer_list<QVector2D> i_Points) { return i_Points; }
+VertexList Points(std::initializer_list<QVector2D> i_Points)
+{
+    return i_Points;
+}
 
 IGraphPlotOverlay Overlay(float i_XMin, float i_XMax, float i_YMin, float i_YMax, std::uint32_t i_Edges = 0)
 {
@@ -34,7 +37,10 @@ const AxisRange RangeY{-1.0, 3.0, 400};     // 0.01 units a pixel
 TEST(SubplotGeometryTest, ViewMapsTheMinimumToTheFirstPixelCentre)
 {
     const QMatrix4x4 view = SubplotViewMatrix(RangeX, RangeY);
-    const auto near = [](const QVector3D& i_rA, const QVector3D& i_rB) { return (i_rA - i_rB).length() < 1e-3f; };
+    const auto near = [](const QVector3D& i_rA, const QVector3D& i_rB)
+    {
+        return (i_rA - i_rB).length() < 1e-3f;
+    };
     EXPECT_TRUE(near(view.map(QVector3D(-100.0f, -1.0f, 0.0f)), QVector3D(0.5f, 0.5f, 0.0f)));
     EXPECT_TRUE(near(view.map(QVector3D(300.0f, 3.0f, 0.0f)), QVector3D(800.5f, 400.5f, 0.0f)));
 }
@@ -107,13 +113,15 @@ TEST(SubplotGeometryTest, OverlayCoordinatesThatAreNotFiniteStandForTheEdge)
 
 TEST(SubplotGeometryTest, OverlayOutlinesHaveFourVerticesAVerticalAndSixAHorizontalEdge)
 {
-    const auto outline = [](std::uint32_t i_Edges) {
+    const auto outline = [](std::uint32_t i_Edges)
+    {
         return OverlayOutline(Overlay(10, 20, 1, 2, i_Edges), RangeX, RangeY);
     };
     EXPECT_EQ(outline(0), VertexList());
     EXPECT_EQ(outline(IGraphPlotOverlay::EdgeXMin), Points({{9.5f, 2}, {9.5f, 1}, {10.5f, 2}, {10.5f, 1}}));
     EXPECT_EQ(outline(IGraphPlotOverlay::EdgeXMax), Points({{19.5f, 2}, {19.5f, 1}, {20.5f, 2}, {20.5f, 1}}));
-    const auto horizontal = [](float i_Y) {
+    const auto horizontal = [](float i_Y)
+    {
         return Points({{10, i_Y + 0.01f},
                        {10, i_Y - 0.01f},
                        {20, i_Y + 0.01f},

@@ -40,15 +40,10 @@ TEST(SubplotRenderTypeTest, RangesRefuseWhatIsNoRange)
         bool bY;
     };
     const Case cases[] = {
-        {{2.0, 5.0}, true, true},
-        {{2.0, 5.0}, false, false}, // unchanged
-        {{5.0, 5.0}, false, false},
-        {{5.0, 2.0}, false, false},
-        {{NaN, 5.0}, false, false},
-        {{2.0, NaN}, false, false},
-        {{-Infinity, Infinity}, false, true}, // only the values may be infinite
-        {{0.0, Infinity}, false, true},
-        {{2.0, 5.0 + 1e-9}, true, true}, // compared exactly
+        {{2.0, 5.0}, true, true},       {{2.0, 5.0}, false, false}, // unchanged
+        {{5.0, 5.0}, false, false},     {{5.0, 2.0}, false, false},           {{NaN, 5.0}, false, false},
+        {{2.0, NaN}, false, false},     {{-Infinity, Infinity}, false, true}, // only the values may be infinite
+        {{0.0, Infinity}, false, true}, {{2.0, 5.0 + 1e-9}, true, true},      // compared exactly
     };
     VSubplotRenderType subplot;
     QSignalSpy spyX(&subplot, &VSubplotRenderType::ValueRangeXChanged);
@@ -87,7 +82,8 @@ TEST(SubplotRenderTypeTest, TraceIdsSkipStrangersAndEmitNothing)
 TEST(SubplotRenderTypeTest, FocusIsAChannelOrATraceOrNothing)
 {
     VSubplotRenderType subplot;
-    const auto set = [&](const QVariant& i_rVariant) {
+    const auto set = [&](const QVariant& i_rVariant)
+    {
         EXPECT_TRUE(QMetaObject::invokeMethod(&subplot, "setFocusChannelOrTraceId", Q_ARG(QVariant, i_rVariant)));
         const TraceFocus& rFocus = subplot.GetFocus();
         return (rFocus.Channel ? "channel " + rFocus.Channel->Text : std::string()) +

@@ -50,7 +50,8 @@ TEST(TraceDrawListTest, FocusGoesLastIsThickAndDimsTheOthers)
     provider.Add(MakeChannel("a"), MakeRing(3, 10));
     provider.Add(MakeChannel("b"), MakeRing(1, 10));
     const auto traces = Traces({{"a", 0}, {"a", 1}, {"a", 2}, {"b", 0}});
-    const auto order = [&](const TraceFocus& i_rFocus) {
+    const auto order = [&](const TraceFocus& i_rFocus)
+    {
         TraceDrawList list = BuildTraceDrawList(provider, traces, i_rFocus, {0, 10, 100}, 0.0);
         for (TraceDraw& rDraw : list.Draws) // white dims to 0.65
             EXPECT_EQ((*rDraw.Colour)[3], 1.0f);
@@ -97,7 +98,8 @@ TEST(TraceDrawListTest, AxisIsCountedInSamplesAndShiftedByOneFrame)
     ring.Info.OriginTick = 5000;
     provider.Add(MakeChannel("a"), ring);
     const auto traces = Traces({{"a", 0}});
-    const auto axis = [&](double i_Minimum, double i_Maximum, double i_Offset) {
+    const auto axis = [&](double i_Minimum, double i_Maximum, double i_Offset)
+    {
         const TraceDrawList list = BuildTraceDrawList(provider, traces, {}, {i_Minimum, i_Maximum, 100}, i_Offset);
         return list.Channels.begin()->second;
     };

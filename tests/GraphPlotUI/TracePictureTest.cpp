@@ -189,7 +189,8 @@ TEST_F(TracePictureTest, ALiveTraceMovesWithTheLatestFrame)
     m_Subplot.SetTraceIds(ToVariant({TQL::ITraceId(MakeChannel("a"), 0)}));
     m_Subplot.SetLiveContext(true);
     m_Subplot.SetValueRangeX({-100.0, 0.0});
-    const auto stepColumn = [&](std::int64_t i_Latest) {
+    const auto stepColumn = [&](std::int64_t i_Latest)
+    {
         m_pProvider->LatestFrame = i_Latest;
         const QImage image = Render();
         for (int x = 0; x < Size; ++x)
@@ -204,7 +205,10 @@ TEST_F(TracePictureTest, ALiveTraceMovesWithTheLatestFrame)
 
 TEST_F(TracePictureTest, AComponentBeyondTheColoursKeepsTheColourBeforeIt)
 {
-    const auto line = [](float i_Value) { return Samples({i_Value, i_Value}); };
+    const auto line = [](float i_Value)
+    {
+        return Samples({i_Value, i_Value});
+    };
     Ring ring({line(30.5f), line(60.5f)}, 0, m_pProvider->TicksPerFrame * 90);
     ring.Info.Colours = {{1.0f, 0.0f, 0.0f, 0.0f}}; // its own alpha does not count
     m_pProvider->Add(MakeChannel("a"), ring);

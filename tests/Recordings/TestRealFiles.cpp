@@ -230,9 +230,9 @@ TEST_F(RealFiles, SingleValuesAsTheirMakersPublishedThem)
     for (const Case& rCase : cases)
     {
         const VRecording recording = Open(rCase.File);
-        const RecordedChannel& rChannel = ChannelNamed(recording, rCase.Channel);
+        const RecordedChannel channel = ChannelNamed(recording, rCase.Channel);
         for (std::size_t i = 0; i < rCase.Values.size(); ++i)
-            EXPECT_NEAR(static_cast<double>(rChannel.Samples.at(rCase.Row * rCase.Values.size() + i)), rCase.Values[i],
+            EXPECT_NEAR(static_cast<double>(channel.Samples.at(rCase.Row * rCase.Values.size() + i)), rCase.Values[i],
                         rCase.Tolerance)
                 << rCase.File << " " << rCase.Channel;
     }
