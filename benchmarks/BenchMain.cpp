@@ -15,6 +15,7 @@ namespace Bench
 void RunNotification(Table& o_rTable);
 void RunRedraw(Table& o_rTable);
 void RunRefill(Table& o_rTable);
+void RunStore(Table& o_rTable);
 void RunSummary(Table& o_rTable);
 void RunUpdateTick(Table& o_rTable);
 
@@ -30,6 +31,7 @@ struct Entry
 constexpr Entry s_Entries[] = {{"notification", RunNotification},
                                {"summary", RunSummary},
                                {"refill", RunRefill},
+                               {"store", RunStore},
                                {"update", RunUpdateTick},
                                {"redraw", RunRedraw}};
 

@@ -44,15 +44,30 @@ bool HasTwoMajors(const AxisRange& i_rRange, double i_Major)
 
 } // namespace
 
-double AxisRange::Length() const noexcept { return std::abs(Maximum - Minimum); }
+double AxisRange::Length() const noexcept
+{
+    return std::abs(Maximum - Minimum);
+}
 
-double AxisRange::UnitsPerPixel() const noexcept { return PixelLength < 1 ? 0.0 : Length() / PixelLength; }
+double AxisRange::UnitsPerPixel() const noexcept
+{
+    return PixelLength < 1 ? 0.0 : Length() / PixelLength;
+}
 
-double AxisRange::PixelsPerUnit() const noexcept { return Maximum == Minimum ? 0.0 : PixelLength / Length(); }
+double AxisRange::PixelsPerUnit() const noexcept
+{
+    return Maximum == Minimum ? 0.0 : PixelLength / Length();
+}
 
-double AxisRange::ValueToPixels(double i_Value) const noexcept { return (i_Value - Minimum) * PixelsPerUnit(); }
+double AxisRange::ValueToPixels(double i_Value) const noexcept
+{
+    return (i_Value - Minimum) * PixelsPerUnit();
+}
 
-double AxisRange::PixelsToValue(double i_Pixels) const noexcept { return UnitsPerPixel() * i_Pixels + Minimum; }
+double AxisRange::PixelsToValue(double i_Pixels) const noexcept
+{
+    return UnitsPerPixel() * i_Pixels + Minimum;
+}
 
 void AxisRange::SetRange(double i_Minimum, double i_Maximum) noexcept
 {
@@ -60,7 +75,10 @@ void AxisRange::SetRange(double i_Minimum, double i_Maximum) noexcept
     Maximum = i_Maximum;
 }
 
-void AxisRange::SetPixelLength(std::int32_t i_PixelLength) noexcept { PixelLength = i_PixelLength; }
+void AxisRange::SetPixelLength(std::int32_t i_PixelLength) noexcept
+{
+    PixelLength = i_PixelLength;
+}
 
 bool FindDivisions(const AxisRange& i_rRange, double& o_rMajor, double& o_rMinor, std::int32_t& o_rSubdivisions,
                    double& o_rMinorFade)
@@ -130,8 +148,7 @@ void PanOffset(const AxisRange& i_rRange, bool i_bLive, bool i_bRelative, double
                double& o_rFirstTick, QVector3D& o_rTranslation)
 {
     const double minimum = i_rRange.Minimum;
-    const double first =
-        minimum + i_Offset - i_Major - std::fmod(i_bRelative ? minimum : minimum + i_Offset, i_Major);
+    const double first = minimum + i_Offset - i_Major - std::fmod(i_bRelative ? minimum : minimum + i_Offset, i_Major);
     o_rFirstTick = first - i_Offset;
     o_rTranslation = QVector3D(static_cast<float>(i_bLive ? first - i_Offset : first), 0.0f, 0.0f);
 }

@@ -18,7 +18,13 @@ static void CleanUp()
 namespace GraphPlotUI
 {
 
-void RegisterGraphPlotResources() { Initialise(); }
-void UnregisterGraphPlotResources() { CleanUp(); }
+void RegisterGraphPlotResources()
+{
+    Initialise();
+}
+void UnregisterGraphPlotResources()
+{
+    CleanUp();
+}
 
 } // namespace GraphPlotUI

@@ -120,7 +120,8 @@ SubplotGrid BuildSubplotGrid(const AxisRange& i_rX, const AxisRange& i_rY, EDivi
     double fade = 1.0;
     DivideRange(
         fromZero, i_Mode,
-        [&](float i_Value, bool i_bIsMajor) {
+        [&](float i_Value, bool i_bIsMajor)
+        {
             VertexList& rList = i_bIsMajor ? grid.Major : grid.MinorX;
             rList.insert(rList.end(), {{i_Value, y.Minimum}, {i_Value, y.Maximum}});
         },
@@ -132,7 +133,8 @@ SubplotGrid BuildSubplotGrid(const AxisRange& i_rX, const AxisRange& i_rY, EDivi
     fade = 1.0;
     DivideRange(
         i_rY, i_Mode,
-        [&](float i_Value, bool i_bIsMajor) {
+        [&](float i_Value, bool i_bIsMajor)
+        {
             VertexList& rList = i_bIsMajor ? grid.Major : grid.MinorY;
             rList.insert(rList.end(), {{0.0f, i_Value}, {spanX, i_Value}});
         },
@@ -155,7 +157,10 @@ VertexList OverlayOutline(const TQL::IGraphPlotOverlay& i_rOverlay, const AxisRa
     const FloatRange x(i_rX);
     const FloatRange y(i_rY);
     const OverlayRectangle rectangle(i_rOverlay, x, y);
-    const auto has = [&](std::uint32_t i_Flag) { return (i_rOverlay.EdgeFlags & i_Flag) != 0; };
+    const auto has = [&](std::uint32_t i_Flag)
+    {
+        return (i_rOverlay.EdgeFlags & i_Flag) != 0;
+    };
     VertexList vertices;
     if (has(TQL::IGraphPlotOverlay::EdgeXMin))
         AppendVerticalEdge(vertices, rectangle.XMin, x.UnitsPerPixel, rectangle);

@@ -26,7 +26,10 @@ struct TickView
 
 Colour4f Dimmed(const Colour4f& i_rColour)
 {
-    const auto dim = [](float i_Value) { return i_Value * 0.3f + 0.35f; };
+    const auto dim = [](float i_Value)
+    {
+        return i_Value * 0.3f + 0.35f;
+    };
     return {dim(i_rColour[0]), dim(i_rColour[1]), dim(i_rColour[2]), i_rColour[3]};
 }
 

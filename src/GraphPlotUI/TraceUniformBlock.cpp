@@ -27,6 +27,8 @@ constexpr std::array<CoreGraphics::NameHash, static_cast<std::size_t>(ETraceUnif
     CoreGraphics::HashName("u_CircleBufferStart"),
     CoreGraphics::HashName("u_CircleBufferCapacity"),
     CoreGraphics::HashName("u_FirstInstance"),
+    CoreGraphics::HashName("u_RowCount"),
+    CoreGraphics::HashName("u_StripWidth"),
 };
 
 } // namespace

@@ -28,6 +28,8 @@ enum class ETraceUniform : std::uint8_t
     CircleBufferStart,
     CircleBufferCapacity,
     FirstInstance, ///< added to gl_InstanceID
+    RowCount,      ///< of the ring
+    StripWidth,    ///< pixels
     Count
 };
 

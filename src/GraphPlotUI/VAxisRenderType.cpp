@@ -22,8 +22,7 @@ const QVector4D TickColour(1.0f, 1.0f, 1.0f, 1.0f);
 } // namespace
 
 VAxisRenderType::VAxisRenderType(QQuickItem* i_pParent)
-    : VBaseGraphRenderType(i_pParent)
-    , m_RenderState(GraphRenderState())
+    : VBaseGraphRenderType(i_pParent), m_RenderState(GraphRenderState())
 {
 }
 
@@ -72,7 +71,8 @@ void VAxisRenderType::AppendTicks(const AxisRange& i_rRange, VertexList& o_rVert
     const float base = TickEndCoordinate(m_MajorTickLength, false);
     DivideRange(
         i_rRange, DivisionMode,
-        [&](float i_Value, bool i_bIsMajor) {
+        [&](float i_Value, bool i_bIsMajor)
+        {
             o_rVertices.push_back(MakeVertex(i_Value, i_bIsMajor ? majorEnd : minorEnd));
             o_rVertices.push_back(MakeVertex(i_Value, base));
         },
@@ -87,7 +87,10 @@ void VAxisRenderType::AppendAxisLine(double i_First, double i_Last, VertexList& 
     o_rVertices.push_back(MakeVertex(static_cast<float>(i_Last), base));
 }
 
-void VAxisRenderType::SetTicks(VertexList i_Vertices) { m_Ticks.Set(std::move(i_Vertices)); }
+void VAxisRenderType::SetTicks(VertexList i_Vertices)
+{
+    m_Ticks.Set(std::move(i_Vertices));
+}
 
 void VAxisRenderType::SetPixelLength(double i_ScaledLength)
 {

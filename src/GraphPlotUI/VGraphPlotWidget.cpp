@@ -7,8 +7,7 @@ namespace GraphPlotUI
 
 VGraphPlotWidget::VGraphPlotWidget(std::shared_ptr<VExtendedGraphPlotSystem> i_pSystem, QQmlEngine* i_pEngine,
                                    bool i_bDeveloper, QWidget* i_pParent)
-    : VQuickWidget(i_pEngine, i_pParent)
-    , m_pSystem(std::move(i_pSystem))
+    : VQuickWidget(i_pEngine, i_pParent), m_pSystem(std::move(i_pSystem))
 {
     SetContextProperties(i_bDeveloper);
     setResizeMode(QQuickWidget::SizeRootObjectToView);

@@ -3,7 +3,6 @@
 #include "CoreGraphics/RenderContext.h"
 #include "CoreGraphics/Resources.h"
 #include "GraphPlotSystem/ITraceDataProvider.h"
-#include "GraphPlotUI/TraceUniformBlock.h"
 
 #include <QtQml/QJSValue>
 
@@ -49,8 +48,7 @@ QVariantList ToVariantList(const QVariant& i_rVariant)
 
 } // namespace
 
-VSubplotRenderType::VSubplotRenderType(QQuickItem* i_pParent)
-    : VBaseGraphRenderType(i_pParent)
+VSubplotRenderType::VSubplotRenderType(QQuickItem* i_pParent) : VBaseGraphRenderType(i_pParent)
 {
     connect(this, &VBaseGraphRenderType::ScreenRectChanged, this, &VSubplotRenderType::OnScreenRectChanged);
     RebuildGeometry();
@@ -283,7 +281,8 @@ void VSubplotRenderType::DrawTraces(CoreGraphics::RenderContext& i_rContext, TQL
 {
     if (m_Traces.empty())
         return;
-    const TracePassSettings settings{m_RangeY, GetScaledRect().size(), m_GapOpacity, m_bSkipInvisibleDraws};
+    const TracePassSettings settings{m_RangeY, GetScaledRect().size(), m_GapOpacity, m_bSkipInvisibleDraws,
+                                     m_bMergeDenseRows};
     const TraceDrawList list = BuildTraceDrawList(i_rProvider, m_Traces, m_Focus, m_RangeX, i_Offset);
     m_TracePasses.Draw(i_rContext, i_rProvider, list, settings);
 }

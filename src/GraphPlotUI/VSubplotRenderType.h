@@ -73,6 +73,10 @@ public:
     /// compare the two.
     void SetSkipInvisibleDraws(bool i_bSkip) { m_bSkipInvisibleDraws = i_bSkip; }
 
+    /// Whether a software renderer gets strips instead of single rows where rows stand close together; the picture is
+    /// the same but for rounding. On by default, off to compare the two.
+    void SetMergeDenseRows(bool i_bMerge) { m_bMergeDenseRows = i_bMerge; }
+
 Q_SIGNALS:
     void ValueRangeXChanged();
     void ValueRangeYChanged();
@@ -130,6 +134,7 @@ private:
     bool m_bDrawMajorGrid = true;
     bool m_bDrawZero = true;
     bool m_bSkipInvisibleDraws = true;
+    bool m_bMergeDenseRows = true;
     OverlayList m_FrontOverlays;
     OverlayList m_BehindOverlays;
 };

@@ -7,8 +7,7 @@
 namespace GraphPlotUI
 {
 
-VTimeAxisRenderType::VTimeAxisRenderType(QQuickItem* i_pParent)
-    : VAxisRenderType(i_pParent)
+VTimeAxisRenderType::VTimeAxisRenderType(QQuickItem* i_pParent) : VAxisRenderType(i_pParent)
 {
     connect(this, &VBaseGraphRenderType::ScreenRectChanged, this, [this] { SetPixelLength(GetScaledRect().width()); });
 }

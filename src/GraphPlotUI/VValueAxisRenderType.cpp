@@ -14,8 +14,7 @@ constexpr double EdgeInset = 1.0 / 64.0;
 
 } // namespace
 
-VValueAxisRenderType::VValueAxisRenderType(QQuickItem* i_pParent)
-    : VAxisRenderType(i_pParent)
+VValueAxisRenderType::VValueAxisRenderType(QQuickItem* i_pParent) : VAxisRenderType(i_pParent)
 {
     connect(this, &VBaseGraphRenderType::ScreenRectChanged, this, [this] { SetPixelLength(GetScaledRect().height()); });
 }

@@ -62,6 +62,14 @@ public:
         return m_pList ? m_pList->size() : 0;
     }
 
+    /// 1 while the subscriber of that handle is in the list, else 0.
+    std::size_t CountOf(Handle i_Handle) const
+    {
+        const std::lock_guard lock(m_Mutex);
+        const auto matches = [i_Handle](const Stored& i_rStored) { return HandleOf(i_rStored) == i_Handle; };
+        return m_pList && std::ranges::any_of(*m_pList, matches) ? 1 : 0;
+    }
+
     bool IsEmpty() const { return m_Empty.load(std::memory_order_acquire) != 0; }
 
     /// Calls every subscriber on this thread. False when there was none.

@@ -66,6 +66,16 @@ public:
         return count;
     }
 
+    /// 1 while there is a subscriber of that handle, else 0.
+    std::size_t CountOf(Handle i_Handle) const
+    {
+        const std::lock_guard lock(m_Mutex);
+        std::size_t count = 0;
+        for (const auto& [pService, pInner] : m_Inner)
+            count += pInner->CountOf(i_Handle);
+        return count;
+    }
+
 protected:
     using Pair = std::pair<std::shared_ptr<TQL::IPostalService>, std::shared_ptr<Inner>>;
 

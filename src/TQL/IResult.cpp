@@ -31,7 +31,7 @@ std::string_view IResult::Name() const noexcept
 std::string_view IResult::Description() const noexcept
 {
     const ResultRow* pRow = FindRow(*this);
-    return pRow ? pRow->Description : std::string_view{};
+    return pRow ? pRow->Description : "Unknown result code";
 }
 
 std::span<const ResultRow> GetResultTable() noexcept

@@ -31,7 +31,7 @@ public:
     /// Symbolic name, "Ok" for 0; the empty text for a value that the table does not hold.
     std::string_view Name() const noexcept;
 
-    /// One sentence for a person; the empty text for a value that the table does not hold.
+    /// One sentence for a person; "Unknown result code" for a value that the table does not hold.
     std::string_view Description() const noexcept;
 
     friend constexpr bool operator==(IResult, IResult) noexcept = default;

@@ -18,6 +18,10 @@ using Rooms = std::set<std::string>;
 const std::map<std::string, Rooms> s_Below = {
     {"TQL", {}},
     {"NotificationSystem", {"TQL"}},
+    {"UtilsFileSystem", {"TQL"}},
+    {"StoreInterface", {"TQL"}},
+    {"Store", {"StoreInterface", "NotificationSystem"}},
+    {"StoreParameters", {"Store"}},
     {"ChannelSystem", {"TQL"}},
     {"OrvanePluginInterface", {"TQL"}},
     {"ChannelSystemSelection", {"NotificationSystem", "ChannelSystem"}},
@@ -44,7 +48,7 @@ Rooms Reachable(const std::string& i_rRoom)
 }
 
 /// Those that build without Qt.
-const Rooms s_WithoutQt = {"TQL",        "NotificationSystem", "ChannelSystem", "ChannelSystemSelection",
+const Rooms s_WithoutQt = {"StoreInterface", "Store", "StoreParameters", "UtilsFileSystem", "TQL",        "NotificationSystem", "ChannelSystem", "ChannelSystemSelection",
                            "Recordings", "Simulation",         "Channels"};
 
 /// What stands between the delimiters of an include line, with its opening delimiter; empty for any other line.

@@ -3,8 +3,12 @@
 
 #include <gtest/gtest.h>
 
+#include <QtGui/QOpenGLFunctions>
+
+#include <algorithm>
 #include <cmath>
 #include <random>
+#include <utility>
 
 using namespace GraphPlotUI;
 using namespace TestGraphPlotUI;
@@ -157,6 +161,30 @@ protected:
         return Render({&m_Subplot});
     }
 
+    /// Largest and mean difference of a colour channel.
+    static std::pair<int, double> Difference(const QImage& i_rA, const QImage& i_rB)
+    {
+        int largest = 0;
+        double sum = 0.0;
+        for (int y = 0; y < i_rA.height(); ++y)
+            for (int x = 0; x < i_rA.width(); ++x)
+            {
+                const QRgb a = i_rA.pixel(x, y);
+                const QRgb b = i_rB.pixel(x, y);
+                const int difference = std::max(
+                    {std::abs(qRed(a) - qRed(b)), std::abs(qGreen(a) - qGreen(b)), std::abs(qBlue(a) - qBlue(b))});
+                largest = std::max(largest, difference);
+                sum += difference;
+            }
+        return {largest, sum / (i_rA.width() * i_rA.height())};
+    }
+
+    bool IsSoftwareRenderer()
+    {
+        const auto* pName = reinterpret_cast<const char*>(m_Gl.functions()->glGetString(GL_RENDERER));
+        return QString::fromLatin1(pName).contains("llvmpipe");
+    }
+
     VSubplotRenderType m_Subplot;
 };
 
@@ -173,13 +201,44 @@ TEST_F(SkippedDrawsTest, ThePictureStaysTheSameToThePixel)
             bFocus = !bFocus;
             m_Subplot.setFocusChannelOrTraceId(bFocus ? QVariant::fromValue(TQL::ITraceId(MakeChannel("a"), 0))
                                                       : QVariant());
-            const QImage all = RenderWith(false);
+            for (const bool bMerge : {false, true})
+            {
+                m_Subplot.SetMergeDenseRows(bMerge);
+                ASSERT_EQ(RenderWith(false), RenderWith(true)) << (bMerge ? "merged" : "single rows");
+            }
             const QImage skipped = RenderWith(true);
-            ASSERT_EQ(all, skipped);
             m_Subplot.SetTraceIds({});
             withTraces += RenderWith(true) != skipped;
         }
     EXPECT_GT(withTraces, 100); // most views show something to compare
+}
+
+TEST_F(SkippedDrawsTest, StripsShowWhatSingleRowsShowButForRounding)
+{
+    // Single rows are rounded to 8 bits after each of the several rows that cover a pixel, strips once.
+    constexpr int rounding = 3;
+    constexpr double meanRounding = 0.2;
+    std::size_t different = 0;
+    for (const QPointF& rCorner : {QPointF(0.0, 0.0), QPointF(7.0, 5.0), QPointF(-30.0, 10.0)})
+    {
+        m_Subplot.SetScreenRect(QRectF(rCorner, QSizeF(Width - 10, Height - 20)));
+        for (const Scene& rScene : Scenes)
+            for (const View& rView : Views)
+            {
+                SCOPED_TRACE(testing::Message() << rScene.pName << ", " << rView.pName << ", at " << rCorner.x());
+                Show(rScene);
+                Look(rScene, rView);
+                m_Subplot.SetMergeDenseRows(false);
+                const QImage rows = RenderWith(true);
+                m_Subplot.SetMergeDenseRows(true);
+                const QImage strips = RenderWith(true);
+                const auto [largest, mean] = Difference(rows, strips);
+                ASSERT_LE(largest, rounding);
+                ASSERT_LE(mean, meanRounding);
+                different += rows != strips;
+            }
+    }
+    EXPECT_TRUE(different > 30u || !IsSoftwareRenderer()); // strips have been at work
 }
 
 TEST_F(SkippedDrawsTest, WhereTheRingStartsDoesNotShow)

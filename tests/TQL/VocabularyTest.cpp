@@ -39,7 +39,7 @@ TEST(Result, TableHoldsEveryCodeOnce)
     EXPECT_EQ(TQL::Result::RPCNotConnected.Value(), 0x80010003u);
     EXPECT_EQ(TQL::Result::HalBundleAlreadyInstalled.Value(), 0x80040007u);
     EXPECT_TRUE(TQL::Result::HalIpAddressChanged.IsSuccess());
-    EXPECT_EQ(IResult{0x80001234u}.Description(), "");
+    EXPECT_EQ(IResult{0x80001234u}.Description(), "Unknown result code");
 }
 
 TEST(Result, CombinesParts)

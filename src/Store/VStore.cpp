@@ -1,0 +1,216 @@
+#include "Store/VStore.h"
+
+#include "Store/VStoreReader.h"
+#include "Store/VStoreWriter.h"
+
+#include <utility>
+
+namespace Store
+{
+namespace
+{
+
+const EntryPath s_NoPath;
+
+} // namespace
+
+VStore::VStore(std::shared_ptr<void> i_pOwner, std::size_t i_BucketCount)
+    : m_pOwner(std::move(i_pOwner))
+    , m_Gate(m_Mutex)
+    , m_Table(i_BucketCount)
+    , m_Handlers(m_Table)
+    , m_pReader(std::make_unique<VStoreReader>(*this))
+    , m_pWriter(std::make_unique<VStoreWriter>(*this))
+{
+}
+
+VStore::~VStore() = default;
+
+const EntryPath& VStore::GetPath(const EntryPath& i_rPath)
+{
+    return GetEntryPath(GetEntry(i_rPath));
+}
+
+EntryHandle VStore::GetEntry(const EntryPath& i_rPath)
+{
+    if (i_rPath.IsWildcard())
+        return nullptr;
+    const std::lock_guard lock(m_Mutex);
+    return EntryHandle(&m_Table.FindOrCreate(i_rPath));
+}
+
+const EntryPath& VStore::GetEntryPath(EntryHandle i_Entry) const
+{
+    const VStoreEntry* const pEntry = Own(i_Entry);
+    return pEntry ? pEntry->Path : s_NoPath;
+}
+
+void VStore::Close()
+{
+    const bool bWriting = BeginWrite() != nullptr;
+    {
+        const std::lock_guard lock(m_Mutex);
+        m_bClosed = true;
+    }
+    if (bWriting)
+        EndWrite();
+}
+
+TQL::IStoreReader& VStore::BeginRead()
+{
+    GateHold& rHold = m_Slots.OfThisThread().Hold;
+    m_Gate.BeginRead(rHold);
+    if (rHold.Mode == EGateMode::Write)
+        return *m_pWriter;
+    return *m_pReader;
+}
+
+void VStore::EndRead()
+{
+    ThreadSlot& rSlot = m_Slots.OfThisThread();
+    if (!m_Gate.EndRead(rSlot.Hold) || rSlot.Deferred.empty())
+        return;
+    const auto pKept = weak_from_this().lock();
+    for (const auto& rCallable : std::exchange(rSlot.Deferred, {}))
+        rCallable();
+}
+
+TQL::IStoreWriter* VStore::BeginWrite()
+{
+    return m_Gate.BeginWrite(m_Slots.OfThisThread().Hold) ? m_pWriter.get() : nullptr;
+}
+
+void VStore::EndWrite()
+{
+    ThreadSlot& rSlot = m_Slots.OfThisThread();
+    std::shared_ptr<const Notices> pNotices;
+    if (!m_Gate.EndWrite(rSlot.Hold, [&](std::uint64_t i_Id) { pNotices = Commit(TQL::ChangeId(i_Id)); }))
+        return;
+    const auto pKept = weak_from_this().lock();
+    if (!pNotices->bClosed && !pNotices->List.empty())
+    {
+        PostNotices();
+        QueueDirectCalls(rSlot, *pNotices);
+    }
+    pNotices.reset();
+    for (auto& rCallable : std::exchange(rSlot.Deferred, {}))
+        rSlot.DirectCalls.push_back(std::move(rCallable));
+    RunDirectCalls(rSlot);
+}
+
+/// Under m_Mutex: what is returned keeps handlers alive, so it must be let go of after that.
+std::shared_ptr<const VStore::Notices> VStore::Commit(TQL::ChangeId i_Id)
+{
+    VCommit commit(m_Table, m_Staging, m_Handlers, i_Id);
+    commit.Run();
+    for (const QueuedNotice& rNotice : std::exchange(m_QueuedNotices, {}))
+        commit.Tell(rNotice);
+    auto pNotices = std::make_shared<const Notices>(Notices{m_Handlers.TakeNotices(), i_Id, m_bClosed});
+    if (!pNotices->bClosed && !pNotices->List.empty())
+    {
+        const std::lock_guard lock(m_PostMutex);
+        m_ToPost.push_back(pNotices);
+    }
+    return pNotices;
+}
+
+/// A commit that another thread makes meanwhile is posted by the thread that already posts, so calls stay in order
+/// although no lock is held while a service is called.
+void VStore::PostNotices()
+{
+    std::unique_lock lock(m_PostMutex);
+    if (m_bPosting)
+        return;
+    m_bPosting = true;
+    while (!m_ToPost.empty())
+    {
+        auto pNotices = std::move(m_ToPost.front());
+        m_ToPost.pop_front();
+        lock.unlock();
+        try
+        {
+            for (const auto& [pHandler, what] : pNotices->List)
+                pHandler->Post(what, pNotices->Commit);
+        }
+        catch (...)
+        {
+            lock.lock();
+            m_bPosting = false;
+            throw;
+        }
+        pNotices.reset();
+        lock.lock();
+    }
+    m_bPosting = false;
+}
+
+void VStore::QueueDirectCalls(ThreadSlot& io_rSlot, const Notices& i_rNotices)
+{
+    for (const auto& [pHandler, what] : i_rNotices.List)
+        if (auto pDirect = pHandler->GetDirect())
+            io_rSlot.DirectCalls.emplace_back([pDirect = std::move(pDirect), what = what, id = i_rNotices.Commit]
+                                              { pDirect->Invoke(what, id); });
+}
+
+/// A commit made by one of the calls adds to the queue that is being run.
+void VStore::RunDirectCalls(ThreadSlot& io_rSlot)
+{
+    if (io_rSlot.DirectNesting != 0)
+        return;
+    struct Nesting
+    {
+        std::uint32_t& rCount;
+        explicit Nesting(std::uint32_t& io_rCount) : rCount(io_rCount) { ++rCount; }
+        ~Nesting() { --rCount; }
+    };
+    const Nesting nesting(io_rSlot.DirectNesting);
+    while (!io_rSlot.DirectCalls.empty())
+    {
+        const auto call = std::move(io_rSlot.DirectCalls.front());
+        io_rSlot.DirectCalls.pop_front();
+        call();
+    }
+}
+
+std::shared_ptr<TQL::IHandlerCallback> VStore::GetHandlerCallback(const HandlerKey& i_rKey)
+{
+    const HandlerKey key = i_rKey.Normalised();
+    const auto release = [pWeak = WeakSelf(this)](VHandlerCallback* i_pHandler)
+    {
+        if (const auto pStore = pWeak.lock())
+            pStore->ReleaseHandler(*i_pHandler);
+        delete i_pHandler;
+    };
+    std::shared_ptr<VHandlerCallback> pHandler; // let go of after the mutex, whatever happens
+    const std::lock_guard lock(m_Mutex);
+    pHandler = m_Handlers.Find(key);
+    if (!pHandler)
+    {
+        pHandler = std::shared_ptr<VHandlerCallback>(new VHandlerCallback(key), release);
+        m_Handlers.Attach(pHandler);
+    }
+    return pHandler;
+}
+
+void VStore::ReleaseHandler(VHandlerCallback& i_rHandler)
+{
+    const std::lock_guard lock(m_Mutex);
+    m_Handlers.Detach(i_rHandler);
+}
+
+std::shared_ptr<VStore> VStore::GetShared()
+{
+    return std::static_pointer_cast<VStore>(shared_from_this());
+}
+
+TQL::ChangeId VStore::GetChangeIdOfThisThread() const
+{
+    return TQL::ChangeId(m_Slots.OfThisThread().Hold.ChangeId);
+}
+
+void VStore::Defer(std::function<void()> i_Callable)
+{
+    m_Slots.OfThisThread().Deferred.push_back(std::move(i_Callable));
+}
+
+} // namespace Store

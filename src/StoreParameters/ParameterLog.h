@@ -1,0 +1,16 @@
+#pragma once
+
+#include "TQL/Log.h"
+
+namespace Store
+{
+
+/// One line of the room's log.
+template <typename... Args>
+void LogParameter(TQL::ELogSeverity i_Severity, int i_Line, const char* i_pFormat, const Args&... i_rArgs)
+{
+    static TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("StoreParameters");
+    TQL::Log::Format(s_rCategory, i_Severity, "StoreParameters", i_Line, i_pFormat, i_rArgs...);
+}
+
+} // namespace Store

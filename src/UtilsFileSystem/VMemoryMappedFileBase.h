@@ -1,0 +1,55 @@
+#pragma once
+
+#include "TQL/IResult.h"
+#include "UtilsFileSystem/SystemCalls.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <map>
+#include <mutex>
+#include <string>
+#include <utility>
+
+namespace UtilsFileSystem
+{
+
+/// Owns an open file and the views that are mapped of it; closing unmaps what is left. Views may be made and released
+/// from any thread, opening and closing belong to one.
+class VMemoryMappedFileBase
+{
+public:
+    VMemoryMappedFileBase() = default;
+    ~VMemoryMappedFileBase() { CloseFile(); }
+    VMemoryMappedFileBase(const VMemoryMappedFileBase&) = delete;
+    VMemoryMappedFileBase& operator=(const VMemoryMappedFileBase&) = delete;
+
+    bool IsOpen() const { return m_File.IsOpen(); }
+
+    /// `AlreadyPresent` when a file is open already; `NotSupported` where the file cannot be mapped.
+    TQL::IResult OpenInput(const std::string& i_rPath, bool i_bSequential);
+
+    /// Creates or empties a file of that many bytes, whose views can be written.
+    TQL::IResult OpenOutput(const std::string& i_rPath, std::uint64_t i_Size);
+
+    void CloseFile();
+
+    /// Maps from the offset rounded down to the allocation granularity and gives the address of the offset itself, null
+    /// on failure. i_Length is not 0 and ends within the file. Views of an input file must not be written.
+    std::pair<std::byte*, TQL::IResult> MapView(std::uint64_t i_Offset, std::uint64_t i_Length);
+
+    /// Takes an address that MapView gave.
+    void UnmapView(const std::byte* i_pView);
+
+protected:
+    std::uint64_t GetFileSize() const { return m_File.Size; }
+
+private:
+    TQL::IResult Open(const std::string& i_rPath, System::EMapping i_Mapping, std::uint64_t i_Size);
+
+    System::MappedFile m_File;
+    std::mutex m_Mutex;
+    std::map<std::uintptr_t, std::uint64_t> m_Views; // base address to length; guarded by m_Mutex
+    const std::uint64_t m_Granularity = System::GetAllocationGranularity();
+};
+
+} // namespace UtilsFileSystem

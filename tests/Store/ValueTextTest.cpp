@@ -1,0 +1,88 @@
+#include "Store/ValueText.h"
+#include "TQL/SchemaIntern.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <string>
+
+namespace
+{
+
+using namespace TQL;
+
+std::string Hex(const std::optional<Store::StoreValue>& i_rValue)
+{
+    if (!i_rValue)
+        return "none";
+    std::string text;
+    for (const std::uint8_t byte : i_rValue->Bytes())
+    {
+        char digits[3];
+        std::snprintf(digits, sizeof(digits), "%02x", byte);
+        text += digits;
+    }
+    return text;
+}
+
+TEST(ValueText, ReadsEachTypeIntoItsLayout)
+{
+    const ISchema units = MakeEnumSchema(EType::Enum16, "EUnits", {{"Metres", 2}, {"Feet", -3}, {"Far", 70000}});
+    const ISchema range =
+        MakeNamedTupleSchema("Range", {{"Low", ISchema(EType::Int8)}, {"High", ISchema(EType::UInt16)}});
+    const ISchema list = MakeListSchema(ISchema(EType::UInt8));
+    const struct
+    {
+        ISchema Schema;
+        const char* pText;
+        const char* pBytes;
+    } s_Cases[] = {
+        {ISchema(EType::Bool), "true", "01"},
+        {ISchema(EType::Bool), "1", "none"},
+        {ISchema(EType::Int8), "-128", "80"},
+        {ISchema(EType::Int8), "128", "none"},
+        {ISchema(EType::Int16), "-2", "feff"},
+        {ISchema(EType::Int32), "1.0", "none"},
+        {ISchema(EType::Int64), "-9223372036854775808", "0000000000000080"},
+        {ISchema(EType::UInt8), "-1", "none"},
+        {ISchema(EType::UInt64), "18446744073709551615", "ffffffffffffffff"},
+        {ISchema(EType::UInt64), "18446744073709551616", "none"},
+        {ISchema(EType::Float32), "1", "0000803f"},
+        {ISchema(EType::Float32), "1e39", "none"},
+        {ISchema(EType::Float64), "-1234.5678901234567", "df0ffd84454a93c0"},
+        {ISchema(EType::Float64), "NaN", "none"},
+        {ISchema(EType::String), "\"a\\u00e9\"", "0300000061c3a9"},
+        {ISchema(EType::String), "bare", "none"},
+        {units, "\"Metres\"", "0200"},
+        {units, "\"Feet\"", "fdff"},
+        {units, "\"Far\"", "none"},
+        {units, "\"Miles\"", "none"},
+        {list, "[ 1 , 2 ]", "020000000102"},
+        {list, "[1,300]", "none"},
+        {list, "[1]2", "none"},
+        {MakeArraySchema(ISchema(EType::Bool), 2), "[true,false]", "0100"},
+        {MakeArraySchema(ISchema(EType::Bool), 2), "[true]", "none"},
+        {range, "[-1,258]", "ff0201"},
+        {range, "{\"High\":258,\"Low\":-1}", "ff0201"},
+        {range, "{\"High\":258}", "none"},
+        {range, "{\"Low\":1,\"Low\":1}", "none"},
+        {MakeTupleSchema({list, ISchema(EType::Bool)}), "[[7],true]", "010000000701"},
+        {ISchema(EType::Void), "null", "none"},
+        {ISchema(EType::Int32), "", "none"},
+    };
+    for (const auto& rCase : s_Cases)
+    {
+        const ISchema& rSchema = IO::GetUniqueSchema(rCase.Schema);
+        EXPECT_EQ(Hex(Store::ParseValueText(rSchema, rCase.pText)), rCase.pBytes)
+            << GetName(rSchema.Type) << " " << std::string(rCase.pText).substr(0, 40);
+    }
+}
+
+TEST(ValueText, ADeepTextIsReadWithoutADeepStack)
+{
+    const ISchema& rSchema = IO::GetUniqueSchema(MakeListSchema(ISchema(EType::UInt8)));
+    const std::string deep = std::string(1'000'000, '[') + std::string(1'000'000, ']');
+    EXPECT_FALSE(Store::ParseValueText(rSchema, deep));
+}
+
+} // namespace
