@@ -21,6 +21,9 @@ namespace
 
 constexpr std::int64_t Capacity = TraceTexelRing::Capacity;
 
+/// Summary records are read and written by pieces that stay in the nearest cache between the two.
+constexpr std::int64_t PieceRows = 256;
+
 /// Holds a lease on the series behind a block while it is read.
 class StoreLease
 {
@@ -171,16 +174,15 @@ bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
     return true;
 }
 
-/// The rows after the ring's last, from that row on where it is incomplete. False when they could not be read.
-bool Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+/// The next rows after the ring's last, from that row on where it is incomplete, at most i_MostRows of them. False when
+/// they could not be read, which leaves the ring as it was.
+bool AppendPiece(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t i_MostRows)
 {
     RingExtent& rExtent = i_rRing.Extent;
     const std::int64_t stride = i_rJob.Stride;
-    if (rExtent.EndTick >= i_rJob.Wanted.Last)
-        return true;
     const std::int64_t first =
         i_rRing.Source.Level > 0 ? AlignDown(rExtent.EndTick, stride, i_rJob.GridOffset) : rExtent.EndTick;
-    const std::int64_t rows = std::min(i_rJob.RowsOf(first, i_rJob.Wanted.Last), Capacity);
+    const std::int64_t rows = std::min(i_rJob.RowsOf(first, i_rJob.Wanted.Last), i_MostRows);
     const std::int64_t last = std::min(i_rJob.Wanted.Last, first + rows * stride);
     if (!ReadRows(i_rRing, i_rJob, {first, last}))
         return false;
@@ -201,6 +203,23 @@ bool Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
     rExtent.EndTick = last;
     WriteReadRows(i_rRing, i_rJob, rows, rExtent.RowCount);
     return true;
+}
+
+enum class EAppend
+{
+    Done,
+    NothingRead, ///< a failed read, the ring is as it was
+    PartRead     ///< a failed read behind rows that are there now
+};
+
+/// The rows after the ring's last, at most 4096 of them.
+EAppend Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+{
+    const std::int64_t piece = i_rRing.Source.Level > 0 ? PieceRows : Capacity;
+    for (std::int64_t read = 0; read < Capacity && i_rRing.Extent.EndTick < i_rJob.Wanted.Last; read += piece)
+        if (!AppendPiece(i_rRing, i_rJob, piece))
+            return read == 0 ? EAppend::NothingRead : EAppend::PartRead;
+    return EAppend::Done;
 }
 
 /// Whether the rows held can be kept for the job.
@@ -240,19 +259,20 @@ bool FillRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const IChannelBl
             return false;
         }
         const bool bPrepended = i_rRing.Extent.FirstTick < extentBefore.FirstTick;
-        if (Append(i_rRing, job))
-            return true;
-        if (!bPrepended)
+        const EAppend appended = Append(i_rRing, job);
+        if (appended == EAppend::NothingRead && !bPrepended)
             i_rRing.Extent = extentBefore;
-        return false;
+        return appended == EAppend::Done;
     }
     i_rRing.Source = source;
     i_rRing.Extent = EmptyAt(wanted.First);
-    if (Append(i_rRing, job))
-        return true;
-    i_rRing.Source = sourceBefore;
-    i_rRing.Extent = extentBefore;
-    return false;
+    const EAppend appended = Append(i_rRing, job);
+    if (appended == EAppend::NothingRead)
+    {
+        i_rRing.Source = sourceBefore;
+        i_rRing.Extent = extentBefore;
+    }
+    return appended == EAppend::Done;
 }
 
 void UpdateRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const IChannelBlock& i_rBlock,

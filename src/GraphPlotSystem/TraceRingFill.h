@@ -24,10 +24,11 @@ struct RingScratch
 };
 
 /// Brings a ring to the part of i_rRequested that the block has and i_rLimit allows, at level i_Level. Rows that are
-/// held already stay; each side is read once, at most 4096 rows. What a longer request lacks comes with the calls that
-/// follow, until the newest 4096 rows are held. Rows outside the limit or no longer in the block are dropped.
-/// A ring of another level, shape or series starts anew. False when nothing is to be had: no such ticks, a level that
-/// the block lacks, or a failed read, which leaves the ring as it was. i_rAvailable is what the block's GetRange gave.
+/// held already stay; each side is read once, at most 4096 rows, summaries by pieces. What a longer request lacks comes
+/// with the calls that follow, until the newest 4096 rows are held. Rows outside the limit or no longer in the block
+/// are dropped. A ring of another level, shape or series starts anew. False when nothing is to be had: no such ticks, a
+/// level that the block lacks, or a failed read, which leaves the rows held as they are. i_rAvailable is what the
+/// block's GetRange gave.
 bool FillRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const ChannelSystem::IChannelBlock& i_rBlock,
               const TQL::TickRange& i_rAvailable, const TQL::TickRange& i_rRequested, const TQL::TickRange& i_rLimit,
               std::uint8_t i_Level);
