@@ -21,9 +21,14 @@ public:
     static constexpr std::size_t NoWildcard = static_cast<std::size_t>(-1);
 
     EntryPath() = default;
-    explicit EntryPath(std::string i_Text) : m_Text(std::move(i_Text)), m_Hash(HashFrom(0, m_Text)) { Scan(0); }
-    explicit EntryPath(std::string_view i_Text) : EntryPath(std::string(i_Text)) {}
-    explicit EntryPath(const char* i_pText) : EntryPath(std::string(i_pText)) {}
+    explicit EntryPath(std::string&& i_Text) : m_Text(std::move(i_Text)), m_Hash(HashFrom(0, m_Text))
+    {
+        Scan(m_Text, 0);
+    }
+    explicit EntryPath(const std::string& i_rText) : EntryPath(std::string_view(i_rText)) {}
+    /// Reads the given text, not the copy: reading bytes right behind a wide store stalls the processor.
+    explicit EntryPath(std::string_view i_Text) : m_Text(i_Text), m_Hash(HashFrom(0, i_Text)) { Scan(i_Text, 0); }
+    explicit EntryPath(const char* i_pText) : EntryPath(std::string_view(i_pText)) {}
 
     const std::string& Text() const noexcept { return m_Text; }
     std::uint64_t Hash() const noexcept { return m_Hash; }
@@ -51,7 +56,7 @@ public:
         child.m_Text += i_Name;
         child.m_Hash = HashFrom(m_Hash, std::string_view(child.m_Text).substr(m_Text.size()));
         child.m_Wildcard = m_Wildcard;
-        child.Scan(begin);
+        child.Scan(child.m_Text, begin);
         return child;
     }
 
@@ -74,14 +79,13 @@ public:
 
 private:
     /// Finds the leaf and the first wildcard among the components from i_Begin on.
-    void Scan(std::size_t i_Begin) noexcept
+    void Scan(std::string_view i_Text, std::size_t i_Begin) noexcept
     {
-        const std::string_view text = m_Text;
         for (std::size_t begin = i_Begin;;)
         {
             m_LeafStart = begin;
-            const std::size_t end = text.find('/', begin);
-            if (m_Wildcard == NoWildcard && text.substr(begin, end - begin) == "*")
+            const std::size_t end = i_Text.find('/', begin);
+            if (m_Wildcard == NoWildcard && i_Text.substr(begin, end - begin) == "*")
                 m_Wildcard = begin;
             if (end == std::string_view::npos)
                 return;
