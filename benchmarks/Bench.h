@@ -30,10 +30,7 @@ struct Figure
     EGoal Goal = EGoal::Report;
     double Target = 0.0;
 
-    bool IsMet() const
-    {
-        return Goal == EGoal::Report || (Goal == EGoal::AtLeast ? Ratio >= Target : Ratio <= Target);
-    }
+    bool IsMet() const { return Goal == EGoal::Report || (Goal == EGoal::AtLeast ? Ratio >= Target : Ratio <= Target); }
 };
 
 using Table = std::vector<Figure>;

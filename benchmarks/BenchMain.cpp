@@ -28,12 +28,9 @@ struct Entry
     void (*pRun)(Table&);
 };
 
-constexpr Entry s_Entries[] = {{"notification", RunNotification},
-                               {"summary", RunSummary},
-                               {"refill", RunRefill},
-                               {"store", RunStore},
-                               {"update", RunUpdateTick},
-                               {"redraw", RunRedraw}};
+constexpr Entry s_Entries[] = {
+    {"notification", RunNotification}, {"summary", RunSummary}, {"refill", RunRefill}, {"store", RunStore},
+    {"update", RunUpdateTick},         {"redraw", RunRedraw}};
 
 const char* GoalText(const Figure& i_rFigure)
 {
@@ -83,7 +80,8 @@ int main(int i_ArgumentCount, char** i_ppArguments)
 {
     const QApplication application(i_ArgumentCount, i_ppArguments);
     const QStringList arguments = QCoreApplication::arguments();
-    const auto valueOf = [&](const QString& i_rOption) {
+    const auto valueOf = [&](const QString& i_rOption)
+    {
         const qsizetype at = arguments.indexOf(i_rOption);
         return at < 0 ? QString() : arguments.value(at + 1);
     };

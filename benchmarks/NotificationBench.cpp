@@ -41,7 +41,10 @@ void Repeat(const TFunction& i_rFunction)
         i_rFunction();
 }
 
-double Nanoseconds(double i_Seconds) { return i_Seconds * 1e9 / s_Calls; }
+double Nanoseconds(double i_Seconds)
+{
+    return i_Seconds * 1e9 / s_Calls;
+}
 
 void AddWithoutSubscribers(Table& o_rTable)
 {
@@ -65,8 +68,8 @@ void AddTenDirect(Table& o_rTable)
         signal.AddDirect([&count] { Keep(++count); });
         other.connect([&count] { Keep(++count); });
     }
-    const auto [ours, theirs] =
-        BestSecondsPaired(10, [&] { Repeat([&] { signal.Invoke(); }); }, [&] { Repeat([&] { other(); }); });
+    const auto [ours, theirs] = BestSecondsPaired(
+        10, [&] { Repeat([&] { signal.Invoke(); }); }, [&] { Repeat([&] { other(); }); });
     o_rTable.push_back({"Invoke with ten direct subscribers / boost::signals2", Nanoseconds(ours), "ns",
                         "boost::signals2 with ten slots", Nanoseconds(theirs), ours / theirs, EGoal::AtMost, 1.0});
 }
@@ -81,7 +84,8 @@ void AddPostedThroughCollapser(Table& o_rTable)
     signal.Add([&count] { Keep(++count); }, pCollapser);
     for (int i = 0; i < 10; ++i)
         other.connect([&count] { Keep(++count); });
-    const auto burst = [&] {
+    const auto burst = [&]
+    {
         Repeat([&] { signal.Invoke(); });
         pService->RunAll();
     };

@@ -16,7 +16,8 @@ namespace GraphPlotUI
 template <typename T, typename TFunction>
 auto MakeWeakObjectCallback(T* i_pObject, TFunction i_Function)
 {
-    return [pTarget = QPointer<T>(i_pObject), function = std::move(i_Function)](const auto&... i_rArgs) {
+    return [pTarget = QPointer<T>(i_pObject), function = std::move(i_Function)](const auto&... i_rArgs)
+    {
         if (!pTarget)
             throw TQL::VDeregisterWeakCallbackException();
         std::invoke(function, *pTarget, i_rArgs...);

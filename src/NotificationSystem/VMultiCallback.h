@@ -66,7 +66,10 @@ public:
     std::size_t CountOf(Handle i_Handle) const
     {
         const std::lock_guard lock(m_Mutex);
-        const auto matches = [i_Handle](const Stored& i_rStored) { return HandleOf(i_rStored) == i_Handle; };
+        const auto matches = [i_Handle](const Stored& i_rStored)
+        {
+            return HandleOf(i_rStored) == i_Handle;
+        };
         return m_pList && std::ranges::any_of(*m_pList, matches) ? 1 : 0;
     }
 

@@ -48,8 +48,17 @@ Rooms Reachable(const std::string& i_rRoom)
 }
 
 /// Those that build without Qt.
-const Rooms s_WithoutQt = {"StoreInterface", "Store", "StoreParameters", "UtilsFileSystem", "TQL",        "NotificationSystem", "ChannelSystem", "ChannelSystemSelection",
-                           "Recordings", "Simulation",         "Channels"};
+const Rooms s_WithoutQt = {"StoreInterface",
+                           "Store",
+                           "StoreParameters",
+                           "UtilsFileSystem",
+                           "TQL",
+                           "NotificationSystem",
+                           "ChannelSystem",
+                           "ChannelSystemSelection",
+                           "Recordings",
+                           "Simulation",
+                           "Channels"};
 
 /// What stands between the delimiters of an include line, with its opening delimiter; empty for any other line.
 std::string_view IncludeOf(std::string_view i_Line)

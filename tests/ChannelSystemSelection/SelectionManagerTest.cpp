@@ -13,10 +13,7 @@ using TQL::SelectionItem;
 class FakeSelection : public TQL::ISelection
 {
 public:
-    explicit FakeSelection(std::vector<SelectionItem> i_Items)
-        : m_Items(std::move(i_Items))
-    {
-    }
+    explicit FakeSelection(std::vector<SelectionItem> i_Items) : m_Items(std::move(i_Items)) {}
     std::vector<SelectionItem> Items(ESelectionKind i_Kind) const override
     {
         std::vector<SelectionItem> found;
@@ -63,8 +60,8 @@ struct Fixture
         pManager->GetSelectedChannelIds("Live", i_rType, ids);
         std::ostringstream text;
         for (const auto& rId : ids)
-            text << rId.DataContextName << '/' << rId.TypeName << '/' << rId.First << '/' << rId.Second << '/' << rId.Text
-                 << ' ';
+            text << rId.DataContextName << '/' << rId.TypeName << '/' << rId.First << '/' << rId.Second << '/'
+                 << rId.Text << ' ';
         return text.str();
     }
 };
@@ -109,8 +106,8 @@ TEST(SelectionManager, CountsAndMasksTypes)
     fixture.pManager->RegisterChannelType("Internal", ESelectionKind::Label, 2);
     fixture.pManager->RegisterChannelType("LabelPosition", ESelectionKind::Label, 0);
     fixture.pManager->RegisterChannelType("Clock", ESelectionKind::Global, 4);
-    fixture.pSource->m_Items = {{ESelectionKind::Label, 0, 1, {}}, {ESelectionKind::Label, 0, 2, {}},
-                                {ESelectionKind::Subject, 0, 0, {}}};
+    fixture.pSource->m_Items = {
+        {ESelectionKind::Label, 0, 1, {}}, {ESelectionKind::Label, 0, 2, {}}, {ESelectionKind::Subject, 0, 0, {}}};
 
     std::map<std::string, std::uint64_t> counts;
     fixture.pManager->GetSelectedTypeCounts(2, counts);

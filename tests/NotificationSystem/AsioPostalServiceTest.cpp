@@ -47,11 +47,13 @@ TEST(Strand, RunsJobsInOrderAndNeverTwoAtOnce)
     std::atomic<int> inside = 0;
     int overlaps = 0;
     for (int i = 0; i < 2000; ++i)
-        pStrand->Post([&, i] {
-            overlaps += ++inside > 1 ? 1 : 0;
-            order.push_back(i);
-            --inside;
-        });
+        pStrand->Post(
+            [&, i]
+            {
+                overlaps += ++inside > 1 ? 1 : 0;
+                order.push_back(i);
+                --inside;
+            });
     std::vector<std::jthread> threads;
     for (int t = 0; t < 4; ++t)
         threads.emplace_back([&] { pPool->m_pContext->run(); });
@@ -66,10 +68,12 @@ TEST(Strand, AJobPostedFromAJobRunsAfterIt)
     const auto pPool = std::make_shared<PoolPostalService>();
     const auto pStrand = MakeStrand(pPool);
     std::string log;
-    pStrand->Post([&] {
-        pStrand->Post([&] { log += 'c'; });
-        log += 'a';
-    });
+    pStrand->Post(
+        [&]
+        {
+            pStrand->Post([&] { log += 'c'; });
+            log += 'a';
+        });
     pStrand->Post([&] { log += 'b'; });
     pPool->m_pContext->run();
     EXPECT_EQ(log, "abc");

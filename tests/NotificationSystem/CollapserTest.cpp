@@ -24,10 +24,12 @@ TEST(Collapser, DontPostRunsTheFirstOfABurst)
     EXPECT_EQ(pService->RunAll(), 1u);
     EXPECT_EQ(log, "0");
     EXPECT_EQ(pService->LastTag(), 42u) << "the tag travels through";
-    pCollapser->Post([&] {
-        log += 'x';
-        pCollapser->Post([&] { log += 'y'; });
-    });
+    pCollapser->Post(
+        [&]
+        {
+            log += 'x';
+            pCollapser->Post([&] { log += 'y'; });
+        });
     EXPECT_EQ(pService->RunAll(), 2u);
     EXPECT_EQ(log, "0xy") << "a post from inside a collapsed job is accepted";
 }
@@ -41,10 +43,12 @@ TEST(Collapser, DontDispatchRunsTheLastOfABurst)
         pCollapser->Post([&log, i] { log += std::to_string(i); });
     EXPECT_EQ(pService->RunAll(), 10u) << "nine empty shells and one job";
     EXPECT_EQ(log, "9");
-    pCollapser->Post([&] {
-        log += 'x';
-        pCollapser->Post([&] { log += 'y'; });
-    });
+    pCollapser->Post(
+        [&]
+        {
+            log += 'x';
+            pCollapser->Post([&] { log += 'y'; });
+        });
     pService->RunAll();
     EXPECT_EQ(log, "9xy");
 }

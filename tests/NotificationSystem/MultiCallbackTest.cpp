@@ -106,13 +106,15 @@ TEST(MultiCallback, SubscribersMayChangeTheListWhileItRuns)
     Signal signal;
     std::string log;
     Signal::Handle own = 0;
-    own = signal.AddDirect([&](int) {
-        log += 'a';
-        signal.Remove(own);
-        signal.AddDirect([&](int) { log += 'c'; });
-        if (log == "a")
-            signal.Invoke(0);
-    });
+    own = signal.AddDirect(
+        [&](int)
+        {
+            log += 'a';
+            signal.Remove(own);
+            signal.AddDirect([&](int) { log += 'c'; });
+            if (log == "a")
+                signal.Invoke(0);
+        });
     signal.AddDirect([&](int) { log += 'b'; });
     signal.Invoke(1);
     EXPECT_EQ(log, "abcb") << "the inner call runs the list as it stands then, the outer one the list that it took";
@@ -129,14 +131,17 @@ TEST(MultiCallback, SubscriptionsEndWithTheirHolder)
     {
         NotificationSystem::VSubscriptions subscriptions;
         const auto pService = std::make_shared<ManualPostalService>();
-        subscriptions.Subscribe<void(int)>(pSignal, [&](int) { ++calls; }, nullptr);
-        subscriptions.Subscribe<void(int)>(pSignal, [&](int) { ++calls; }, pService);
+        subscriptions.Subscribe<void(int)>(
+            pSignal, [&](int) { ++calls; }, nullptr);
+        subscriptions.Subscribe<void(int)>(
+            pSignal, [&](int) { ++calls; }, pService);
         pSignal->Invoke(1);
         pService->RunAll();
         EXPECT_EQ(calls, 2);
         subscriptions.Drain();
         EXPECT_EQ(pSignal->Count(), 0u);
-        subscriptions.Subscribe<void(int)>(pSignal, [&](int) { ++calls; }, nullptr);
+        subscriptions.Subscribe<void(int)>(
+            pSignal, [&](int) { ++calls; }, nullptr);
         pSignal.reset();
         EXPECT_FALSE(pWeak.expired()) << "a subscription keeps its signal until it has been ended";
     }
@@ -151,14 +156,17 @@ TEST(MultiCallback, AnyThreadMayAddRemoveAndInvoke)
     std::atomic<int> calls = 0;
     std::vector<std::jthread> threads;
     for (int t = 0; t < 4; ++t)
-        threads.emplace_back([&, t] {
-            for (int i = 0; i < 300; ++i)
+        threads.emplace_back(
+            [&, t]
             {
-                const auto handle = t % 2 == 0 ? signal.AddDirect([&](int) { ++calls; }) : signal.Add([&](int) { ++calls; });
-                signal.Invoke(i);
-                EXPECT_EQ(signal.Remove(handle), 1u);
-            }
-        });
+                for (int i = 0; i < 300; ++i)
+                {
+                    const auto handle =
+                        t % 2 == 0 ? signal.AddDirect([&](int) { ++calls; }) : signal.Add([&](int) { ++calls; });
+                    signal.Invoke(i);
+                    EXPECT_EQ(signal.Remove(handle), 1u);
+                }
+            });
     threads.clear();
     pService->RunAll(100000);
     EXPECT_EQ(signal.Count(), 0u);

@@ -14,10 +14,12 @@ using TQL::ELogSeverity;
 TEST(Log, FormatsOnlyWhatTheThresholdAdmits)
 {
     std::vector<std::string> lines;
-    auto pSink = TQL::Log::AddSink([&](const TQL::LogMessage& i_rMessage) {
-        lines.push_back(std::string(i_rMessage.Category) + ' ' + std::to_string(static_cast<int>(i_rMessage.Severity)) +
-                        ' ' + std::string(i_rMessage.Text));
-    });
+    auto pSink = TQL::Log::AddSink(
+        [&](const TQL::LogMessage& i_rMessage)
+        {
+            lines.push_back(std::string(i_rMessage.Category) + ' ' +
+                            std::to_string(static_cast<int>(i_rMessage.Severity)) + ' ' + std::string(i_rMessage.Text));
+        });
     TQL::VLogCategory& rCategory = TQL::Log::GetCategory("LogTest");
     EXPECT_EQ(&rCategory, &TQL::Log::GetCategory("LogTest"));
 
@@ -40,18 +42,22 @@ TEST(Log, SinksSeeOneMessageAtATime)
     int inside = 0;
     int overlaps = 0;
     int count = 0;
-    const auto pSink = TQL::Log::AddSink([&](const TQL::LogMessage&) {
-        overlaps += ++inside > 1 ? 1 : 0;
-        ++count;
-        --inside;
-    });
+    const auto pSink = TQL::Log::AddSink(
+        [&](const TQL::LogMessage&)
+        {
+            overlaps += ++inside > 1 ? 1 : 0;
+            ++count;
+            --inside;
+        });
     const TQL::VLogCategory& rCategory = TQL::Log::GetCategory("LogTest");
     std::vector<std::jthread> threads;
     for (int t = 0; t < 4; ++t)
-        threads.emplace_back([&rCategory] {
-            for (int i = 0; i < 500; ++i)
-                TQL::Log::Write(rCategory, ELogSeverity::Error, "x", "Test", 1);
-        });
+        threads.emplace_back(
+            [&rCategory]
+            {
+                for (int i = 0; i < 500; ++i)
+                    TQL::Log::Write(rCategory, ELogSeverity::Error, "x", "Test", 1);
+            });
     threads.clear();
     EXPECT_EQ(overlaps, 0);
     EXPECT_EQ(count, 2000);

@@ -23,10 +23,13 @@ public:
     };
 
     LogGuard()
-        : m_pSink(TQL::Log::AddSink([this](const TQL::LogMessage& i_rMessage) {
-            const std::lock_guard lock(m_Mutex);
-            m_Entries.push_back({std::string(i_rMessage.Category), i_rMessage.Severity, std::string(i_rMessage.Text)});
-        }))
+        : m_pSink(TQL::Log::AddSink(
+              [this](const TQL::LogMessage& i_rMessage)
+              {
+                  const std::lock_guard lock(m_Mutex);
+                  m_Entries.push_back(
+                      {std::string(i_rMessage.Category), i_rMessage.Severity, std::string(i_rMessage.Text)});
+              }))
     {
     }
 
