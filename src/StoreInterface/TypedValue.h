@@ -96,8 +96,8 @@ TQL::ISchema MakeSchemaOf()
 template <typename T>
 const TQL::ISchema& SchemaOf()
 {
-    static const TQL::ISchema& s_rSchema = TQL::IO::GetUniqueSchema(MakeSchemaOf<T>());
-    return s_rSchema;
+    static const TQL::ISchema* const s_pSchema = &TQL::IO::GetUniqueSchema(MakeSchemaOf<T>());
+    return *s_pSchema;
 }
 
 /// Appends the bytes of i_rValue. Throws std::length_error for a text or list of more than 2^31 - 1 elements.
