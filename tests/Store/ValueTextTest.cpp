@@ -80,7 +80,8 @@ TEST(ValueText, ReadsEachTypeIntoItsLayout)
 
 TEST(ValueText, ADeepTextIsReadWithoutADeepStack)
 {
-    const ISchema& rSchema = IO::GetUniqueSchema(MakeListSchema(ISchema(EType::UInt8)));
+    const ISchema schema = MakeListSchema(ISchema(EType::UInt8));
+    const ISchema& rSchema = IO::GetUniqueSchema(schema);
     const std::string deep = std::string(1'000'000, '[') + std::string(1'000'000, ']');
     EXPECT_FALSE(Store::ParseValueText(rSchema, deep));
 }

@@ -51,8 +51,8 @@ ParameterDefinition With(ParameterDefinition i_Definition, std::vector<Parameter
 
 TEST(ParameterDefinition, EachTagReachesItsPlace)
 {
-    const TQL::ISchema& rUnits = TQL::IO::GetUniqueSchema(
-        TQL::MakeEnumSchema(TQL::EType::Enum8, "EParameterUnits", {{"Metres", 0}, {"Feet", 5}}));
+    const TQL::ISchema schema = TQL::MakeEnumSchema(TQL::EType::Enum8, "EParameterUnits", {{"Metres", 0}, {"Feet", 5}});
+    const TQL::ISchema& rUnits = TQL::IO::GetUniqueSchema(schema);
     const auto units = [&](std::string i_Key, TagTable i_Tags)
     {
         return ParameterDefinition{std::move(i_Key), &rUnits, std::move(i_Tags), {}, 0};
