@@ -77,6 +77,8 @@ void VOrvaneGraphPlotWindowContent::OnViewChanged()
         ApplyStateOf(view);
     if (view.ContextName != s_pGlobalContext)
         m_pSystem->SetContext(view.ContextName);
+    else
+        m_pSystem->GetSelectedChannels()->SetContext(view.ContextName);
     m_View = std::move(view);
 }
 

@@ -130,7 +130,7 @@ public:
                             std::span<ChannelSystem::LodRecord> o_Records, std::uint32_t = 1) const override
     {
         Note("summary " + std::to_string(i_Level), i_rRange);
-        if (bFail || i_Level >= m_Shape.SummaryPeriods.size())
+        if (bFail || SummaryReadsLeft-- == 0 || i_Level >= m_Shape.SummaryPeriods.size())
             return 0;
         const std::int64_t stride = m_Shape.SummaryPeriods[i_Level];
         if (TQL::AlignDown(i_rRange.First, stride, m_Shape.GridOffset) != i_rRange.First ||
@@ -167,7 +167,8 @@ public:
     /// The reads since the last call, one line each, in sample numbers.
     std::string TakeReads() const { return std::exchange(m_Reads, {}); }
 
-    bool bFail = false; ///< every read fails
+    bool bFail = false;                ///< every read fails
+    mutable int SummaryReadsLeft = -1; ///< the summary read after as many fails; negative: none
 
 private:
     std::int64_t SampleAtOrAfter(std::int64_t i_Tick) const

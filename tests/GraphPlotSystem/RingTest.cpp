@@ -461,6 +461,28 @@ TEST(Ring, AFailedReadLeavesItAsItWas)
     }
 }
 
+TEST(Ring, ALaterPieceThatFailsKeepsWhatWasReadBeforeIt)
+{
+    MemoryBlock block;
+    block.Append(Ramp(0, 2000));
+    TraceTexelRing whole;
+    Update(whole, block, {0, 2000}, 1);
+
+    TraceTexelRing ring;
+    Update(ring, block, {100, 140}); // rows of another level, which the pieces write over
+    block.SummaryReadsLeft = 2;
+    Update(ring, block, {0, 2000}, 1);
+    const std::uint32_t rows = ring.Extent.RowCount;
+    EXPECT_GT(rows, 0u);
+    EXPECT_LT(rows, whole.Extent.RowCount);
+    EXPECT_EQ(RowsText(ring, 0, 0, rows), RowsText(whole, 0, 0, rows));
+    EXPECT_EQ(block.Store().Open, 0);
+
+    block.SummaryReadsLeft = -1;
+    Update(ring, block, {0, 2000}, 1);
+    EXPECT_EQ(RingText(ring), RingText(whole)) << "and it goes on once reads succeed";
+}
+
 TEST(Ring, ASteadyLiveWindowUploadsOnlyWhatIsNew)
 {
     MemoryBlock block(3);
