@@ -22,6 +22,7 @@ const std::map<std::string, Rooms> s_Below = {
     {"StoreInterface", {"TQL"}},
     {"Store", {"StoreInterface", "NotificationSystem"}},
     {"StoreParameters", {"Store"}},
+    {"StoreIO", {"Store", "UtilsFileSystem"}},
     {"ChannelSystem", {"TQL"}},
     {"OrvanePluginInterface", {"TQL"}},
     {"ChannelSystemSelection", {"NotificationSystem", "ChannelSystem"}},
@@ -48,17 +49,9 @@ Rooms Reachable(const std::string& i_rRoom)
 }
 
 /// Those that build without Qt.
-const Rooms s_WithoutQt = {"StoreInterface",
-                           "Store",
-                           "StoreParameters",
-                           "UtilsFileSystem",
-                           "TQL",
-                           "NotificationSystem",
-                           "ChannelSystem",
-                           "ChannelSystemSelection",
-                           "Recordings",
-                           "Simulation",
-                           "Channels"};
+const Rooms s_WithoutQt = {"StoreInterface",         "Store",      "StoreParameters",    "StoreIO",
+                           "UtilsFileSystem",        "TQL",        "NotificationSystem", "ChannelSystem",
+                           "ChannelSystemSelection", "Recordings", "Simulation",         "Channels"};
 
 /// What stands between the delimiters of an include line, with its opening delimiter; empty for any other line.
 std::string_view IncludeOf(std::string_view i_Line)
