@@ -2,6 +2,7 @@
 
 #include "Store/VStoreReader.h"
 #include "Store/VStoreWriter.h"
+#include "TQL/Log.h"
 
 #include <utility>
 
@@ -11,6 +12,12 @@ namespace
 {
 
 const EntryPath s_NoPath;
+
+void LogUnmatched(const char* i_pText)
+{
+    static const TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("Store");
+    TQL::Log::Write(s_rCategory, TQL::ELogSeverity::Error, i_pText, "Store/Access", __LINE__);
+}
 
 } // namespace
 
@@ -68,6 +75,10 @@ TQL::IStoreReader& VStore::BeginRead()
 void VStore::EndRead()
 {
     ThreadSlot& rSlot = m_Slots.OfThisThread();
+    if (rSlot.Hold.Depth == 0)
+        return LogUnmatched("A read of a store was ended on a thread that had begun none.");
+    if (rSlot.Hold.Depth == 1 && rSlot.Hold.Mode == EGateMode::Write)
+        return EndWrite();
     if (!m_Gate.EndRead(rSlot.Hold) || rSlot.Deferred.empty())
         return;
     const auto pKept = weak_from_this().lock();
@@ -83,6 +94,8 @@ TQL::IStoreWriter* VStore::BeginWrite()
 void VStore::EndWrite()
 {
     ThreadSlot& rSlot = m_Slots.OfThisThread();
+    if (rSlot.Hold.Depth == 0 || rSlot.Hold.Mode == EGateMode::Read)
+        return LogUnmatched("A write of a store was ended on a thread that had begun none.");
     std::shared_ptr<const Notices> pNotices;
     if (!m_Gate.EndWrite(rSlot.Hold, [&](std::uint64_t i_Id) { pNotices = Commit(TQL::ChangeId(i_Id)); }))
         return;

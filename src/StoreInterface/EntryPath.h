@@ -2,6 +2,7 @@
 
 #include "TQL/HashMix.h"
 
+#include <array>
 #include <compare>
 #include <cstddef>
 #include <cstdint>
@@ -64,7 +65,7 @@ public:
     static constexpr std::uint64_t HashFrom(std::uint64_t i_Hash, std::string_view i_Text) noexcept
     {
         for (const char c : i_Text)
-            i_Hash = TQL::HashMix(i_Hash, static_cast<std::uint64_t>(std::int64_t{static_cast<signed char>(c)}));
+            i_Hash = TQL::HashFold(i_Hash, s_SpreadBytes[static_cast<unsigned char>(c)]);
         return i_Hash;
     }
 
@@ -78,6 +79,15 @@ public:
     }
 
 private:
+    /// HashSpread of every byte as a signed number: hashing a path is most of what finding an entry by text costs.
+    static constexpr std::array<std::uint64_t, 256> s_SpreadBytes = []
+    {
+        std::array<std::uint64_t, 256> spread{};
+        for (std::size_t byte = 0; byte < spread.size(); ++byte)
+            spread[byte] = TQL::HashSpread(static_cast<std::uint64_t>(std::int64_t{static_cast<signed char>(byte)}));
+        return spread;
+    }();
+
     /// Finds the leaf and the first wildcard among the components from i_Begin on.
     void Scan(std::string_view i_Text, std::size_t i_Begin) noexcept
     {

@@ -41,7 +41,8 @@ public:
     virtual void EndRead() = 0;
     /// Waits for the writers before. Null, without waiting, on a thread that reads.
     virtual IStoreWriter* BeginWrite() = 0;
-    /// The last end commits, then runs the direct callables of this commit's notices and what was deferred.
+    /// The last end commits, then runs the direct callables of this commit's notices and what was deferred. Whichever
+    /// of the two ends comes last on a thread that writes commits; an end without a begin is only logged.
     virtual void EndWrite() = 0;
     /// The one handler of that key, made when none is alive.
     virtual std::shared_ptr<IHandlerCallback> GetHandlerCallback(const Store::HandlerKey& i_rKey) = 0;

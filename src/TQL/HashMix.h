@@ -6,16 +6,26 @@
 namespace TQL
 {
 
+inline constexpr std::uint64_t HashMultiplier = 0xc6a4a7935bd1e995ull;
+
+/// The half of a round of HashMix that depends on the word alone, so that it can be looked up for a byte.
+constexpr std::uint64_t HashSpread(std::uint64_t i_Value) noexcept
+{
+    i_Value *= HashMultiplier;
+    i_Value ^= i_Value >> 47;
+    return i_Value * HashMultiplier;
+}
+
+/// The other half: folds a spread word into the running hash.
+constexpr std::uint64_t HashFold(std::uint64_t i_Hash, std::uint64_t i_Spread) noexcept
+{
+    return (i_Hash ^ i_Spread) * HashMultiplier + 0xe6546b64ull;
+}
+
 /// One round of a 64-bit Murmur-style mix: folds the word i_Value into the running hash i_Hash.
 constexpr std::uint64_t HashMix(std::uint64_t i_Hash, std::uint64_t i_Value) noexcept
 {
-    constexpr std::uint64_t multiplier = 0xc6a4a7935bd1e995ull;
-    i_Value *= multiplier;
-    i_Value ^= i_Value >> 47;
-    i_Value *= multiplier;
-    i_Hash ^= i_Value;
-    i_Hash *= multiplier;
-    return i_Hash + 0xe6546b64ull;
+    return HashFold(i_Hash, HashSpread(i_Value));
 }
 
 /// The word that stands for a text in HashMix: its UTF-8 bytes folded one by one from 0; 0 for the empty text.

@@ -225,6 +225,27 @@ TEST_F(HandlersTest, DeferredCallsRunWhenNothingIsHeld)
     EXPECT_EQ(Take(), "still reading free ");
 }
 
+TEST_F(HandlersTest, EndsThatDoNotMatchHarmNothing)
+{
+    Script.Watch({"A"});
+    Store::VStore& rStore = Script.Get();
+    TQL::IStoreWriter* const pWriter = rStore.BeginWrite();
+    (void)rStore.BeginRead();
+    EXPECT_TRUE(pWriter->SetValue(Script.Entry("A"), Store::MakeValue(std::int32_t{1})).IsSuccess());
+    rStore.EndWrite();
+    EXPECT_EQ(Script.State("A"), "1 - - 0") << "still inside the write, which sees what is staged";
+    rStore.EndRead();
+    rStore.EndRead();
+    rStore.EndWrite();
+    {
+        const TQL::ScopedRead reader(rStore);
+        rStore.EndWrite();
+    }
+    EXPECT_EQ(Guard.Take().size(), 3u) << "each end without a begin is logged";
+    EXPECT_EQ(Script.State("A"), "1 - - 0");
+    EXPECT_NE(Script.Write("A=2"), "") << "the gate is as it was";
+}
+
 TEST_F(HandlersTest, TheLastOwnerMayLetGoInsideACallable)
 {
     auto pStore = TQL::MakeShared<Store::VStore>(Script.GetShared());

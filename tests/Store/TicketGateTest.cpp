@@ -1,5 +1,8 @@
+#include "Store/VStore.h"
 #include "Store/VThreadSlots.h"
 #include "Store/VTicketGate.h"
+#include "StoreInterface/ScopedAccess.h"
+#include "StoreInterface/TypedValue.h"
 
 #include <gtest/gtest.h>
 
@@ -70,54 +73,63 @@ TEST(TicketGate, ReadersGoOnBesideAStagingWriterAndACommitWaitsForThem)
     EXPECT_TRUE(bCommitted);
 }
 
-/// Plain numbers that only a commit changes: their sum never does, and Generation is the last commit's change id.
+/// Two entries whose sum every commit keeps, and one that holds the number of the commit that wrote it.
 struct Account
 {
-    std::int64_t First = 500;
-    std::int64_t Second = 500;
-    std::uint64_t Generation = 0;
+    std::shared_ptr<VStore> pStore = TQL::MakeShared<VStore>();
+    EntryHandle First = pStore->GetEntry(EntryPath("Account/First"));
+    EntryHandle Second = pStore->GetEntry(EntryPath("Account/Second"));
+    EntryHandle Commit = pStore->GetEntry(EntryPath("Account/Commit"));
 
-    bool IsWhole(std::uint64_t i_ChangeId) const { return First + Second == 1000 && Generation == i_ChangeId; }
+    static std::int64_t Number(const TQL::IStoreReader& i_rReader, EntryHandle i_Entry)
+    {
+        std::int64_t number = 0;
+        (void)DecodeValue(i_rReader.GetVerifiedValue(i_Entry), number);
+        return number;
+    }
+    bool IsWhole(const TQL::IStoreReader& i_rReader, std::uint64_t i_Commit) const
+    {
+        return Number(i_rReader, First) + Number(i_rReader, Second) == 0 &&
+               Number(i_rReader, Commit) == static_cast<std::int64_t>(i_Commit);
+    }
+    bool Write(TQL::IStoreWriter& io_rWriter, std::int64_t i_Amount) const
+    {
+        const auto commit = static_cast<std::int64_t>(io_rWriter.GetChangeId().Value());
+        return io_rWriter.SetValue(First, MakeValue(i_Amount)).IsSuccess() &&
+               io_rWriter.SetValue(Second, MakeValue(-i_Amount)).IsSuccess() &&
+               io_rWriter.SetValue(Commit, MakeValue(commit)).IsSuccess();
+    }
 };
 
 TEST(TicketGate, EightThreadsNeverSeeHalfACommit)
 {
-    constexpr int s_Threads = 8;
-    constexpr int s_Rounds = 4000;
-    std::mutex mutex;
-    VTicketGate gate(mutex);
-    Account account;
-    std::int64_t staged = 0; // only the thread that stages touches it
+    constexpr unsigned s_Threads = 8;
+    constexpr int s_Rounds = 10000;
+    const Account account;
     std::atomic<int> faults = 0;
     std::atomic<std::uint64_t> commits = 0;
+    const auto expect = [&](bool i_bTrue)
+    {
+        faults += i_bTrue ? 0 : 1;
+    };
     const auto work = [&](unsigned i_Seed)
     {
-        GateHold hold;
         for (int round = 0; round < s_Rounds; ++round)
         {
             i_Seed = i_Seed * 1664525u + 1013904223u;
             if ((i_Seed >> 16) % 3 != 0)
             {
-                gate.BeginRead(hold);
-                faults += account.IsWhole(hold.ChangeId) ? 0 : 1;
-                gate.BeginRead(hold);
+                const TQL::ScopedRead outer(*account.pStore);
+                const std::uint64_t commit = outer->GetChangeId().Value();
+                expect(account.IsWhole(*outer, commit));
                 std::this_thread::yield();
-                faults += gate.EndRead(hold) ? 1 : 0;
-                faults += account.IsWhole(hold.ChangeId) ? 0 : 1;
-                gate.EndRead(hold);
+                const TQL::ScopedRead inner(*account.pStore);
+                expect(account.IsWhole(*inner, commit) && inner->GetChangeId().Value() == commit);
                 continue;
             }
-            faults += gate.BeginWrite(hold) ? 0 : 1;
-            faults += account.IsWhole(hold.ChangeId - 1) ? 0 : 1;
-            staged = static_cast<std::int64_t>(i_Seed >> 24);
-            gate.EndWrite(hold,
-                          [&](std::uint64_t i_ChangeId)
-                          {
-                              account.First -= staged;
-                              std::this_thread::yield();
-                              account.Second += staged;
-                              account.Generation = i_ChangeId;
-                          });
+            const TQL::ScopedWrite writer(*account.pStore);
+            expect(account.IsWhole(*writer, writer->GetChangeId().Value() - 1));
+            expect(account.Write(*writer, i_Seed >> 24));
             ++commits;
         }
     };
@@ -127,8 +139,8 @@ TEST(TicketGate, EightThreadsNeverSeeHalfACommit)
     for (std::thread& rThread : threads)
         rThread.join();
     EXPECT_EQ(faults, 0);
-    EXPECT_EQ(account.Generation, commits);
-    EXPECT_TRUE(account.IsWhole(commits));
+    const TQL::ScopedRead reader(*account.pStore);
+    EXPECT_TRUE(account.IsWhole(*reader, commits));
 }
 
 TEST(ThreadSlots, ANewStoreNeverFindsWhatAnEarlierOneLeft)
