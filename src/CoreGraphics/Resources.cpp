@@ -81,6 +81,11 @@ void Resources::Initialise()
     m_Groups.push_back(std::move(pGroup));
 }
 
+void Resources::Release()
+{
+    m_Groups.clear();
+}
+
 void Resources::CheckVersion(const QOpenGLContext& i_rContext) const
 {
     const QSurfaceFormat format = i_rContext.format();

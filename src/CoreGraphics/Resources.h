@@ -35,6 +35,11 @@ public:
     /// the whole built-in set off.
     void Initialise();
 
+    /// Forgets all shaders and programs, whose sources a module may have brought; those in use stay with their users.
+    /// Their OpenGL objects go when a context of their group is next made current. While nothing is drawn; no context
+    /// is needed.
+    void Release();
+
     /// The program of two shaders for the current context's group, linked at the first call. Empty when one of the
     /// shaders is missing or Initialise has not run. A program whose link failed comes back unusable: see
     /// VShaderProgram::IsLinked.

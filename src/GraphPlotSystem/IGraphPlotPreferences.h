@@ -18,7 +18,8 @@ enum class ETraceColourSet : std::int32_t
     TracesColourDeficientPT = 2
 };
 
-/// The three user preferences of graph plots. Thread-safe. An index outside EIndex gives InvalidArgument.
+/// The three user preferences of graph plots. Thread-safe. An index outside EIndex gives InvalidArgument, and so does a
+/// value of another type than the preference's or a number that is no ETraceColourSet.
 class IGraphPlotPreferences
 {
 public:
@@ -35,6 +36,7 @@ public:
 
     virtual TQL::IResult GetValue(int i_Index, Value& o_rValue) const = 0;
     virtual TQL::IResult SetValue(int i_Index, const Value& i_rValue) = 0;
+    /// A null service calls on the thread that made the change.
     virtual TQL::IResult AddCallback(Token& o_rToken, int i_Index, std::function<void()> i_Callback,
                                      std::shared_ptr<TQL::IPostalService> i_pPostalService) = 0;
     /// NotFound for a token that is not registered.

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "GraphPlotSystem/IGraphPlotPreferences.h"
 #include "GraphPlotSystem/TraceRenderInfo.h"
 
 #include <span>
@@ -7,7 +8,19 @@
 namespace GraphPlotUI
 {
 
-/// The 22 trace colours for standard colour vision, in the order in which they are given out.
-std::span<const Colour4f> GetStandardTracePalette();
+/// One set of trace colours that an operator can choose.
+struct TraceColourSet
+{
+    ETraceColourSet Set;
+    const char* pName;                 ///< of the enumerator, as files hold it
+    const char* pDisplayName;          ///< as a choice
+    std::span<const Colour4f> Colours; ///< opaque, in the order in which they are given out
+};
+
+/// All sets, in the order of their values.
+std::span<const TraceColourSet> GetTraceColourSets();
+
+/// The colours of a set; of the standard one for a number that is no set's.
+std::span<const Colour4f> GetTracePalette(std::int32_t i_Set);
 
 } // namespace GraphPlotUI

@@ -17,10 +17,14 @@ namespace GraphPlotUI
 
 VPlainSubplotModel::VPlainSubplotModel(std::shared_ptr<TQL::IPostalService> i_pUiPostalService,
                                        std::shared_ptr<TQL::ITraceDataStorage> i_pStorage,
-                                       std::shared_ptr<TQL::IChannelTextProvider> i_pTextProvider, QObject* i_pParent)
-    : QAbstractListModel(i_pParent), m_pStorage(std::move(i_pStorage)), m_pTextProvider(std::move(i_pTextProvider))
+                                       std::shared_ptr<TQL::IChannelTextProvider> i_pTextProvider,
+                                       std::shared_ptr<IGraphPlotPreferences> i_pPreferences, QObject* i_pParent)
+    : QAbstractListModel(i_pParent)
+    , m_pStorage(std::move(i_pStorage))
+    , m_pTextProvider(std::move(i_pTextProvider))
+    , m_pPreferences(std::move(i_pPreferences))
 {
-    m_pStorage->SetPalette(GetStandardTracePalette());
+    m_pStorage->SetPalette(GetTracePalette(m_ColourSet));
     const auto subscribe =
         [&](const std::shared_ptr<TQL::IChangeSignal>& i_rpSignal, void (VPlainSubplotModel::*i_pMember)())
     {
@@ -33,6 +37,36 @@ VPlainSubplotModel::VPlainSubplotModel(std::shared_ptr<TQL::IPostalService> i_pU
     subscribe(m_pStorage->DataChanged(), &VPlainSubplotModel::RefreshTraces);
     subscribe(m_pTextProvider->TextChanged(), &VPlainSubplotModel::RefreshTraces);
     subscribe(m_pStorage->ValueRangeChanged(), &VPlainSubplotModel::RefreshRanges);
+    SubscribeColourSet(std::move(i_pUiPostalService));
+    OnColourSetPreference();
+}
+
+VPlainSubplotModel::~VPlainSubplotModel()
+{
+    if (m_ColourSetToken != 0)
+        (void)m_pPreferences->RemoveCallback(IGraphPlotPreferences::TraceColourSet, m_ColourSetToken);
+}
+
+void VPlainSubplotModel::SubscribeColourSet(std::shared_ptr<TQL::IPostalService> i_pUiPostalService)
+{
+    const TQL::IResult result = m_pPreferences->AddCallback(
+        m_ColourSetToken, IGraphPlotPreferences::TraceColourSet,
+        MakeWeakObjectCallback(this, [](VPlainSubplotModel& i_rSelf) { i_rSelf.OnColourSetPreference(); }),
+        std::move(i_pUiPostalService));
+    if (result.IsError())
+        m_ColourSetToken = 0; // without notices the set at the start holds
+}
+
+void VPlainSubplotModel::OnColourSetPreference()
+{
+    IGraphPlotPreferences::Value value;
+    const TQL::IResult result = m_pPreferences->GetValue(IGraphPlotPreferences::TraceColourSet, value);
+    const auto* const pSet = std::get_if<std::int32_t>(&value);
+    if (result.IsError() || !pSet || *pSet == m_ColourSet)
+        return;
+    m_ColourSet = *pSet;
+    m_pStorage->SetPalette(GetTracePalette(m_ColourSet));
+    RefreshTraces();
 }
 
 int VPlainSubplotModel::rowCount(const QModelIndex& i_rParent) const

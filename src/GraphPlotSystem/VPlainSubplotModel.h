@@ -1,5 +1,6 @@
 #pragma once
 
+#include "GraphPlotSystem/IGraphPlotPreferences.h"
 #include "NotificationSystem/VSubscriptions.h"
 #include "TQL/IPostalService.h"
 #include "TQL/ITraceId.h"
@@ -20,7 +21,8 @@ namespace GraphPlotUI
 {
 
 /// One row a subplot, one subplot for each component of each channel subtype, its value range always fitted to the
-/// traces in it, one colour a channel. Stands where the subplot manager, its model and the key will stand. UI thread.
+/// traces in it, one colour a channel out of the set that the operator prefers. Stands where the subplot manager, its
+/// model and the key will stand. UI thread.
 class VPlainSubplotModel : public QAbstractListModel
 {
     Q_OBJECT
@@ -37,7 +39,9 @@ public:
 
     VPlainSubplotModel(std::shared_ptr<TQL::IPostalService> i_pUiPostalService,
                        std::shared_ptr<TQL::ITraceDataStorage> i_pStorage,
-                       std::shared_ptr<TQL::IChannelTextProvider> i_pTextProvider, QObject* i_pParent);
+                       std::shared_ptr<TQL::IChannelTextProvider> i_pTextProvider,
+                       std::shared_ptr<IGraphPlotPreferences> i_pPreferences, QObject* i_pParent);
+    ~VPlainSubplotModel() override;
 
     int rowCount(const QModelIndex& i_rParent = {}) const override;
     QVariant data(const QModelIndex& i_rIndex, int i_Role) const override;
@@ -53,6 +57,8 @@ private:
     };
     using SubplotList = std::vector<Subplot>;
 
+    void SubscribeColourSet(std::shared_ptr<TQL::IPostalService> i_pUiPostalService);
+    void OnColourSetPreference();
     void RefreshTraces();
     void RefreshRanges();
     SubplotList GroupTraces() const;
@@ -61,6 +67,9 @@ private:
 
     const std::shared_ptr<TQL::ITraceDataStorage> m_pStorage;
     const std::shared_ptr<TQL::IChannelTextProvider> m_pTextProvider;
+    const std::shared_ptr<IGraphPlotPreferences> m_pPreferences;
+    IGraphPlotPreferences::Token m_ColourSetToken = 0; ///< 0 for none
+    std::int32_t m_ColourSet = 0;
     NotificationSystem::VSubscriptions m_Subscriptions;
     SubplotList m_Subplots; // ordered by subtype's display name, then subtype, then component
 };

@@ -5,15 +5,16 @@
 #include "GraphPlotSystem/VOrvaneGraphPlotTime.h"
 #include "GraphPlotSystem/VPlainChannelComponentControls.h"
 #include "GraphPlotSystem/VPlainChannelTextProvider.h"
-#include "GraphPlotSystem/VPlainGraphPlotPreferences.h"
 #include "GraphPlotSystem/VTraceDataProvider.h"
+#include "GraphPlotUIOrvane/VGraphPlotStorePreferences.h"
 #include "GraphPlotUIOrvane/VOrvaneGraphPlotWindowContent.h"
 
 namespace GraphPlotUI
 {
 
 VOrvaneGraphPlotWindowContentFactory::VOrvaneGraphPlotWindowContentFactory(GraphPlotServices i_Services)
-    : m_Services(std::move(i_Services)), m_pPreferences(std::make_shared<VPlainGraphPlotPreferences>())
+    : m_Services(std::move(i_Services))
+    , m_pPreferences(std::make_shared<VGraphPlotStorePreferences>(m_Services.pPreferencesStore))
 {
 }
 
@@ -50,7 +51,8 @@ std::shared_ptr<VExtendedGraphPlotSystem> VOrvaneGraphPlotWindowContentFactory::
     const auto pTraceManager = MakeSharedObject<VTraceManager>(
         m_Services.pUiPostalService, m_Services.pWorkerPostalService, m_Services.pChannelService, m_pPreferences,
         pTextProvider, pControls, pPlotTime, pStorage, true, false);
-    auto* pSubplots = new VPlainSubplotModel(m_Services.pUiPostalService, pStorage, pTextProvider, i_pContext.get());
+    auto* pSubplots =
+        new VPlainSubplotModel(m_Services.pUiPostalService, pStorage, pTextProvider, m_pPreferences, i_pContext.get());
     return TQL::MakeShared<VExtendedGraphPlotSystem>(std::move(i_pContext), pTraceManager, pPlotTime, pChannels,
                                                      pSubplots, m_Services.pUiPostalService);
 }

@@ -25,6 +25,7 @@ namespace TQL
 {
 class IAsioPostalService;
 class IPostalService;
+class IStore;
 } // namespace TQL
 
 namespace GraphPlotUI
@@ -40,6 +41,7 @@ struct GraphPlotServices
     std::shared_ptr<TQL::IPostalService> pUiPostalService;
     std::shared_ptr<TQL::IAsioPostalService> pWorkerPostalService;
     std::shared_ptr<ChannelSystem::IChannelService> pChannelService;
+    std::shared_ptr<TQL::IStore> pPreferencesStore;
     std::shared_ptr<CoreGraphics::Resources> pResources;
     std::shared_ptr<OrvanePluginInterface::IQmlEngineHost> pEngineHost;
     bool bChannelBrowser = false; ///< also the developer mode of the window

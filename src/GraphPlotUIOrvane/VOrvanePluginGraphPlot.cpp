@@ -6,6 +6,7 @@
 #include "OrvanePluginInterface/IHostCoreServices.h"
 #include "OrvanePluginInterface/IHostUiServices.h"
 #include "OrvanePluginInterface/ITimeController.h"
+#include "Store/VStore.h"
 
 #include <QtCore/QDir>
 #include <QtQml/QQmlEngine>
@@ -74,6 +75,9 @@ bool VOrvanePluginGraphPlot::Initialise(IHostCoreServices& i_rCore, IHostUiServi
     services.pUiPostalService = Fetch(i_rCore, &IHostCoreServices::GetUiPostalService);
     services.pWorkerPostalService = Fetch(i_rCore, &IHostCoreServices::GetWorkerPostalService);
     services.pChannelService = Fetch(i_rCore, &IHostCoreServices::GetChannelService);
+    services.pPreferencesStore = Fetch(i_rCore, &IHostCoreServices::GetPreferencesStore);
+    if (!services.pPreferencesStore) // then they last as long as the module
+        services.pPreferencesStore = TQL::MakeShared<Store::VStore>();
     services.pResources = pResources;
     services.pEngineHost = Fetch(i_rUi, &IHostUiServices::GetQmlEngineHost);
     services.bChannelBrowser = i_rCore.HasChannelBrowser();

@@ -23,6 +23,15 @@ std::shared_ptr<VHandlerCallback> VHandlerRegistry::Find(const HandlerKey& i_rKe
     return found != m_Handlers.end() ? found->second.pWeak.lock() : nullptr;
 }
 
+std::vector<std::shared_ptr<VHandlerCallback>> VHandlerRegistry::GetLiving() const
+{
+    std::vector<std::shared_ptr<VHandlerCallback>> handlers;
+    for (const auto& [rKey, rKnown] : m_Handlers)
+        if (auto pHandler = rKnown.pWeak.lock())
+            handlers.push_back(std::move(pHandler));
+    return handlers;
+}
+
 void VHandlerRegistry::Attach(const std::shared_ptr<VHandlerCallback>& i_rpHandler)
 {
     VHandlerCallback* const pHandler = i_rpHandler.get();

@@ -24,6 +24,8 @@ public:
 
     /// The living handler of that (normalised) key, or null.
     std::shared_ptr<VHandlerCallback> Find(const HandlerKey& i_rKey) const;
+    /// Those that somebody still owns.
+    std::vector<std::shared_ptr<VHandlerCallback>> GetLiving() const;
     /// Enters the handler and attaches it to the entries that it names.
     void Attach(const std::shared_ptr<VHandlerCallback>& i_rpHandler);
     void Detach(VHandlerCallback& i_rHandler);

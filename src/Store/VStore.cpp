@@ -205,6 +205,12 @@ std::shared_ptr<TQL::IHandlerCallback> VStore::GetHandlerCallback(const HandlerK
     return pHandler;
 }
 
+std::vector<std::shared_ptr<VHandlerCallback>> VStore::GetHandlers() const
+{
+    const std::lock_guard lock(m_Mutex);
+    return m_Handlers.GetLiving();
+}
+
 void VStore::ReleaseHandler(VHandlerCallback& i_rHandler)
 {
     const std::lock_guard lock(m_Mutex);

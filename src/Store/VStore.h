@@ -45,6 +45,9 @@ public:
     std::shared_ptr<TQL::IHandlerCallback> GetHandlerCallback(const HandlerKey& i_rKey) override;
     std::shared_ptr<void> GetOwner() const override { return m_pOwner; }
 
+    /// The handlers that somebody holds, for a host that looks for what a plug-in has left.
+    std::vector<std::shared_ptr<VHandlerCallback>> GetHandlers() const;
+
     // For the reader and the writer.
     std::shared_ptr<VStore> GetShared();
     VStoreEntry* Own(EntryHandle i_Entry) const { return m_Table.Own(i_Entry); }

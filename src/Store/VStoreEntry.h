@@ -59,6 +59,8 @@ struct BlockField
     TQL::EChangeFlags Bit;
     T TBlock::*pMember;
 };
+template <typename TBlock, typename T>
+BlockField(TQL::EChangeFlags, T TBlock::*) -> BlockField<TBlock, T>; // clang deduces it itself from 17 on
 
 namespace Field
 {
@@ -92,7 +94,7 @@ inline constexpr std::tuple s_AllOfInfo{s_DisplayName,    s_Category,         s_
 template <typename TBlock>
 const TBlock& EmptyBlock()
 {
-    static const TBlock s_Empty;
+    static const TBlock s_Empty{};
     return s_Empty;
 }
 

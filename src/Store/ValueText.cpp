@@ -1,5 +1,6 @@
 #include "Store/ValueText.h"
 
+#include "Store/EnumStorage.h"
 #include "TQL/ISchema.h"
 #include "TQL/RapidJson.h"
 
@@ -61,19 +62,14 @@ bool AppendFloat(Bytes& io_rBytes, const Json& i_rJson, bool i_bDouble)
 {
     if (!i_rJson.IsNumber())
         return false;
-    const double number = i_rJson.GetDouble();
-    if (i_bDouble)
+    const double number = i_rJson.GetDouble(); // infinity for 1.8e308
+    if (i_bDouble && std::isfinite(number))
         AppendNumber(io_rBytes, std::bit_cast<std::uint64_t>(number), 8);
-    else if (std::abs(number) <= static_cast<double>(std::numeric_limits<float>::max()))
+    else if (!i_bDouble && std::abs(number) <= static_cast<double>(std::numeric_limits<float>::max()))
         AppendNumber(io_rBytes, std::bit_cast<std::uint32_t>(static_cast<float>(number)), 4);
     else
         return false;
     return true;
-}
-
-std::size_t EnumSize(TQL::EType i_Type)
-{
-    return i_Type == TQL::EType::Enum8 ? 1 : i_Type == TQL::EType::Enum16 ? 2 : 4;
 }
 
 bool AppendEnum(Bytes& io_rBytes, const TQL::ISchema& i_rSchema, std::string_view i_Name)
@@ -81,9 +77,8 @@ bool AppendEnum(Bytes& io_rBytes, const TQL::ISchema& i_rSchema, std::string_vie
     for (const auto& [name, number] : i_rSchema.EnumValues)
         if (name == i_Name)
         {
-            const std::int64_t end = std::int64_t{1} << (8 * EnumSize(i_rSchema.Type) - 1);
             AppendNumber(io_rBytes, static_cast<std::uint64_t>(std::int64_t{number}), EnumSize(i_rSchema.Type));
-            return number >= -end && number < end;
+            return FitsEnum(i_rSchema.Type, number);
         }
     return false;
 }
@@ -190,8 +185,11 @@ std::optional<StoreValue> EnumValue(const TQL::ISchema& i_rSchema, std::string_v
 
 std::optional<StoreValue> ParseValueText(const TQL::ISchema& i_rSchema, std::string_view i_Text)
 {
+    // Most texts are short, and the memory for long ones is slow to get.
+    char memory[2048];
+    rapidjson::MemoryPoolAllocator<> pool(memory, sizeof(memory));
+    rapidjson::Document document(&pool);
     // Iterative: the depth of the text must not be the depth of the stack.
-    rapidjson::Document document;
     document.Parse<rapidjson::kParseFullPrecisionFlag | rapidjson::kParseIterativeFlag>(i_Text.data(), i_Text.size());
     Bytes bytes;
     if (document.HasParseError() || !Append(bytes, i_rSchema, document))

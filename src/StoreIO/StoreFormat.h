@@ -2,6 +2,7 @@
 
 #include "StoreIO/IStoreMigrator.h"
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
@@ -21,6 +22,11 @@ inline constexpr std::string_view VersionsEntry = "Versions";
 inline constexpr TQL::StoreVersion CurrentFormat{3, 0};
 inline constexpr TQL::StoreVersion LowestFormat{3, 0};
 inline constexpr TQL::StoreVersion HighestFormat{3, 0};
+
+/// What a file may not go beyond, so that no file takes more stack or memory than a few times its size.
+inline constexpr std::size_t MaximumJsonDepth = 1024; ///< objects and lists inside one another; an entry takes two
+inline constexpr std::size_t MaximumPathDepth = 256;  ///< components
+inline constexpr std::size_t MaximumPathSize = 4096;  ///< bytes
 
 /// Major, dot, minor.
 std::string VersionText(TQL::StoreVersion i_Version);

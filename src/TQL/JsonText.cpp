@@ -2,7 +2,12 @@
 
 #include "TQL/RapidJson.h"
 
+#include <algorithm>
+#include <array>
 #include <charconv>
+#include <cmath>
+#include <limits>
+#include <system_error>
 
 namespace TQL::JsonText
 {
@@ -12,7 +17,7 @@ namespace
 constexpr char NoEscape = '\0';
 
 /// The letter after the backslash; 'u' for a control character without a letter of its own.
-char FindEscape(char i_Char) noexcept
+constexpr char FindEscape(char i_Char) noexcept
 {
     switch (i_Char)
     {
@@ -34,6 +39,14 @@ char FindEscape(char i_Char) noexcept
     }
 }
 
+constexpr auto s_Escapes = []
+{
+    std::array<char, 256> escapes{};
+    for (std::size_t i = 0; i < escapes.size(); ++i)
+        escapes[i] = FindEscape(static_cast<char>(i));
+    return escapes;
+}();
+
 template <typename Integer>
 void AppendInteger(std::string& o_rText, Integer i_Value)
 {
@@ -43,27 +56,31 @@ void AppendInteger(std::string& o_rText, Integer i_Value)
 
 } // namespace
 
-void AppendQuoted(std::string& o_rText, std::string_view i_Text)
+void AppendEscaped(std::string& o_rText, std::string_view i_Text)
 {
     constexpr std::string_view hexDigits = "0123456789ABCDEF";
-    o_rText += '"';
-    for (const char c : i_Text)
+    const char* pPlain = i_Text.data(); // what needs no escape is appended in one piece
+    const char* const pEnd = pPlain + i_Text.size();
+    for (const char* pChar = pPlain; pChar != pEnd; ++pChar)
     {
-        const char escape = FindEscape(c);
+        const auto byte = static_cast<unsigned char>(*pChar);
+        const char escape = s_Escapes[byte];
         if (escape == NoEscape)
-        {
-            o_rText += c;
             continue;
-        }
+        o_rText.append(pPlain, pChar);
+        pPlain = pChar + 1;
         o_rText += '\\';
         o_rText += escape;
         if (escape == 'u')
-        {
-            o_rText += "00";
-            o_rText += hexDigits[static_cast<unsigned char>(c) >> 4];
-            o_rText += hexDigits[static_cast<unsigned char>(c) & 15];
-        }
+            o_rText.append("00").append({hexDigits[byte >> 4], hexDigits[byte & 15]});
     }
+    o_rText.append(pPlain, pEnd);
+}
+
+void AppendQuoted(std::string& o_rText, std::string_view i_Text)
+{
+    o_rText += '"';
+    AppendEscaped(o_rText, i_Text);
     o_rText += '"';
 }
 
@@ -79,11 +96,27 @@ void AppendNumber(std::string& o_rText, std::uint64_t i_Value)
 
 bool AppendNumber(std::string& o_rText, double i_Value)
 {
-    rapidjson::StringBuffer buffer;
-    rapidjson::Writer<rapidjson::StringBuffer> writer(buffer);
-    const bool bWritten = writer.Double(i_Value);
-    o_rText.append(buffer.GetString(), buffer.GetSize());
-    return bWritten;
+    if (!std::isfinite(i_Value))
+        return false;
+    char digits[32]; // 25 are the most that a number takes
+    o_rText.append(digits, rapidjson::internal::dtoa(i_Value, digits));
+    return true;
+}
+
+double ReadDecimal(std::string_view i_Digits, std::int64_t i_Exponent)
+{
+    i_Digits.remove_prefix(std::min(i_Digits.find_first_not_of('0'), i_Digits.size()));
+    if (i_Digits.empty())
+        return 0.0;
+    std::string text(i_Digits);
+    text += 'e';
+    AppendInteger(text, i_Exponent);
+    double number = 0.0;
+    const auto [pEnd, error] = std::from_chars(text.data(), text.data() + text.size(), number);
+    if (error != std::errc::result_out_of_range)
+        return number;
+    const bool bBig = i_Exponent + static_cast<std::int64_t>(i_Digits.size()) > 0;
+    return bBig ? std::numeric_limits<double>::infinity() : 0.0;
 }
 
 } // namespace TQL::JsonText

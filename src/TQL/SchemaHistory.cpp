@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <map>
-#include <ranges>
 
 namespace TQL
 {
@@ -66,8 +65,8 @@ bool CarryNames(std::span<const SchemaRename> i_From, std::span<const SchemaRena
         return false;
     for (const SchemaRename& rStep : i_To.subspan(common))
         Rename(rStep.From, rStep.To, io_rNames);
-    for (const SchemaRename& rStep : i_From.subspan(common) | std::views::reverse)
-        Rename(rStep.To, rStep.From, io_rNames);
+    for (std::size_t i = i_From.size(); i-- != common;)
+        Rename(i_From[i].To, i_From[i].From, io_rNames);
     return true;
 }
 

@@ -75,6 +75,13 @@ std::error_code OpenMapped(const std::string& i_rPath, EMapping i_Access, std::u
 void CloseMapped(MappedFile& io_rFile);
 std::error_code MapView(const MappedFile& i_rFile, std::uint64_t i_Offset, std::uint64_t i_Length, void*& o_rpView);
 void UnmapView(void* i_pView, std::uint64_t i_Length);
+
+/// Gives back the memory of a view for reading; the file is read again where the view is touched again.
+void ForgetView(void* i_pView, std::uint64_t i_Length);
+
+/// The bytes that the file has now, 0 where that cannot be told.
+std::uint64_t GetSizeNow(const MappedFile& i_rFile);
+
 std::uint64_t GetAllocationGranularity();
 
 /// See UtilsFileSystem::FindLockingProcesses.

@@ -64,6 +64,13 @@ std::pair<std::byte*, TQL::IResult> VMemoryMappedFileBase::MapView(std::uint64_t
     return {static_cast<std::byte*>(pView) + remainder, TQL::Result::Ok};
 }
 
+void VMemoryMappedFileBase::ForgetViews()
+{
+    const std::lock_guard lock(m_Mutex);
+    for (const auto& [base, length] : m_Views)
+        System::ForgetView(reinterpret_cast<void*>(base), length);
+}
+
 void VMemoryMappedFileBase::UnmapView(const std::byte* i_pView)
 {
     const std::lock_guard lock(m_Mutex);

@@ -40,6 +40,12 @@ public:
     /// Takes an address that MapView gave.
     void UnmapView(const std::byte* i_pView);
 
+    /// Gives back the memory that the views of an input file hold; where they are read again, so is the file.
+    void ForgetViews();
+
+    /// Whether the open file still has all its bytes. Another program may have shortened it.
+    bool IsStillWhole() const { return System::GetSizeNow(m_File) >= m_File.Size; }
+
 protected:
     std::uint64_t GetFileSize() const { return m_File.Size; }
 

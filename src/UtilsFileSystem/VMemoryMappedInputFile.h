@@ -29,7 +29,9 @@ public:
     /// Logs the statistics.
     void Close();
 
+    using VMemoryMappedFileBase::ForgetViews;
     using VMemoryMappedFileBase::IsOpen;
+    using VMemoryMappedFileBase::IsStillWhole;
 
     std::pair<std::size_t, TQL::IResult> Read(std::span<std::byte> o_Bytes);
     TQL::IResult Seek(std::uint64_t i_Position);

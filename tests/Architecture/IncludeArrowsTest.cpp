@@ -32,7 +32,7 @@ const std::map<std::string, Rooms> s_Below = {
     {"GraphPlotSystem",
      {"NotificationSystem", "ChannelSystem", "OrvanePluginInterface", "CoreGraphics", "IOInterfaceQt"}},
     {"GraphPlotUI", {"GraphPlotSystem", "ZarvoQtQuick"}},
-    {"GraphPlotUIOrvane", {"GraphPlotUI"}},
+    {"GraphPlotUIOrvane", {"GraphPlotUI", "StoreIO"}},
     {"Recordings", {"TQL"}},
     {"Simulation", {"Recordings"}},
     {"Channels", {"Recordings", "NotificationSystem", "ChannelSystem"}},

@@ -1,7 +1,6 @@
 #include "GraphPlotSystem/FakeHost.h"
 #include "GraphPlotSystem/VPlainChannelComponentControls.h"
 #include "GraphPlotSystem/VPlainChannelTextProvider.h"
-#include "GraphPlotSystem/VPlainGraphPlotPreferences.h"
 #include "support/LogGuard.h"
 
 #include <gtest/gtest.h>
@@ -162,46 +161,4 @@ TEST_F(PlainTexts, EveryComponentIsOnUnlessSwitchedOff)
     controls.SetComponentEnabled(subType, 1, true);
     EXPECT_EQ(enabled(subType), (List{0, 1, 2}));
     EXPECT_EQ(changes, 2);
-}
-
-TEST(PlainPreferences, TellOnlyTheSubscribersOfAPreferenceThatChanged)
-{
-    VPlainGraphPlotPreferences preferences;
-    using Value = IGraphPlotPreferences::Value;
-    std::string told;
-    IGraphPlotPreferences::Token colours = 0;
-    IGraphPlotPreferences::Token unwrapping = 0;
-    const auto tell = [&told](const char* i_pText)
-    {
-        return [&told, i_pText]
-        {
-            told += i_pText;
-        };
-    };
-    ASSERT_TRUE(
-        preferences.AddCallback(colours, IGraphPlotPreferences::TraceColourSet, tell("c"), nullptr).IsSuccess());
-    ASSERT_TRUE(preferences.AddCallback(unwrapping, IGraphPlotPreferences::EnableRotationUnwrapping, tell("u"), nullptr)
-                    .IsSuccess());
-
-    Value value;
-    EXPECT_TRUE(preferences.GetValue(IGraphPlotPreferences::EnableRotationUnwrapping, value).IsSuccess());
-    EXPECT_EQ(value, Value(true));
-    EXPECT_EQ(preferences.SetValue(IGraphPlotPreferences::TraceColourSet, std::int32_t{2}), TQL::Result::Ok);
-    EXPECT_EQ(preferences.SetValue(IGraphPlotPreferences::TraceColourSet, std::int32_t{2}), TQL::Result::Ok);
-    EXPECT_EQ(preferences.SetValue(IGraphPlotPreferences::TraceColourSet, true), TQL::Result::InvalidArgument);
-    EXPECT_EQ(told, "c");
-    EXPECT_EQ(preferences.RemoveCallback(IGraphPlotPreferences::TraceColourSet, unwrapping), TQL::Result::NotFound);
-    EXPECT_EQ(preferences.RemoveCallback(IGraphPlotPreferences::EnableRotationUnwrapping, unwrapping), TQL::Result::Ok);
-    EXPECT_EQ(preferences.SetValue(IGraphPlotPreferences::EnableRotationUnwrapping, false), TQL::Result::Ok);
-    EXPECT_EQ(told, "c");
-    for (const int index : {-1, 3})
-    {
-        IGraphPlotPreferences::Token token = 0;
-        EXPECT_EQ(preferences.GetValue(index, value), TQL::Result::InvalidArgument);
-        EXPECT_EQ(preferences.SetValue(index, true), TQL::Result::InvalidArgument);
-        EXPECT_EQ(preferences.AddCallback(
-                      token, index, [] {}, nullptr),
-                  TQL::Result::InvalidArgument);
-        EXPECT_EQ(preferences.RemoveCallback(index, colours), TQL::Result::InvalidArgument);
-    }
 }

@@ -1,9 +1,9 @@
 #pragma once
 
+#include "GraphPlotSystem/FakePreferences.h"
 #include "GraphPlotSystem/FakeTraceWindow.h"
 #include "GraphPlotSystem/SharedObject.h"
 #include "GraphPlotSystem/VPlainChannelComponentControls.h"
-#include "GraphPlotSystem/VPlainGraphPlotPreferences.h"
 #include "GraphPlotSystem/VTraceManager.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
@@ -86,8 +86,7 @@ protected:
     std::shared_ptr<TestSupport::ManualPostalService> pUi = std::make_shared<TestSupport::ManualPostalService>();
     std::shared_ptr<FakeHost::Context> pLive =
         std::make_shared<FakeHost::Context>("Live", ChannelSystem::EContextType::Live);
-    std::shared_ptr<GraphPlotUI::VPlainGraphPlotPreferences> pPreferences =
-        std::make_shared<GraphPlotUI::VPlainGraphPlotPreferences>();
+    std::shared_ptr<FakePreferences> pPreferences = std::make_shared<FakePreferences>();
     std::shared_ptr<FakeTraceWindow::TextProvider> pTexts =
         std::make_shared<FakeTraceWindow::TextProvider>(pService, pUi);
     std::shared_ptr<GraphPlotUI::VPlainChannelComponentControls> pControls =

@@ -1,10 +1,13 @@
 #include "Store/ValueText.h"
+#include "Store/ValueTextWriter.h"
 #include "TQL/SchemaIntern.h"
 
 #include <gtest/gtest.h>
 
 #include <cstdio>
 #include <string>
+#include <utility>
+#include <vector>
 
 namespace
 {
@@ -25,9 +28,10 @@ std::string Hex(const std::optional<Store::StoreValue>& i_rValue)
     return text;
 }
 
-TEST(ValueText, ReadsEachTypeIntoItsLayout)
+TEST(ValueText, ReadsAndWritesEachType)
 {
     const ISchema units = MakeEnumSchema(EType::Enum16, "EUnits", {{"Metres", 2}, {"Feet", -3}, {"Far", 70000}});
+    const ISchema bits = MakeEnumSchema(EType::Enum8, "EBits", {{"Past", 456}, {"Low", -128}, {"High", 200}});
     const ISchema range =
         MakeNamedTupleSchema("Range", {{"Low", ISchema(EType::Int8)}, {"High", ISchema(EType::UInt16)}});
     const ISchema list = MakeListSchema(ISchema(EType::UInt8));
@@ -56,6 +60,9 @@ TEST(ValueText, ReadsEachTypeIntoItsLayout)
         {units, "\"Metres\"", "0200"},
         {units, "\"Feet\"", "fdff"},
         {units, "\"Far\"", "none"},
+        {bits, "\"Low\"", "80"},
+        {bits, "\"High\"", "c8"},
+        {bits, "\"Past\"", "none"},
         {units, "\"Miles\"", "none"},
         {list, "[ 1 , 2 ]", "020000000102"},
         {list, "[1,300]", "none"},
@@ -67,14 +74,25 @@ TEST(ValueText, ReadsEachTypeIntoItsLayout)
         {range, "{\"High\":258}", "none"},
         {range, "{\"Low\":1,\"Low\":1}", "none"},
         {MakeTupleSchema({list, ISchema(EType::Bool)}), "[[7],true]", "010000000701"},
+        {MakeListSchema(MakeTupleSchema({})), "[[],[]]", "02000000"},
         {ISchema(EType::Void), "null", "none"},
         {ISchema(EType::Int32), "", "none"},
     };
     for (const auto& rCase : s_Cases)
     {
         const ISchema& rSchema = IO::GetUniqueSchema(rCase.Schema);
-        EXPECT_EQ(Hex(Store::ParseValueText(rSchema, rCase.pText)), rCase.pBytes)
-            << GetName(rSchema.Type) << " " << std::string(rCase.pText).substr(0, 40);
+        const auto value = Store::ParseValueText(rSchema, rCase.pText);
+        EXPECT_EQ(Hex(value), rCase.pBytes) << GetName(rSchema.Type) << " " << rCase.pText;
+        if (!value)
+            continue;
+        std::string text;
+        EXPECT_TRUE(Store::AppendValueText(text, rSchema, value->Bytes())) << rCase.pText;
+        EXPECT_EQ(Hex(Store::ParseValueText(rSchema, text)), rCase.pBytes) << rCase.pText << " as " << text;
+        for (std::size_t size = 0; size < value->Bytes().size(); ++size)
+        {
+            const std::vector<std::uint8_t> cut(value->Bytes().begin(), value->Bytes().begin() + std::ptrdiff_t(size));
+            EXPECT_FALSE(Store::AppendValueText(text, rSchema, cut)) << rCase.pText << " cut to " << size;
+        }
     }
 }
 
@@ -84,6 +102,28 @@ TEST(ValueText, ADeepTextIsReadWithoutADeepStack)
     const ISchema& rSchema = IO::GetUniqueSchema(schema);
     const std::string deep = std::string(1'000'000, '[') + std::string(1'000'000, ']');
     EXPECT_FALSE(Store::ParseValueText(rSchema, deep));
+}
+
+TEST(ValueText, WritesNoValueWithoutAText)
+{
+    using Bytes = std::vector<std::uint8_t>;
+    const ISchema units = MakeEnumSchema(EType::Enum8, "EUnits", {{"Metres", 2}, {"Far", 259}});
+    const std::pair<ISchema, Bytes> s_Cases[] = {
+        {units, {3}},
+        {ISchema(EType::Float32), {0, 0, 0x80, 0x7f}},
+        {MakeTupleSchema({ISchema(EType::Bool), ISchema(EType::Float64)}), {1, 0, 0, 0, 0, 0, 0, 0xf8, 0x7f}},
+        {ISchema(EType::String), {0xff, 0xff, 0xff, 0xff, 'a'}},
+        {MakeListSchema(ISchema(EType::Bool)), {0xff, 0xff, 0xff, 0x7f, 1}},
+        {ISchema(EType::List), {0, 0, 0, 0}},
+        {ISchema(EType::Void), {1}},
+        {ISchema(EType::Ref), {1}},
+    };
+    for (const auto& [schema, bytes] : s_Cases)
+    {
+        std::string text = "before";
+        EXPECT_FALSE(Store::AppendValueText(text, schema, bytes)) << GetName(schema.Type);
+        EXPECT_EQ(text, "before");
+    }
 }
 
 } // namespace

@@ -71,6 +71,18 @@ void UnmapView(void* i_pView, std::uint64_t i_Length)
     ::munmap(i_pView, i_Length);
 }
 
+void ForgetView(void* i_pView, std::uint64_t i_Length)
+{
+    (void)::madvise(i_pView, i_Length, MADV_DONTNEED);
+}
+
+std::uint64_t GetSizeNow(const MappedFile& i_rFile)
+{
+    struct stat status;
+    const bool bKnown = ::fstat(static_cast<int>(i_rFile.File), &status) == 0;
+    return bKnown ? static_cast<std::uint64_t>(status.st_size) : 0;
+}
+
 std::uint64_t GetAllocationGranularity()
 {
     return static_cast<std::uint64_t>(::sysconf(_SC_PAGESIZE));

@@ -80,6 +80,17 @@ void UnmapView(void* i_pView, std::uint64_t)
     ::UnmapViewOfFile(i_pView);
 }
 
+void ForgetView(void* i_pView, std::uint64_t i_Length)
+{
+    (void)::VirtualUnlock(i_pView, i_Length); // of pages that are not locked: takes them off the working set
+}
+
+std::uint64_t GetSizeNow(const MappedFile& i_rFile)
+{
+    LARGE_INTEGER length;
+    return ::GetFileSizeEx(AsHandle(i_rFile.File), &length) ? static_cast<std::uint64_t>(length.QuadPart) : 0;
+}
+
 std::uint64_t GetAllocationGranularity()
 {
     SYSTEM_INFO info;
