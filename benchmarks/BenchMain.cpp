@@ -13,9 +13,13 @@ namespace Bench
 {
 
 void RunNotification(Table& o_rTable);
+void RunOsc(Table& o_rTable);
+void RunOpenRecording(Table& o_rTable);
+void RunRecordings(Table& o_rTable);
 void RunRedraw(Table& o_rTable);
 void RunRefill(Table& o_rTable);
 void RunStore(Table& o_rTable);
+void RunStoreFile(Table& o_rTable);
 void RunSummary(Table& o_rTable);
 void RunUpdateTick(Table& o_rTable);
 
@@ -28,9 +32,16 @@ struct Entry
     void (*pRun)(Table&);
 };
 
-constexpr Entry s_Entries[] = {
-    {"notification", RunNotification}, {"summary", RunSummary}, {"refill", RunRefill}, {"store", RunStore},
-    {"update", RunUpdateTick},         {"redraw", RunRedraw}};
+constexpr Entry s_Entries[] = {{"notification", RunNotification},
+                               {"summary", RunSummary},
+                               {"refill", RunRefill},
+                               {"store", RunStore},
+                               {"files", RunStoreFile},
+                               {"recordings", RunRecordings},
+                               {"c3d", RunOpenRecording},
+                               {"update", RunUpdateTick},
+                               {"redraw", RunRedraw},
+                               {"osc", RunOsc}};
 
 const char* GoalText(const Figure& i_rFigure)
 {

@@ -8,6 +8,20 @@ say() { printf '== %s\n' "$*"; }
 
 wanted_packages() { grep -v '^#' "$root/tools/packages.txt"; }
 
+# For tools that cannot work everywhere.
+skip() {
+    echo "skipped: $*"
+    exit 77
+}
+
+# want FILE PACKAGE: false when the file is not there and the package that has it cannot be installed.
+want() {
+    if command -v "$1" >/dev/null || [ -e "$1" ]; then return 0; fi
+    [ "$(id -u)" -eq 0 ] && command -v apt-get >/dev/null || return 1
+    say "installing $2"
+    DEBIAN_FRONTEND=noninteractive apt-get install -y -qq --no-install-recommends "$2" >/dev/null
+}
+
 # As many compilers at once as there are cores, but never more than the memory carries.
 jobs() {
     local cores memory

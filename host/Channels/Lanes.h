@@ -12,6 +12,7 @@ namespace Channels::Detail
 
 using Floats = float __attribute__((vector_size(16)));
 using Words = std::int32_t __attribute__((vector_size(16)));
+using LongWords = std::int64_t __attribute__((vector_size(16)));
 
 inline constexpr std::size_t LaneCount = 4;
 inline constexpr float Infinity = std::numeric_limits<float>::infinity();
@@ -38,6 +39,14 @@ struct Lanes
         Maximum = i_Values > Maximum ? i_Values : Maximum;
         Minimum = i_Values < Minimum ? i_Values : Minimum;
         Count -= valid;
+    }
+
+    /// All but the sum.
+    void Extend(Floats i_Values)
+    {
+        Maximum = i_Values > Maximum ? i_Values : Maximum;
+        Minimum = i_Values < Minimum ? i_Values : Minimum;
+        Count -= i_Values == i_Values;
     }
 
     void Add(const Lanes& i_rOther)

@@ -82,14 +82,20 @@ void ReduceBuckets(std::span<const float> i_Samples, std::size_t i_Bucket, std::
 /// The summary of everything that the records summarise.
 LodRecord Combine(std::span<const LodRecord> i_Records);
 
-/// Records of two rows each, from rows of interleaved components: one record a component and two rows.
-void SummarisePairs(const float* i_pRows, std::size_t i_Components, std::size_t i_Records, LodRecord* o_pRecords);
+/// Records of i_RowsEach rows each, 2, 4 or 8, from rows of interleaved components: one record a component and so many
+/// rows.
+void SummariseFew(const float* i_pRows, std::size_t i_Components, std::size_t i_RowsEach, std::size_t i_Records,
+                  LodRecord* o_pRecords);
 
-/// Records of four rows each.
-void SummariseFours(const float* i_pRows, std::size_t i_Components, std::size_t i_Records, PackedRecord* o_pRecords);
+/// Records of 16 rows each.
+void SummariseSixteens(const float* i_pRows, std::size_t i_Components, std::size_t i_Records, PackedRecord* o_pRecords);
 
-/// Records of two records each: the next level above.
+/// Records of two records each.
 void CombinePairs(const PackedRecord* i_pRecords, std::size_t i_Components, std::size_t i_Records,
+                  LodRecord* o_pRecords);
+
+/// Records of four records each.
+void CombineFours(const PackedRecord* i_pRecords, std::size_t i_Components, std::size_t i_Records,
                   PackedRecord* o_pRecords);
 
 /// From the form in memory to the form for readers.

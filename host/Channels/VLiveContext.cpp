@@ -10,7 +10,7 @@ namespace
 {
 
 /// What a value costs while it is kept: itself, and its share of the summary levels if it is plotted.
-constexpr std::int64_t BytesPerValue = 12;
+constexpr std::int64_t BytesPerValue = 6;
 
 /// Trimming gives memory back by the chunk, so it is not tried more often than every so many frames.
 constexpr std::int64_t TrimStep = 256;
@@ -140,6 +140,7 @@ void VLiveContext::TrimLocked()
     if (first <= m_StartFrame)
         return;
     m_StartFrame = first;
+    SetRangeLocked(); // before the samples go: what the range says was there when it was said
     for (const Inlet& rInlet : m_Inlets)
         rInlet.pChannel->GetSamples()->TrimBefore(first * m_Options.FramePeriod);
 }

@@ -2,74 +2,27 @@
 
 #include "TQL/Log.h"
 
-#include <algorithm>
-#include <map>
 #include <utility>
 
 namespace Channels
 {
 
-namespace
-{
-
-using Recordings::EChannelKind;
-using Recordings::RecordedChannel;
-
-/// Gives the channels of a recording their numbers, in the order in which they come.
-class Numbering
-{
-public:
-    ChannelDefinition Define(const RecordedChannel& i_rChannel)
-    {
-        ChannelDefinition definition;
-        definition.TypeName = ChannelTypeOf(i_rChannel.Kind).Name;
-        definition.Name = i_rChannel.Name;
-        definition.Units = i_rChannel.Units;
-        definition.ComponentNames = i_rChannel.ComponentNames;
-        switch (i_rChannel.Kind)
-        {
-        case EChannelKind::Marker:
-        case EChannelKind::SegmentPose:
-            definition.First = SubjectOf(i_rChannel.Subject);
-            definition.Second = m_Next[{i_rChannel.Kind, definition.First}]++;
-            break;
-        case EChannelKind::Analog:
-            definition.Second = m_Next[{i_rChannel.Kind, 0}]++;
-            break;
-        case EChannelKind::JointAngles:
-        case EChannelKind::Column:
-            definition.First = m_Next[{i_rChannel.Kind, 0}]++;
-            definition.Text = i_rChannel.Name;
-            break;
-        }
-        return definition;
-    }
-
-private:
-    std::uint64_t SubjectOf(const std::string& i_rName)
-    {
-        return m_Subjects.emplace(i_rName, m_Subjects.size()).first->second;
-    }
-
-    std::map<std::string, std::uint64_t> m_Subjects;
-    std::map<std::pair<EChannelKind, std::uint64_t>, std::uint64_t> m_Next;
-};
-
-} // namespace
-
 VRecordedContext::VRecordedContext(std::string i_Name, std::shared_ptr<VSubTypeTable> i_pSubTypes,
-                                   std::shared_ptr<const Recordings::VRecording> i_pRecording)
+                                   std::shared_ptr<const Recordings::VRecording> i_pRecording,
+                                   const VRecordedContext* i_pBefore)
     : VChannelContext(std::move(i_Name), ChannelSystem::EContextType::Recorded, i_pRecording->FramePeriod,
                       std::move(i_pSubTypes))
     , m_pRecording(std::move(i_pRecording))
+    , m_Numbering(i_pBefore ? i_pBefore->m_Numbering : VChannelNumbering())
 {
-    Numbering numbering;
-    for (const RecordedChannel& rChannel : m_pRecording->Channels)
+    const std::vector<ChannelDefinition> definitions = m_Numbering.DefineAll(*m_pRecording);
+    for (std::size_t i = 0; i < definitions.size(); ++i)
     {
-        const ChannelDefinition definition = numbering.Define(rChannel);
+        const Recordings::RecordedChannel& rChannel = m_pRecording->Channels[i];
+        const ChannelDefinition& rDefinition = definitions[i];
         const std::size_t components = rChannel.ComponentCount();
         TQL::IResult result = TQL::Result::InvalidInfo;
-        if (rChannel.SamplePeriod > 0 && components != 0 && components == ComponentNamesOf(definition).size())
+        if (rChannel.SamplePeriod > 0 && components != 0 && components == ComponentNamesOf(rDefinition).size())
         {
             auto pSamples = std::make_shared<VSampleStore>(rChannel.SamplePeriod, rChannel.FirstTick,
                                                            static_cast<std::uint32_t>(components));
@@ -78,7 +31,7 @@ VRecordedContext::VRecordedContext(std::string i_Name, std::shared_ptr<VSubTypeT
             result = pSamples->ReplaceShared(rChannel.FirstTick, m_pRecording,
                                              std::span<const float>(rChannel.Samples).first(values));
             if (result.IsSuccess())
-                result = AddChannel(definition, std::move(pSamples), pChannel);
+                result = AddChannel(rDefinition, std::move(pSamples), pChannel);
         }
         if (result.IsError())
             TQL::Log::Format(TQL::Log::GetCategory("Channels"), TQL::ELogSeverity::Warning, "Channels/VRecordedContext",

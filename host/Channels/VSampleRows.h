@@ -12,8 +12,8 @@ namespace Channels
 {
 
 /// The samples of a store as rows of interleaved components: either its own memory in chunks, or the memory of somebody
-/// else that it keeps alive and never writes. Runs of rows begin at multiples of four as far as rows exist, so a group
-/// of four rows is always contiguous. Not thread-safe; the store guards it.
+/// else that it keeps alive and never writes. Runs of rows begin at multiples of 1024 as far as rows exist, so 16 rows
+/// from a multiple of 16 on are always contiguous. Not thread-safe; the store guards it.
 class VSampleRows
 {
 public:

@@ -136,13 +136,15 @@ std::size_t VSampleStore::ReadSummary(const TQL::TickRange& i_rRange, std::uint3
 void VSampleStore::ReadWholeBins(std::uint32_t i_Level, std::int64_t i_First, std::int64_t i_End,
                                  LodRecord* o_pRecords) const
 {
-    if (i_Level > 0)
+    if (i_Level >= VSummaryPyramid::FirstLevel)
         return m_pPyramid->Read(i_Level, i_First, i_End, o_pRecords);
-    m_Rows.ForEachRun(2 * i_First, 2 * i_End,
+    const std::int64_t binRows = std::int64_t{2} << i_Level;
+    m_Rows.ForEachRun(binRows * i_First, binRows * i_End,
                       [&](const float* i_pRows, std::int64_t, std::int64_t i_Count)
                       {
-                          SummarisePairs(i_pRows, m_Components, static_cast<std::size_t>(i_Count / 2), o_pRecords);
-                          o_pRecords += static_cast<std::size_t>(i_Count / 2) * m_Components;
+                          const auto records = static_cast<std::size_t>(i_Count / binRows);
+                          SummariseFew(i_pRows, m_Components, static_cast<std::size_t>(binRows), records, o_pRecords);
+                          o_pRecords += records * m_Components;
                       });
 }
 

@@ -34,7 +34,8 @@ void DefineTypeParameters(const ChannelType& i_rType, VChannelParameters& o_rPar
 
 VSourceChannel::VSourceChannel(std::string_view i_Context, const ChannelDefinition& i_rDefinition,
                                VSubTypeTable& i_rSubTypes, std::shared_ptr<VSampleStore> i_pSamples)
-    : m_Id{std::string(i_Context), i_rDefinition.TypeName, i_rDefinition.First, i_rDefinition.Second,
+    : m_Definition(i_rDefinition)
+    , m_Id{std::string(i_Context), i_rDefinition.TypeName, i_rDefinition.First, i_rDefinition.Second,
            i_rDefinition.Text}
     , m_Description(DescribeComponents(i_rDefinition, i_rSubTypes))
     , m_pSamples(std::move(i_pSamples))

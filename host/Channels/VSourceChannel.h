@@ -21,6 +21,7 @@ public:
                    std::shared_ptr<VSampleStore> i_pSamples);
 
     const std::shared_ptr<VSampleStore>& GetSamples() const { return m_pSamples; }
+    const ChannelDefinition& GetDefinition() const { return m_Definition; }
 
     /// The output appeared or was replaced: tells the subscribers.
     void NotifyOutputChanged() { m_pParameters->Notifier().Notify(); }
@@ -37,6 +38,7 @@ public:
     std::uint64_t GetRevision() const override { return 1; }
 
 private:
+    const ChannelDefinition m_Definition;
     const TQL::IChannelInstanceId m_Id;
     const TQL::ComponentDescription m_Description;
     const std::shared_ptr<VSampleStore> m_pSamples;

@@ -26,12 +26,12 @@ VSummaryPyramid::Bins VSummaryPyramid::CompletedBins(std::uint32_t i_Level, std:
 
 bool VSummaryPyramid::Covers(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End) const
 {
-    for (std::uint32_t level = 1; level < LevelCount; ++level)
+    for (std::uint32_t level = FirstLevel; level < LevelCount; level += 2)
     {
         const Bins bins = CompletedBins(level, i_From, i_To, i_First, i_End);
         if (bins.First >= bins.End) // nor any above: a complete bin is made of complete bins
             return true;
-        if (level >= m_Levels.size() || !m_Levels[level].Covers(bins.First, bins.End))
+        if (PlaceOf(level) >= m_Levels.size() || !m_Levels[PlaceOf(level)].Covers(bins.First, bins.End))
             return false;
     }
     return true;
@@ -39,21 +39,21 @@ bool VSummaryPyramid::Covers(std::int64_t i_From, std::int64_t i_To, std::int64_
 
 void VSummaryPyramid::Ensure(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End)
 {
-    for (std::uint32_t level = 1; level < LevelCount; ++level)
+    for (std::uint32_t level = FirstLevel; level < LevelCount; level += 2)
     {
         const Bins bins = CompletedBins(level, i_From, i_To, i_First, i_End);
         if (bins.First >= bins.End)
             return;
-        while (level >= m_Levels.size())
+        while (PlaceOf(level) >= m_Levels.size())
             m_Levels.emplace_back(m_Components);
-        m_Levels[level].Ensure(bins.First, bins.End);
+        m_Levels[PlaceOf(level)].Ensure(bins.First, bins.End);
     }
 }
 
 void VSummaryPyramid::Build(const VSampleRows& i_rRows, std::int64_t i_From, std::int64_t i_To, std::int64_t i_First,
                             std::int64_t i_End)
 {
-    for (std::uint32_t level = 1; level < LevelCount; ++level)
+    for (std::uint32_t level = FirstLevel; level < LevelCount; level += 2)
     {
         const Bins bins = CompletedBins(level, i_From, i_To, i_First, i_End);
         if (bins.First >= bins.End)
@@ -64,34 +64,34 @@ void VSummaryPyramid::Build(const VSampleRows& i_rRows, std::int64_t i_From, std
 
 void VSummaryPyramid::BuildLevel(const VSampleRows& i_rRows, std::uint32_t i_Level, Bins i_Bins)
 {
-    Chunks& rTarget = m_Levels[i_Level];
+    Chunks& rTarget = m_Levels[PlaceOf(i_Level)];
     while (i_Bins.First < i_Bins.End)
     {
         std::int64_t run = std::min(Chunks::RunLength(i_Bins.First), i_Bins.End - i_Bins.First);
-        if (i_Level > 1)
-            run = std::min(run, Chunks::RunLength(2 * i_Bins.First) / 2);
+        if (i_Level > FirstLevel)
+            run = std::min(run, Chunks::RunLength(4 * i_Bins.First) / 4);
         const auto records = static_cast<std::size_t>(run);
         PackedRecord* pTarget = rTarget.Row(i_Bins.First);
-        if (i_Level == 1)
-            SummariseFours(i_rRows.Row(4 * i_Bins.First), m_Components, records, pTarget);
+        if (i_Level == FirstLevel)
+            SummariseSixteens(i_rRows.Row(16 * i_Bins.First), m_Components, records, pTarget);
         else
-            CombinePairs(m_Levels[i_Level - 1].Row(2 * i_Bins.First), m_Components, records, pTarget);
+            CombineFours(m_Levels[PlaceOf(i_Level) - 1].Row(4 * i_Bins.First), m_Components, records, pTarget);
         i_Bins.First += run;
     }
 }
 
 bool VSummaryPyramid::CanFreeBefore(std::int64_t i_Row) const
 {
-    for (std::uint32_t level = 1; level < m_Levels.size(); ++level)
-        if (m_Levels[level].CanFreeBefore(i_Row >> (level + 1)))
+    for (std::size_t place = 0; place < m_Levels.size(); ++place)
+        if (m_Levels[place].CanFreeBefore(i_Row >> (FirstLevel + 1 + 2 * place)))
             return true;
     return false;
 }
 
 void VSummaryPyramid::FreeBefore(std::int64_t i_Row)
 {
-    for (std::uint32_t level = 1; level < m_Levels.size(); ++level)
-        m_Levels[level].FreeBefore(i_Row >> (level + 1));
+    for (std::size_t place = 0; place < m_Levels.size(); ++place)
+        m_Levels[place].FreeBefore(i_Row >> (FirstLevel + 1 + 2 * place));
 }
 
 void VSummaryPyramid::Clear()
@@ -101,20 +101,26 @@ void VSummaryPyramid::Clear()
 
 void VSummaryPyramid::Read(std::uint32_t i_Level, std::int64_t i_First, std::int64_t i_End, LodRecord* o_pRecords) const
 {
+    const std::int64_t share = (i_Level - FirstLevel) % 2 == 0 ? 1 : 2; // kept records a bin
+    const Chunks& rLevel = m_Levels[PlaceOf(i_Level)];
     while (i_First < i_End)
     {
-        const std::int64_t run = std::min(Chunks::RunLength(i_First), i_End - i_First);
+        const std::int64_t run = std::min(Chunks::RunLength(share * i_First) / share, i_End - i_First);
         const std::size_t count = static_cast<std::size_t>(run) * m_Components;
-        Unpack(m_Levels[i_Level].Row(i_First), count, o_pRecords);
+        const PackedRecord* pRecords = rLevel.Row(share * i_First);
+        if (share == 1)
+            Unpack(pRecords, count, o_pRecords);
+        else
+            CombinePairs(pRecords, m_Components, static_cast<std::size_t>(run), o_pRecords);
         o_pRecords += count;
         i_First += run;
     }
 }
 
-void VSummaryPyramid::GatherBin(std::uint32_t i_Level, std::int64_t i_Bin, std::size_t i_Component,
+void VSummaryPyramid::GatherBin(std::size_t i_Place, std::int64_t i_Bin, std::size_t i_Component,
                                 std::span<Accumulator> o_Accumulators) const
 {
-    const PackedRecord* pRecords = m_Levels[i_Level].Row(i_Bin) + i_Component;
+    const PackedRecord* pRecords = m_Levels[i_Place].Row(i_Bin) + i_Component;
     for (std::size_t c = 0; c < o_Accumulators.size(); ++c)
         o_Accumulators[c].Add(pRecords[c]);
 }
@@ -129,24 +135,19 @@ void VSummaryPyramid::Gather(const VSampleRows& i_rRows, std::int64_t i_From, st
             [&](const float* i_pRows, std::int64_t, std::int64_t i_Count)
             { Reduce(i_pRows + i_Component, static_cast<std::size_t>(i_Count), m_Components, o_Accumulators); });
     };
-    Bins bins{CeilShift(i_From, 2), i_To >> 2};
+    Bins bins{CeilShift(i_From, FirstLevel + 1), i_To >> (FirstLevel + 1)};
     if (bins.First >= bins.End)
         return gatherRows(i_From, i_To);
-    gatherRows(i_From, 4 * bins.First);
-    gatherRows(4 * bins.End, i_To);
-    for (std::uint32_t level = 1; bins.First < bins.End; ++level)
+    gatherRows(i_From, bins.First << (FirstLevel + 1));
+    gatherRows(bins.End << (FirstLevel + 1), i_To);
+    for (std::size_t place = 0; bins.First < bins.End; ++place)
     {
-        if (level + 1 == LevelCount)
-        {
-            for (; bins.First < bins.End; ++bins.First)
-                GatherBin(level, bins.First, i_Component, o_Accumulators);
-            return;
-        }
-        if ((bins.First & 1) != 0)
-            GatherBin(level, bins.First++, i_Component, o_Accumulators);
-        if ((bins.End & 1) != 0)
-            GatherBin(level, --bins.End, i_Component, o_Accumulators);
-        bins = {bins.First >> 1, bins.End >> 1};
+        const bool bLast = place == PlaceOf(LevelCount - 1);
+        while (bins.First < bins.End && (bLast || (bins.First & 3) != 0))
+            GatherBin(place, bins.First++, i_Component, o_Accumulators);
+        while (bins.First < bins.End && (bins.End & 3) != 0)
+            GatherBin(place, --bins.End, i_Component, o_Accumulators);
+        bins = {bins.First >> 2, bins.End >> 2};
     }
 }
 

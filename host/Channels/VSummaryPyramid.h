@@ -13,14 +13,15 @@ namespace Channels
 {
 
 /// The summary records above the samples of a store. Level k has one record a component for 2^(k+1) rows, its bins
-/// counted from row 0. Only bins whose rows all exist are kept, so a record never changes once it is written; bins at
-/// the borders are gathered when they are read, from at most two records of each level. Level 0 is not kept either: it
-/// is as quick to make from the samples. Appending costs one record a sample on the whole. Not thread-safe; the store
-/// guards it.
+/// counted from row 0. Every second level is kept, from 16 rows a bin on, which costs a third of the memory of the
+/// samples; a level between is made from the one below when it is read, those of fewer rows from the samples. Only bins
+/// whose rows all exist are kept, so a record never changes once it is written; bins at the borders are gathered when
+/// they are read, from at most six records of each level. Not thread-safe; the store guards it.
 class VSummaryPyramid
 {
 public:
     static constexpr std::uint32_t LevelCount = 24;
+    static constexpr std::uint32_t FirstLevel = 3; ///< the first that is kept; those below are made from the samples
 
     explicit VSummaryPyramid(std::uint32_t i_Components);
 
@@ -37,7 +38,7 @@ public:
     void FreeBefore(std::int64_t i_Row);
     void Clear();
 
-    /// Complete bins [i_First, i_End) of a level above 0.
+    /// Complete bins [i_First, i_End) of a level from FirstLevel on.
     void Read(std::uint32_t i_Level, std::int64_t i_First, std::int64_t i_End, LodRecord* o_pRecords) const;
 
     /// Adds the existing rows [i_From, i_To) of components i_Component and on to the accumulators.
@@ -47,7 +48,8 @@ public:
     std::size_t ByteCount() const;
 
 private:
-    using Chunks = VRowChunks<PackedRecord, 128>;
+    /// Of as many records as a chunk of samples completes on the first level.
+    using Chunks = VRowChunks<PackedRecord, VSampleRows::Chunks::ChunkRows / 16>;
 
     struct Bins
     {
@@ -56,12 +58,14 @@ private:
     };
     static Bins CompletedBins(std::uint32_t i_Level, std::int64_t i_From, std::int64_t i_To, std::int64_t i_First,
                               std::int64_t i_End);
-    void GatherBin(std::uint32_t i_Level, std::int64_t i_Bin, std::size_t i_Component,
+    void GatherBin(std::size_t i_Place, std::int64_t i_Bin, std::size_t i_Component,
                    std::span<Accumulator> o_Accumulators) const;
     void BuildLevel(const VSampleRows& i_rRows, std::uint32_t i_Level, Bins i_Bins);
 
     std::size_t m_Components;
-    std::vector<Chunks> m_Levels; // as many as have records; m_Levels[0] stays empty
+    static std::size_t PlaceOf(std::uint32_t i_Level) { return (i_Level - FirstLevel) / 2; }
+
+    std::vector<Chunks> m_Levels; // the kept ones that have records
 };
 
 } // namespace Channels

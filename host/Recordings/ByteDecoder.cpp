@@ -68,12 +68,14 @@ float VaxReal(const std::byte* i_pBytes)
 }
 
 template <typename Convert>
-void DecodeEach(std::span<const std::byte> i_Bytes, std::size_t i_Stride, std::span<float> o_Values, Convert i_Convert)
+void DecodeGrid(const std::byte* i_pFirst, const WordGrid& i_rGrid, float* o_pValues, Convert i_Convert)
 {
-    const std::byte* pBytes = i_Bytes.data();
-    float* const pEnd = o_Values.data() + o_Values.size();
-    for (float* pValue = o_Values.data(); pValue != pEnd; ++pValue, pBytes += i_Stride)
-        *pValue = static_cast<float>(i_Convert(pBytes));
+    for (std::size_t row = 0; row < i_rGrid.Rows; ++row)
+    {
+        const std::byte* pBytes = i_pFirst + row * i_rGrid.RowBytes;
+        for (std::size_t column = 0; column < i_rGrid.Columns; ++column, pBytes += i_rGrid.ColumnBytes)
+            *o_pValues++ = static_cast<float>(i_Convert(pBytes));
+    }
 }
 
 std::int16_t AsSigned(std::uint16_t i_Word)
@@ -110,11 +112,11 @@ float VByteDecoder::Real(std::span<const std::byte> i_Bytes) const
     return IntelReal(i_Bytes.data());
 }
 
-void VByteDecoder::Decode(EWordKind i_Kind, std::span<const std::byte> i_Bytes, std::span<float> o_Values) const
+void VByteDecoder::Decode(EWordKind i_Kind, const std::byte* i_pFirst, const WordGrid& i_rGrid, float* o_pValues) const
 {
     const auto decodeEach = [&](auto i_Convert)
     {
-        DecodeEach(i_Bytes, BytesOf(i_Kind), o_Values, i_Convert);
+        DecodeGrid(i_pFirst, i_rGrid, o_pValues, i_Convert);
     };
     const bool bBig = m_Processor == EProcessor::Mips;
     if (i_Kind == EWordKind::Real && m_Processor == EProcessor::Dec)

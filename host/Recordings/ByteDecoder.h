@@ -31,6 +31,16 @@ constexpr std::size_t BytesOf(EWordKind i_Kind)
     return i_Kind == EWordKind::Real ? 4 : 2;
 }
 
+/// Words of a file that stand in rows, one word if not told otherwise: each row at the same distance from the one
+/// before, and so within the rows.
+struct WordGrid
+{
+    std::size_t Rows = 1;
+    std::size_t RowBytes = 0; ///< from row to row
+    std::size_t Columns = 1;
+    std::size_t ColumnBytes = 0; ///< from word to word in a row
+};
+
 /// Turns the bytes of a file into numbers as one processor wrote them. A value; any thread. Every span of bytes that is
 /// handed in must hold what is asked for: the callers check lengths where they check the structure of the file.
 class VByteDecoder
@@ -44,8 +54,8 @@ public:
     /// A real that the processor reserves as "no number" comes back as NaN.
     float Real(std::span<const std::byte> i_Bytes) const;
 
-    /// Decodes as many numbers as o_Values holds.
-    void Decode(EWordKind i_Kind, std::span<const std::byte> i_Bytes, std::span<float> o_Values) const;
+    /// Decodes the words of a grid, row by row, the first one at i_pFirst. o_pValues has room for all of them.
+    void Decode(EWordKind i_Kind, const std::byte* i_pFirst, const WordGrid& i_rGrid, float* o_pValues) const;
 
 private:
     EProcessor m_Processor;

@@ -13,12 +13,6 @@ namespace Recordings
 namespace
 {
 
-struct Calibration
-{
-    double Offset = 0.0;
-    double Scale = 1.0;
-};
-
 // Whether integers of the analog section, and the offsets with them, count from 0 to 65535. Files that do not say so
 // tell it by a 16-bit converter whose zero is the middle of that range.
 bool IsUnsigned(const VC3dParameters& i_rParameters, std::size_t i_Channels)
@@ -33,8 +27,8 @@ bool IsUnsigned(const VC3dParameters& i_rParameters, std::size_t i_Channels)
                        [](double i_Offset) { return i_Offset == 32767.0 || i_Offset == 32768.0; });
 }
 
-std::vector<Calibration> ReadCalibrations(const VC3dParameters& i_rParameters, std::size_t i_Channels,
-                                          EWordKind i_Integers, std::vector<std::string>& o_rWarnings)
+std::vector<C3dCalibration> ReadCalibrations(const VC3dParameters& i_rParameters, std::size_t i_Channels,
+                                             EWordKind i_Integers, std::vector<std::string>& o_rWarnings)
 {
     const double general = i_rParameters.Number("ANALOG", "GEN_SCALE").value_or(1.0);
     const std::vector<double> scales = i_rParameters.Numbers("ANALOG", "SCALE", i_Channels);
@@ -42,7 +36,7 @@ std::vector<Calibration> ReadCalibrations(const VC3dParameters& i_rParameters, s
     if (scales.size() < i_Channels)
         o_rWarnings.push_back("The file gives a scale for " + std::to_string(scales.size()) + " of " +
                               std::to_string(i_Channels) + " analog channels; the others are shown as stored.");
-    std::vector<Calibration> calibrations(i_Channels);
+    std::vector<C3dCalibration> calibrations(i_Channels);
     for (std::size_t i = 0; i < i_Channels; ++i)
     {
         calibrations[i].Scale = (i < scales.size() ? scales[i] : 1.0) * general;
@@ -62,7 +56,7 @@ RecordedChannel MakeAnalog(std::string i_Label, const C3dLayout& i_rLayout, cons
     channel.SamplePeriod =
         i_rRecording.FramePeriod % perFrame == 0 ? i_rRecording.FramePeriod / perFrame : PeriodOfRate(channel.Rate);
     channel.FirstTick = i_rRecording.Range.First;
-    channel.Samples.resize(i_rLayout.Frames * i_rLayout.AnalogSamplesPerFrame);
+    channel.Samples.reserve(i_rLayout.Frames * i_rLayout.AnalogSamplesPerFrame);
     return channel;
 }
 
@@ -81,35 +75,37 @@ void AddChannels(const C3dSource& i_rSource, VRecording& io_rRecording)
 
 } // namespace
 
-void AddC3dAnalog(const C3dSource& i_rSource, VRecording& io_rRecording)
+C3dAnalogRules AddC3dAnalog(const C3dSource& i_rSource, VRecording& io_rRecording)
+{
+    const std::size_t count = i_rSource.Layout.AnalogChannels;
+    if (count == 0 || i_rSource.Layout.AnalogSamplesPerFrame == 0)
+        return {};
+    AddChannels(i_rSource, io_rRecording);
+    const EWordKind integers = IsUnsigned(i_rSource.Parameters, count) ? EWordKind::Unsigned : EWordKind::Signed;
+    return {i_rSource.Layout.bReal ? EWordKind::Real : integers,
+            ReadCalibrations(i_rSource.Parameters, count, integers, io_rRecording.Warnings)};
+}
+
+void ReadC3dAnalog(const C3dSource& i_rSource, const C3dAnalogRules& i_rRules, const C3dFrames& i_rFrames,
+                   std::span<RecordedChannel> io_Channels, std::vector<float>& io_rScratch)
 {
     const C3dLayout& rLayout = i_rSource.Layout;
-    const std::size_t count = rLayout.AnalogChannels;
-    if (count == 0 || rLayout.AnalogSamplesPerFrame == 0)
-        return;
-    const std::size_t firstChannel = io_rRecording.Channels.size();
-    AddChannels(i_rSource, io_rRecording);
-
-    const EWordKind integers = IsUnsigned(i_rSource.Parameters, count) ? EWordKind::Unsigned : EWordKind::Signed;
-    const EWordKind kind = rLayout.bReal ? EWordKind::Real : integers;
-    const std::vector<Calibration> calibrations =
-        ReadCalibrations(i_rSource.Parameters, count, integers, io_rRecording.Warnings);
-    std::vector<float*> samples; // of each channel
-    for (std::size_t i = 0; i < count; ++i)
-        samples.push_back(io_rRecording.Channels[firstChannel + i].Samples.data());
-    std::vector<float> words(count * rLayout.AnalogSamplesPerFrame);
-    for (std::size_t frame = 0; frame < rLayout.Frames; ++frame)
+    const std::size_t samples = i_rFrames.Count * rLayout.AnalogSamplesPerFrame;
+    const WordGrid grid{i_rFrames.Count, rLayout.FrameBytes(), rLayout.AnalogSamplesPerFrame,
+                        rLayout.AnalogChannels * rLayout.WordBytes()};
+    io_rScratch.resize(std::max(io_rScratch.size(), samples));
+    const std::span<float> values(io_rScratch.data(), samples);
+    const std::byte* pChannel = i_rSource.File.data() + rLayout.DataOffset + i_rFrames.First * rLayout.FrameBytes() +
+                                rLayout.Points * 4 * rLayout.WordBytes();
+    const C3dCalibration* pCalibration = i_rRules.Calibrations.data();
+    for (RecordedChannel& rChannel : io_Channels)
     {
-        const std::size_t place =
-            rLayout.DataOffset + frame * rLayout.FrameBytes() + rLayout.Points * 4 * rLayout.WordBytes();
-        i_rSource.Header.Decoder.Decode(kind, i_rSource.File.subspan(place, words.size() * rLayout.WordBytes()), words);
-        for (std::size_t i = 0; i < words.size(); ++i)
-        {
-            const std::size_t channel = i % count;
-            const double raw = static_cast<double>(words[i]);
-            const double value = (raw - calibrations[channel].Offset) * calibrations[channel].Scale;
-            *samples[channel]++ = static_cast<float>(value);
-        }
+        i_rSource.Header.Decoder.Decode(i_rRules.Kind, pChannel, grid, values.data());
+        const C3dCalibration calibration = *pCalibration++;
+        for (float& rValue : values)
+            rValue = static_cast<float>((static_cast<double>(rValue) - calibration.Offset) * calibration.Scale);
+        rChannel.Samples.insert(rChannel.Samples.end(), values.begin(), values.end());
+        pChannel += rLayout.WordBytes();
     }
 }
 

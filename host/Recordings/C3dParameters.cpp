@@ -169,7 +169,7 @@ std::vector<double> VC3dParameters::Numbers(std::string_view i_Group, std::strin
             const auto data = pParameter->Data.subspan(place);
             float value = std::to_integer<std::uint8_t>(data[0]);
             if (pParameter->Type != 1)
-                m_Decoder.Decode(pParameter->Type == 4 ? EWordKind::Real : i_Integers, data, {&value, 1});
+                m_Decoder.Decode(pParameter->Type == 4 ? EWordKind::Real : i_Integers, data.data(), WordGrid(), &value);
             numbers.push_back(static_cast<double>(value));
         }
     }

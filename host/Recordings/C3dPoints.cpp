@@ -27,7 +27,7 @@ bool IsMissing(float i_FourthWord)
     return i_FourthWord >= 32768.0f && i_FourthWord < 65536.0f;
 }
 
-void WritePoint(const float* i_pWords, double i_Scale, float* o_pSample)
+void ConvertPoint(const float* i_pWords, double i_Scale, float* o_pSample)
 {
     if (IsMissing(i_pWords[3]))
     {
@@ -48,7 +48,7 @@ RecordedChannel MakeMarker(std::string i_Label, const C3dLayout& i_rLayout, cons
     channel.Rate = i_rLayout.Rate;
     channel.SamplePeriod = i_rRecording.FramePeriod;
     channel.FirstTick = i_rRecording.Range.First;
-    channel.Samples.resize(i_rLayout.Frames * ComponentsPerPoint);
+    channel.Samples.reserve(i_rLayout.Frames * ComponentsPerPoint);
     return channel;
 }
 
@@ -57,7 +57,6 @@ RecordedChannel MakeMarker(std::string i_Label, const C3dLayout& i_rLayout, cons
 void AddC3dPoints(const C3dSource& i_rSource, VRecording& io_rRecording)
 {
     const C3dLayout& rLayout = i_rSource.Layout;
-    const std::size_t firstChannel = io_rRecording.Channels.size();
     const std::string units = i_rSource.Parameters.Text("POINT", "UNITS");
     for (std::string& rLabel :
          UniqueLabels(i_rSource.Parameters.Texts("POINT", "LABELS", rLayout.Points), rLayout.Points, "Point"))
@@ -65,25 +64,27 @@ void AddC3dPoints(const C3dSource& i_rSource, VRecording& io_rRecording)
         io_rRecording.Channels.push_back(MakeMarker(std::move(rLabel), rLayout, io_rRecording));
         io_rRecording.Channels.back().Units = units;
     }
+}
 
-    std::vector<float*> samples; // of each point
-    for (std::size_t point = 0; point < rLayout.Points; ++point)
-        samples.push_back(io_rRecording.Channels[firstChannel + point].Samples.data());
+void ReadC3dPoints(const C3dSource& i_rSource, const C3dFrames& i_rFrames, std::span<RecordedChannel> io_Channels,
+                   std::vector<float>& io_rScratch)
+{
+    const C3dLayout& rLayout = i_rSource.Layout;
     const EWordKind kind = rLayout.bReal ? EWordKind::Real : EWordKind::Signed;
     const double scale = rLayout.bReal ? 1.0 : rLayout.PointScale;
-    std::vector<float> words(rLayout.Points * WordsPerPoint);
-    for (std::size_t frame = 0; frame < rLayout.Frames; ++frame)
+    const WordGrid grid{i_rFrames.Count, rLayout.FrameBytes(), WordsPerPoint, rLayout.WordBytes()};
+    io_rScratch.resize(std::max(io_rScratch.size(), i_rFrames.Count * WordsPerPoint));
+    const std::byte* pPoint = i_rSource.File.data() + rLayout.DataOffset + i_rFrames.First * rLayout.FrameBytes();
+    for (RecordedChannel& rChannel : io_Channels)
     {
-        const auto bytes = i_rSource.File.subspan(rLayout.DataOffset + frame * rLayout.FrameBytes(),
-                                                  words.size() * rLayout.WordBytes());
-        i_rSource.Header.Decoder.Decode(kind, bytes, words);
-        const float* pWords = words.data();
-        for (float*& rpSample : samples)
-        {
-            WritePoint(pWords, scale, rpSample);
-            pWords += WordsPerPoint;
-            rpSample += ComponentsPerPoint;
-        }
+        i_rSource.Header.Decoder.Decode(kind, pPoint, grid, io_rScratch.data());
+        // In place: a sample never overtakes the words that follow.
+        for (std::size_t i = 0; i < i_rFrames.Count; ++i)
+            ConvertPoint(io_rScratch.data() + i * WordsPerPoint, scale, io_rScratch.data() + i * ComponentsPerPoint);
+        const auto first = io_rScratch.begin();
+        rChannel.Samples.insert(rChannel.Samples.end(), first,
+                                first + static_cast<std::ptrdiff_t>(i_rFrames.Count * ComponentsPerPoint));
+        pPoint += WordsPerPoint * rLayout.WordBytes();
     }
 }
 

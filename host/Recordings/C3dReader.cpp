@@ -4,8 +4,9 @@
 #include "Recordings/C3dLayout.h"
 #include "Recordings/C3dParameters.h"
 #include "Recordings/C3dSamples.h"
-#include "Recordings/FileBytes.h"
+#include "Recordings/VReadProgress.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <new>
 #include <string>
@@ -47,7 +48,31 @@ TQL::IResult CheckDamage(const C3dSource& i_rSource, std::vector<std::string>& o
     return TQL::Result::Ok;
 }
 
-TQL::IResult ReadAll(std::span<const std::byte> i_File, VRecording& o_rRecording, std::string& o_rError)
+/// Reads all channels by the block of frames, so that a block is still in the cache when its last channel is read.
+/// False when told to stop.
+bool ReadChannels(const C3dSource& i_rSource, VReadProgress* i_pProgress, VRecording& io_rRecording)
+{
+    constexpr std::size_t blockBytes = 128 << 10;
+    const C3dLayout& rLayout = i_rSource.Layout;
+    AddC3dPoints(i_rSource, io_rRecording);
+    const C3dAnalogRules analog = AddC3dAnalog(i_rSource, io_rRecording);
+    const std::span<RecordedChannel> channels(io_rRecording.Channels);
+    const std::size_t blockFrames =
+        std::max<std::size_t>(1, blockBytes / std::max<std::size_t>(1, rLayout.FrameBytes()));
+    std::vector<float> scratch;
+    for (std::size_t frame = 0; frame < rLayout.Frames; frame += blockFrames)
+    {
+        if (!TellProgress(i_pProgress, frame, rLayout.Frames))
+            return false;
+        const C3dFrames frames{frame, std::min(blockFrames, rLayout.Frames - frame)};
+        ReadC3dPoints(i_rSource, frames, channels.first(rLayout.Points), scratch);
+        ReadC3dAnalog(i_rSource, analog, frames, channels.subspan(rLayout.Points), scratch);
+    }
+    return TellProgress(i_pProgress, rLayout.Frames, rLayout.Frames);
+}
+
+TQL::IResult ReadAll(std::span<const std::byte> i_File, VReadProgress* i_pProgress, VRecording& o_rRecording,
+                     std::string& o_rError)
 {
     VRecording recording;
     recording.Format = "C3D";
@@ -69,8 +94,8 @@ TQL::IResult ReadAll(std::span<const std::byte> i_File, VRecording& o_rRecording
     recording.FramePeriod = PeriodOfRate(layout.Rate);
     recording.Range.First = (layout.FirstFrame - 1) * recording.FramePeriod;
     recording.Range.Last = recording.Range.First + static_cast<std::int64_t>(layout.Frames) * recording.FramePeriod;
-    AddC3dPoints(source, recording);
-    AddC3dAnalog(source, recording);
+    if (!ReadChannels(source, i_pProgress, recording))
+        return StoppedReading(o_rError);
     AddC3dEvents(source, recording);
     o_rRecording = std::move(recording);
     return TQL::Result::Ok;
@@ -85,34 +110,18 @@ bool LooksLikeC3d(std::span<const std::byte> i_File)
     return ReadC3dHeader(i_File, header, error).IsSuccess();
 }
 
-TQL::IResult ReadC3d(std::span<const std::byte> i_File, VRecording& o_rRecording, std::string& o_rError)
+TQL::IResult ReadC3d(std::span<const std::byte> i_File, const ReadOptions& i_rOptions, VRecording& o_rRecording,
+                     std::string& o_rError)
 {
     try
     {
-        return ReadAll(i_File, o_rRecording, o_rError);
+        return ReadAll(i_File, i_rOptions.pProgress, o_rRecording, o_rError);
     }
     catch (const std::bad_alloc&)
     {
         o_rError = "the recording does not fit into memory. Close other programs or choose a shorter one.";
         return TQL::Result::AllocationFailure;
     }
-}
-
-TQL::IResult OpenC3d(const std::filesystem::path& i_rPath, VRecording& o_rRecording, std::string& o_rError)
-{
-    std::vector<std::byte> bytes;
-    VRecording recording;
-    TQL::IResult result = ReadFileBytes(i_rPath, bytes, o_rError);
-    if (result.IsSuccess())
-        result = ReadC3d(bytes, recording, o_rError);
-    if (result.IsError())
-    {
-        o_rError = FileMessage(i_rPath, o_rError);
-        return result;
-    }
-    recording.Name = i_rPath.stem().string();
-    o_rRecording = std::move(recording);
-    return result;
 }
 
 } // namespace Recordings

@@ -1,10 +1,10 @@
 #pragma once
 
+#include "Recordings/ReadOptions.h"
 #include "Recordings/VRecording.h"
 #include "TQL/IResult.h"
 
 #include <cstddef>
-#include <filesystem>
 #include <span>
 #include <string>
 
@@ -16,11 +16,9 @@ namespace Recordings
 /// A file that is cut short gives the whole frames that are there and a warning. A file that cannot be understood gives
 /// an error, one sentence in o_rError that says what is wrong and what to do, and leaves o_rRecording untouched.
 /// Any thread. Memory stays in proportion to the size of the file, whatever the file claims.
-[[nodiscard]] TQL::IResult OpenC3d(const std::filesystem::path& i_rPath, VRecording& o_rRecording,
-                                   std::string& o_rError);
-
-/// The same for a file that is in memory already. The recording's name stays empty; o_rError does not name the file.
-[[nodiscard]] TQL::IResult ReadC3d(std::span<const std::byte> i_File, VRecording& o_rRecording, std::string& o_rError);
+/// The recording's name stays empty; o_rError does not name the file. The options' progress is heeded.
+[[nodiscard]] TQL::IResult ReadC3d(std::span<const std::byte> i_File, const ReadOptions& i_rOptions,
+                                   VRecording& o_rRecording, std::string& o_rError);
 
 /// Whether the content is that of a C3D file: its mark, and a known processor where the header points to.
 bool LooksLikeC3d(std::span<const std::byte> i_File);

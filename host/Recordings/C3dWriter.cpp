@@ -3,7 +3,7 @@
 #include "Recordings/C3dHeader.h"
 #include "Recordings/C3dParameterWriter.h"
 #include "Recordings/C3dWritePlan.h"
-#include "Recordings/FileBytes.h"
+#include "Recordings/FileMessage.h"
 #include "Recordings/VFileReplacement.h"
 
 #include <algorithm>

@@ -1,6 +1,6 @@
 #include "Recordings/CsvExport.h"
 
-#include "Recordings/FileBytes.h"
+#include "Recordings/FileMessage.h"
 #include "Recordings/NamePattern.h"
 #include "Recordings/VFileReplacement.h"
 #include "TQL/ITick.h"

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Recordings/ReadOptions.h"
 #include "Recordings/VRecording.h"
 #include "TQL/IResult.h"
 
@@ -9,10 +10,13 @@
 namespace Recordings
 {
 
-/// Reads a motion file of any kind that is known here. The kind is told by the content first, then by the ending of the
-/// name. On failure o_rError is one line that names the file, says what is wrong and what to do, and o_rRecording is
-/// untouched. What a reader had to guess or leave out stands in the recording's warnings. Any thread.
+/// Reads a motion file of any kind that is known here: C3D, BVH, TRC, MOT, STO, CSV. The kind is told by the content
+/// first, then by the ending of the name; text with rows of numbers and an unknown ending is read as CSV. On failure
+/// o_rError is one line that names the file, says what is wrong and what to do, and o_rRecording is untouched. What a
+/// reader had to guess or leave out stands in the recording's warnings. The options' progress is told how far it is;
+/// when it says stop the result is Canceled. Beside the samples it needs little memory: large files are mapped. Any
+/// thread.
 [[nodiscard]] TQL::IResult OpenRecording(const std::filesystem::path& i_rPath, VRecording& o_rRecording,
-                                         std::string& o_rError);
+                                         std::string& o_rError, const ReadOptions& i_rOptions = {});
 
 } // namespace Recordings

@@ -1,6 +1,6 @@
 #include "Recordings/VFileReplacement.h"
 
-#include "Recordings/FileBytes.h"
+#include "Recordings/FileMessage.h"
 
 #include <cerrno>
 #include <system_error>

@@ -21,7 +21,7 @@ public:
     TQL::IResult CreateGlobalChannels(std::string_view i_Type, std::string_view i_Context,
                                       std::vector<std::shared_ptr<TQL::IChannel>>& o_rChannels) override; ///< NotFound
     bool CanComputeMagnitude(std::string_view i_Context, std::string_view i_Type) const override;
-    std::shared_ptr<TQL::IChangeSignal> TypeListChanged() const override { return m_pTypeListChanged; }
+    std::shared_ptr<TQL::IChangeSignal> TypeListChanged() const override;
 
 private:
     const ThreadCheckPointer m_pCheck;

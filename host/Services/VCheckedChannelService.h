@@ -1,18 +1,22 @@
 #pragma once
 
 #include "ChannelSystem/IChannelService.h"
+#include "Services/VCheckedChannels.h"
 #include "Services/VThreadCheck.h"
+
+#include <memory>
 
 namespace Services
 {
 
-/// Hands every operation on to the host's channel service and notes those that belong to the UI thread and were called
-/// on another one: all but GetChannel, GetSubTypeTable, and CreateDerivedChannel of "Cache". What a plug-in gets from a
-/// checking host.
+/// Hands every operation on to the host's channel service, notes those that were called on a thread that may not, and
+/// gives out checked channels. What a plug-in gets from a checking host. It works before any channel service. UI thread
+/// but for the operations that any thread may call.
 class VCheckedChannelService : public ChannelSystem::IChannelService
 {
 public:
-    VCheckedChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService, ThreadCheckPointer i_pCheck);
+    VCheckedChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService, ThreadCheckPointer i_pCheck,
+                           std::shared_ptr<VCheckedChannels> i_pChannels);
 
     std::shared_ptr<ChannelSystem::IChannelContext> GetContextByName(std::string_view i_Name) const override;
     std::shared_ptr<TQL::IChangeSignal> ContextListChanged() const override;
@@ -29,6 +33,7 @@ public:
 private:
     const std::shared_ptr<ChannelSystem::IChannelService> m_pService;
     const ThreadCheckPointer m_pCheck;
+    const std::shared_ptr<VCheckedChannels> m_pChannels;
 };
 
 } // namespace Services

@@ -24,7 +24,7 @@ VContentRegistry::VContentRegistry(ThreadCheckPointer i_pCheck)
 void VContentRegistry::RegisterContent(const std::string& i_rName,
                                        std::shared_ptr<OrvanePluginInterface::IWorkspaceContentFactory> i_pFactory)
 {
-    CheckUiThread(m_pCheck, "IWorkspaceContentRegistry::RegisterContent");
+    CheckThread(m_pCheck, "IWorkspaceContentRegistry::RegisterContent");
     if (!i_pFactory)
     {
         Warn("The content \"%1%\" was registered without a factory", i_rName);
@@ -38,7 +38,7 @@ void VContentRegistry::RegisterContent(const std::string& i_rName,
 
 void VContentRegistry::UnregisterContent(const std::string& i_rName)
 {
-    CheckUiThread(m_pCheck, "IWorkspaceContentRegistry::UnregisterContent");
+    CheckThread(m_pCheck, "IWorkspaceContentRegistry::UnregisterContent");
     if (m_Factories.erase(i_rName) != 0)
         m_pChanged->Invoke();
 }

@@ -16,13 +16,13 @@ VFileLocationService::VFileLocationService(std::string i_BaseDirectory, ThreadCh
 
 std::string VFileLocationService::GetExtension(int i_Kind) const
 {
-    CheckUiThread(m_pCheck, "IFileLocationService::GetExtension");
+    CheckThread(m_pCheck, "IFileLocationService::GetExtension");
     return i_Kind == KindGraphFile ? ".graphplot" : "";
 }
 
 std::vector<std::string> VFileLocationService::GetUserDirectories(int i_Kind) const
 {
-    CheckUiThread(m_pCheck, "IFileLocationService::GetUserDirectories");
+    CheckThread(m_pCheck, "IFileLocationService::GetUserDirectories");
     if (i_Kind != KindGraphFile)
         return {};
     const QString folder = QDir(QString::fromStdString(m_BaseDirectory)).filePath(QStringLiteral("Graphs"));

@@ -10,13 +10,13 @@ VHostProfile::VHostProfile(std::uint64_t i_Word, ThreadCheckPointer i_pCheck)
 
 std::uint64_t VHostProfile::GetProfileWord() const
 {
-    CheckUiThread(m_pCheck, "IHostProfile::GetProfileWord");
+    CheckThread(m_pCheck, "IHostProfile::GetProfileWord");
     return m_Word;
 }
 
 void VHostProfile::GetProfileService(std::shared_ptr<OrvanePluginInterface::IOpaqueService>& o_rpService) const
 {
-    CheckUiThread(m_pCheck, "IHostProfile::GetProfileService");
+    CheckThread(m_pCheck, "IHostProfile::GetProfileService");
     o_rpService = nullptr;
 }
 

@@ -1,18 +1,22 @@
 #include "Services/VHostServices.h"
 
 #include "ChannelSystem/IChannelContext.h"
+#include "ChannelSystem/IChannelSelectionManager.h"
 #include "CoreGraphics/Resources.h"
 #include "Services/VChannelTypeRegistry.h"
 #include "Services/VCheckedChannelService.h"
+#include "Services/VCheckedPostalService.h"
 #include "Services/VContentRegistry.h"
 #include "Services/VFaultList.h"
 #include "Services/VFileLocationService.h"
 #include "Services/VHostProfile.h"
 #include "Services/VHostSubscriptions.h"
 #include "Services/VPlaybackDriver.h"
+#include "Services/VPreferencesStore.h"
 #include "Services/VQmlEngineHost.h"
 #include "Services/VQuickWidgetPersistence.h"
 #include "Services/VSelectionSource.h"
+#include "Services/VServiceLoans.h"
 #include "Services/VSubscriptionAudit.h"
 #include "Services/VTimeController.h"
 #include "Services/VTimeControllerRegistry.h"
@@ -21,8 +25,12 @@
 #include "TQL/Log.h"
 
 #include <QtCore/QCoreApplication>
+#include <QtCore/QDir>
 #include <QtCore/QEvent>
+#include <QtCore/QStandardPaths>
 
+#include <algorithm>
+#include <iterator>
 #include <stdexcept>
 
 namespace Services
@@ -30,13 +38,30 @@ namespace Services
 
 using namespace OrvanePluginInterface;
 
+namespace
+{
+
+/// A host that checks leaves the operator's own file alone.
+std::string PreferencesPath(const HostOptions& i_rOptions)
+{
+    if (i_rOptions.UserDirectory.empty() && i_rOptions.bChecking)
+        return {};
+    const QString folder = i_rOptions.UserDirectory.empty()
+                               ? QStandardPaths::writableLocation(QStandardPaths::AppConfigLocation)
+                               : QString::fromStdString(i_rOptions.UserDirectory);
+    return QDir(folder).filePath(QStringLiteral("preferences.json")).toStdString();
+}
+
+} // namespace
+
 /// In the order of making; the postal services go last.
 struct VHostServices::Parts
 {
     explicit Parts(const HostOptions& i_rOptions)
         : pFaults(std::make_shared<VFaultList>(i_rOptions.bChecking))
-        , pCheck(std::make_shared<const VThreadCheck>(pFaults))
+        , pCheck(i_rOptions.bChecking ? std::make_shared<const VThreadCheck>(pFaults) : nullptr)
         , pWorker(std::make_shared<VWorkerPostalService>(i_rOptions.WorkerThreads))
+        , pPreferences(TQL::MakeShared<VPreferencesStore>(PreferencesPath(i_rOptions), pUi))
         , pFileLocations(std::make_shared<VFileLocationService>(i_rOptions.UserDirectory, pCheck))
         , pTimeController(std::make_shared<VTimeController>(pUi, pCheck))
         , pPlaybackDriver(std::make_unique<VPlaybackDriver>(pTimeController, pUi))
@@ -48,15 +73,31 @@ struct VHostServices::Parts
         , pEngineHost(std::make_shared<VQmlEngineHost>(pCheck))
         , pResources(std::make_shared<CoreGraphics::Resources>(i_rOptions.bDevelopmentBuild))
         , pPersistence(std::make_shared<VQuickWidgetPersistence>(pCheck))
+        , Loans(i_rOptions.bChecking)
     {
         pTimeRegistry->Add(VTimeControllerRegistry::DefaultName, pTimeController);
+        if (!i_rOptions.bChecking)
+            return;
+        pGivenUi = std::make_shared<VCheckedPostalService>(pUi);
+        pGivenWorker = std::make_shared<VCheckedAsioPostalService>(pWorker);
+    }
+
+    /// What a getter does.
+    template <typename TGiven, typename TService>
+    void Give(const HostOperation& i_rGetter, const std::shared_ptr<TService>& i_rpService,
+              std::shared_ptr<TGiven>& o_rpService)
+    {
+        CheckThread(pCheck, i_rGetter);
+        o_rpService = Loans.Lend(i_rGetter.pName, i_rpService);
     }
 
     const std::shared_ptr<VFaultList> pFaults;
-    const ThreadCheckPointer pCheck;
+    const ThreadCheckPointer pCheck;                                          ///< null without checking
+    const std::shared_ptr<VUseLedger> pUses = std::make_shared<VUseLedger>(); ///< of the channels
     const std::shared_ptr<VHostSubscriptionLedger> pLedger = std::make_shared<VHostSubscriptionLedger>();
     const std::shared_ptr<VUiPostalService> pUi = std::make_shared<VUiPostalService>();
     const std::shared_ptr<VWorkerPostalService> pWorker;
+    const std::shared_ptr<VPreferencesStore> pPreferences;
     const std::shared_ptr<VFileLocationService> pFileLocations;
     const std::shared_ptr<VTimeController> pTimeController;
     const std::unique_ptr<VPlaybackDriver> pPlaybackDriver;
@@ -69,7 +110,12 @@ struct VHostServices::Parts
     const std::shared_ptr<CoreGraphics::Resources> pResources;
     const std::shared_ptr<VQuickWidgetPersistence> pPersistence;
     std::shared_ptr<ChannelSystem::IChannelService> pChannels;
-    std::shared_ptr<ChannelSystem::IChannelService> pGivenChannels; ///< what plug-ins get: checked when checking
+
+    // What plug-ins get: checked when checking.
+    std::shared_ptr<TQL::IPostalService> pGivenUi = pUi;
+    std::shared_ptr<TQL::IAsioPostalService> pGivenWorker = pWorker;
+    std::shared_ptr<ChannelSystem::IChannelService> pGivenChannels;
+    VServiceLoans Loans;
 };
 
 VHostServices::VHostServices(HostOptions i_Options)
@@ -88,120 +134,104 @@ VHostServices::~VHostServices()
     m_pParts->pUi->Close();
 }
 
-void VHostServices::Check(const char* i_pOperation) const
-{
-    m_pParts->pCheck->CheckUiThread(i_pOperation);
-}
-
 void VHostServices::SetChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService)
 {
     m_pParts->pChannels = i_pService;
     if (i_pService && m_Options.bChecking)
-        i_pService = std::make_shared<VCheckedChannelService>(std::move(i_pService), m_pParts->pCheck);
+        i_pService = std::make_shared<VCheckedChannelService>(
+            std::move(i_pService), m_pParts->pCheck,
+            std::make_shared<VCheckedChannels>(m_pParts->pUses, m_pParts->pFaults));
     m_pParts->pGivenChannels = std::move(i_pService);
 }
 
 void VHostServices::GetFileLocationService(std::shared_ptr<IFileLocationService>& o_rpService)
 {
-    Check("IHostCoreServices::GetFileLocationService");
-    o_rpService = m_pParts->pFileLocations;
+    m_pParts->Give("IHostCoreServices::GetFileLocationService", m_pParts->pFileLocations, o_rpService);
 }
 
 void VHostServices::GetPreferencesStore(std::shared_ptr<TQL::IStore>& o_rpStore)
 {
-    Check("IHostCoreServices::GetPreferencesStore");
-    o_rpStore = nullptr;
+    m_pParts->Give("IHostCoreServices::GetPreferencesStore", m_pParts->pPreferences->GetStore(), o_rpStore);
 }
 
 void VHostServices::GetFourthFactoryService(std::shared_ptr<TQL::IChannelTypeRegistry>& o_rpService)
 {
-    Check("IHostCoreServices::GetFourthFactoryService");
-    o_rpService = m_pParts->pTypes;
+    m_pParts->Give("IHostCoreServices::GetFourthFactoryService", m_pParts->pTypes, o_rpService);
 }
 
 void VHostServices::GetFifthFactoryService(std::shared_ptr<IChannelMigrationService>& o_rpService)
 {
-    Check("IHostCoreServices::GetFifthFactoryService");
+    CheckThread(m_pParts->pCheck, "IHostCoreServices::GetFifthFactoryService");
     o_rpService = nullptr;
 }
 
 void VHostServices::GetSixthFactoryService(std::shared_ptr<TQL::ISelectionSource>& o_rpService)
 {
-    Check("IHostCoreServices::GetSixthFactoryService");
-    o_rpService = m_pParts->pSelection;
+    m_pParts->Give("IHostCoreServices::GetSixthFactoryService", m_pParts->pSelection, o_rpService);
 }
 
 void VHostServices::GetUiPostalService(std::shared_ptr<TQL::IPostalService>& o_rpService)
 {
-    Check("IHostCoreServices::GetUiPostalService");
-    o_rpService = m_pParts->pUi;
+    m_pParts->Give("IHostCoreServices::GetUiPostalService", m_pParts->pGivenUi, o_rpService);
 }
 
 void VHostServices::GetWorkerPostalService(std::shared_ptr<TQL::IAsioPostalService>& o_rpService)
 {
-    Check("IHostCoreServices::GetWorkerPostalService");
-    o_rpService = m_pParts->pWorker;
+    m_pParts->Give("IHostCoreServices::GetWorkerPostalService", m_pParts->pGivenWorker, o_rpService);
 }
 
 void VHostServices::GetTimeControllerRegistry(std::shared_ptr<ITimeControllerRegistry>& o_rpService)
 {
-    Check("IHostCoreServices::GetTimeControllerRegistry");
-    o_rpService = m_pParts->pTimeRegistry;
+    m_pParts->Give("IHostCoreServices::GetTimeControllerRegistry", m_pParts->pTimeRegistry, o_rpService);
 }
 
 void VHostServices::GetHostProfile(std::shared_ptr<IHostProfile>& o_rpService)
 {
-    Check("IHostCoreServices::GetHostProfile");
-    o_rpService = m_pParts->pProfile;
+    m_pParts->Give("IHostCoreServices::GetHostProfile", m_pParts->pProfile, o_rpService);
 }
 
 bool VHostServices::HasChannelBrowser()
 {
-    Check("IHostCoreServices::HasChannelBrowser");
+    CheckThread(m_pParts->pCheck, "IHostCoreServices::HasChannelBrowser");
     return m_Options.bHasChannelBrowser;
 }
 
 void VHostServices::GetChannelService(std::shared_ptr<ChannelSystem::IChannelService>& o_rpService)
 {
-    Check("IHostCoreServices::GetChannelService");
-    if (!m_pParts->pGivenChannels)
+    m_pParts->Give("IHostCoreServices::GetChannelService", m_pParts->pGivenChannels, o_rpService);
+    if (!o_rpService)
         throw std::runtime_error("the host has no channel service");
-    o_rpService = m_pParts->pGivenChannels;
 }
 
 bool VHostServices::IsDevelopmentBuild()
 {
-    Check("IHostUiServices::IsDevelopmentBuild");
+    CheckThread(m_pParts->pCheck, "IHostUiServices::IsDevelopmentBuild");
     return m_Options.bDevelopmentBuild;
 }
 
 void VHostServices::GetQmlEngineHost(std::shared_ptr<IQmlEngineHost>& o_rpService)
 {
-    Check("IHostUiServices::GetQmlEngineHost");
-    o_rpService = m_pParts->pEngineHost;
+    m_pParts->Give("IHostUiServices::GetQmlEngineHost", m_pParts->pEngineHost, o_rpService);
 }
 
 void VHostServices::GetContentRegistry(std::shared_ptr<IWorkspaceContentRegistry>& o_rpService)
 {
-    Check("IHostUiServices::GetContentRegistry");
-    o_rpService = m_pParts->pContents;
+    m_pParts->Give("IHostUiServices::GetContentRegistry", m_pParts->pContents, o_rpService);
 }
 
 void VHostServices::GetResources(std::shared_ptr<CoreGraphics::Resources>& o_rpService)
 {
-    Check("IHostUiServices::GetResources");
-    o_rpService = m_pParts->pResources;
+    m_pParts->Give("IHostUiServices::GetResources", m_pParts->pResources, o_rpService);
 }
 
 void VHostServices::GetQuickWidgetPersistence(std::shared_ptr<IQuickWidgetPersistence>& o_rpService)
 {
-    Check("IHostUiServices::GetQuickWidgetPersistence");
-    o_rpService = m_pParts->pPersistence;
+    m_pParts->Give("IHostUiServices::GetQuickWidgetPersistence", m_pParts->pPersistence, o_rpService);
 }
 
 void VHostServices::GetLastFactoryService(std::shared_ptr<IOpaqueService>& o_rpService)
 {
-    Check("IHostUiServices::GetLastFactoryService");
+    CheckThread(m_pParts->pCheck, "IHostUiServices::GetLastFactoryService");
     o_rpService = nullptr;
 }
 
@@ -233,6 +263,16 @@ const std::shared_ptr<VContentRegistry>& VHostServices::Contents() const
 const std::shared_ptr<VQmlEngineHost>& VHostServices::EngineHost() const
 {
     return m_pParts->pEngineHost;
+}
+
+const std::shared_ptr<CoreGraphics::Resources>& VHostServices::Graphics() const
+{
+    return m_pParts->pResources;
+}
+
+const std::shared_ptr<TQL::IStore>& VHostServices::Preferences() const
+{
+    return m_pParts->pPreferences->GetStore();
 }
 
 const std::shared_ptr<ChannelSystem::IChannelService>& VHostServices::Channels() const
@@ -267,6 +307,8 @@ void VHostServices::WatchSignals(VSubscriptionAudit& o_rAudit) const
     {
         o_rAudit.Watch("IChannelService::ContextListChanged", rpChannels->ContextListChanged());
         o_rAudit.Watch("IChannelService::TypeListChanged", rpChannels->TypeListChanged());
+        if (const auto pManager = rpChannels->GetSelectionManager())
+            o_rAudit.Watch("IChannelSelectionManager::SelectionChanged", pManager->SelectionChanged());
     }
     rController.GetSourceMap()->ForEach(
         [&](const std::string& i_rName, const std::shared_ptr<ITimeSource>& i_rpSource)
@@ -278,21 +320,28 @@ void VHostServices::WatchSignals(VSubscriptionAudit& o_rAudit) const
         });
 }
 
-bool VHostServices::DrainPosts()
+std::vector<std::string> VHostServices::FindInUse() const
+{
+    std::vector<std::string> texts = m_pParts->pUses->InUse();
+    std::ranges::move(m_pParts->Loans.StillHeld(), std::back_inserter(texts));
+    return texts;
+}
+
+bool VHostServices::DrainPosts(std::chrono::milliseconds i_Patience)
 {
     // Each kind of queue may feed the others, so rounds are made until one finds nothing to run.
     constexpr int roundLimit = 100;
     VUiPostalService& rUi = *m_pParts->pUi;
     for (int round = 0; round < roundLimit; ++round)
     {
-        if (!m_pParts->pWorker->Drain())
+        if (!m_pParts->pWorker->Drain(i_Patience))
             return false;
         const std::uint64_t before = rUi.JobsRun();
         rUi.Drain();
         QCoreApplication::sendPostedEvents();
         QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
         if (rUi.JobsRun() == before && rUi.Pending() == 0)
-            return m_pParts->pWorker->Drain();
+            return m_pParts->pWorker->Drain(i_Patience);
     }
     return false;
 }

@@ -4,6 +4,7 @@
 #include "OrvanePluginInterface/IHostUiServices.h"
 #include "Services/VThreadCheck.h"
 
+#include <chrono>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -28,12 +29,13 @@ class VWorkerPostalService;
 /// What a host program chooses.
 struct HostOptions
 {
-    bool bChecking = false;         ///< strict: threads, life cycle and subscriptions of plug-ins are watched
+    bool bChecking = false;         ///< strict: what plug-ins call, hold and leave is watched
     bool bDevelopmentBuild = false; ///< import paths and shader folders of a build tree are honoured
     bool bHasChannelBrowser = false;
     std::uint64_t ProfileWord = 0;
     std::size_t WorkerThreads = 2;
-    std::string UserDirectory; ///< UTF-8; empty: the folder for application data of the desktop
+    std::chrono::milliseconds Patience{5000}; ///< how long jobs of a plug-in that has ended may go on
+    std::string UserDirectory; ///< UTF-8; empty: the desktop's folders, where a host that checks saves no preferences
 };
 
 /// Everything that a plug-in can ask of the host, made and owned here; the channel service comes from outside. Made on
@@ -51,7 +53,7 @@ public:
     void SetChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService);
 
     void GetFileLocationService(std::shared_ptr<OrvanePluginInterface::IFileLocationService>& o_rpService) override;
-    void GetPreferencesStore(std::shared_ptr<TQL::IStore>& o_rpStore) override; ///< null: none so far
+    void GetPreferencesStore(std::shared_ptr<TQL::IStore>& o_rpStore) override;
     void GetFourthFactoryService(std::shared_ptr<TQL::IChannelTypeRegistry>& o_rpService) override;
     void GetFifthFactoryService(
         std::shared_ptr<OrvanePluginInterface::IChannelMigrationService>& o_rpService) override; ///< null
@@ -80,6 +82,8 @@ public:
     const std::shared_ptr<VSelectionSource>& Selection() const;
     const std::shared_ptr<VContentRegistry>& Contents() const;
     const std::shared_ptr<VQmlEngineHost>& EngineHost() const;
+    const std::shared_ptr<CoreGraphics::Resources>& Graphics() const;
+    const std::shared_ptr<TQL::IStore>& Preferences() const;
     const std::shared_ptr<ChannelSystem::IChannelService>& Channels() const; ///< null until it is set
     const std::shared_ptr<VHostSubscriptionLedger>& Ledger() const;          ///< for VHostSubscriptions
     const std::shared_ptr<VFaultList>& FaultList() const;
@@ -90,14 +94,18 @@ public:
     /// Watches every signal that a plug-in can reach through these services.
     void WatchSignals(VSubscriptionAudit& o_rAudit) const;
 
+    /// One sentence for each kind of thing that a plug-in has taken and not given back: channels and what they give,
+    /// leases, services. Empty when the host does not check.
+    std::vector<std::string> FindInUse() const;
+
     /// Runs everything that waits: posted jobs of both services, queued calls and deferred deletions of Qt. False when
-    /// the worker pool or the UI service does not come to rest. UI thread.
-    [[nodiscard]] bool DrainPosts();
+    /// the worker pool or the UI service does not come to rest in the time given. UI thread.
+    [[nodiscard]] bool DrainPosts(std::chrono::milliseconds i_Patience);
+
+    const HostOptions& Options() const { return m_Options; }
 
 private:
     struct Parts;
-
-    void Check(const char* i_pOperation) const;
 
     const HostOptions m_Options;
     const std::unique_ptr<Parts> m_pParts;

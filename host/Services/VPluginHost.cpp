@@ -1,8 +1,11 @@
 #include "Services/VPluginHost.h"
 
+#include "CoreGraphics/Resources.h"
 #include "OrvanePluginInterface/IWorkspaceContent.h"
 #include "Services/VContentRegistry.h"
 #include "Services/VFaultList.h"
+#include "Services/VGraphicsAudit.h"
+#include "Services/VHandlerAudit.h"
 #include "Services/VHostServices.h"
 #include "Services/VQmlEngineHost.h"
 #include "Services/VSubscriptionAudit.h"
@@ -18,9 +21,28 @@ namespace Services
 namespace
 {
 
+constexpr std::chrono::milliseconds c_ShortPatience{500};
+
 void LogLine(TQL::ELogSeverity i_Severity, const std::string& i_rText)
 {
     TQL::Log::Write(TQL::Log::GetCategory("Host"), i_Severity, i_rText, "Services/VPluginHost", __LINE__);
+}
+
+/// What the exception that is being handled says.
+std::string ReasonThrown()
+{
+    try
+    {
+        throw;
+    }
+    catch (const std::exception& rException)
+    {
+        return rException.what();
+    }
+    catch (...)
+    {
+        return "something that is no std::exception";
+    }
 }
 
 std::set<std::string> Difference(const std::set<std::string>& i_rAfter, const std::set<std::string>& i_rBefore)
@@ -53,6 +75,8 @@ TQL::IResult VPluginHost::Load(const std::filesystem::path& i_rPath, std::string
     if (opened.IsError())
         return opened;
     m_LifeCycle = {};
+    m_pHandlers = std::make_unique<VHandlerAudit>(m_rServices.Preferences(), m_rServices.Ledger());
+    m_pGraphics = m_rServices.FaultList()->IsOn() ? std::make_unique<VGraphicsAudit>() : nullptr;
     const std::set<std::string> contentsBefore = m_rServices.Contents()->Names();
     const std::set<std::string> propertiesBefore = m_rServices.EngineHost()->PropertiesWithObject();
     std::string reason;
@@ -61,9 +85,9 @@ TQL::IResult VPluginHost::Load(const std::filesystem::path& i_rPath, std::string
     {
         started = Start(reason);
     }
-    catch (const std::exception& rException)
+    catch (...)
     {
-        reason = std::string("it threw: ") + rException.what();
+        reason = "it threw: " + ReasonThrown();
     }
     m_ContentNames = Difference(m_rServices.Contents()->Names(), contentsBefore);
     m_RootProperties = Difference(m_rServices.EngineHost()->PropertiesWithObject(), propertiesBefore);
@@ -125,9 +149,11 @@ QPointer<QWidget> VPluginHost::OpenContent(const std::string& i_rName, QPointer<
     {
         pFactory->CreateContent(pWidget, m_rServices.TimeController(), i_pFrame);
     }
-    catch (const std::exception& rException)
+    catch (...)
     {
-        LogLine(TQL::ELogSeverity::Error, "The content \"" + i_rName + "\" cannot be made: " + rException.what());
+        const std::string reason = ReasonThrown();
+        LogLine(TQL::ELogSeverity::Error, "The content \"" + i_rName + "\" cannot be made: " + reason);
+        m_rServices.FaultList()->Add("CreateContent threw: " + reason);
     }
     if (!pWidget)
         return nullptr;
@@ -161,17 +187,24 @@ TQL::IResult VPluginHost::Unload()
     if (!m_Library.IsOpen())
         return TQL::Result::Ok;
     CloseContents();
-    bool bAtRest = m_rServices.DrainPosts();
+    // Until its shutdown a plug-in may keep a timer running, so not all has to come to rest.
+    static_cast<void>(m_rServices.DrainPosts(c_ShortPatience));
     DropFromHost();
-    bAtRest = m_rServices.DrainPosts() && bAtRest;
+    static_cast<void>(m_rServices.DrainPosts(c_ShortPatience));
     EndPlugin();
-    bAtRest = m_rServices.DrainPosts() && bAtRest;
+    const bool bAtRest = m_rServices.DrainPosts(m_rServices.Options().Patience);
     const bool bUnsubscribed = SweepSubscriptions();
+    const bool bNoHandlers = FindHandlers();
     m_rServices.EngineHost()->ReleaseUnused();
+    m_rServices.Graphics()->Release();
     if (!bAtRest)
-        m_rServices.FaultList()->Add("The postal services did not come to rest after the plug-in had ended");
+        m_rServices.FaultList()->Add(
+            "IPostalService::Post: jobs of the plug-in, or a timer on the worker pool, went on "
+            "after Shutdown and did not come to rest");
+    const bool bNothingInUse = FindInUse();
+    FindGraphics();
     Note(ELifeCycleCall::UnloadModule);
-    if (bAtRest && bUnsubscribed)
+    if (bAtRest && bUnsubscribed && bNoHandlers && bNothingInUse)
     {
         m_Library.Close();
         return TQL::Result::Ok;
@@ -202,18 +235,31 @@ void VPluginHost::EndPlugin()
         return;
     if (m_bInitialised)
     {
-        Note(ELifeCycleCall::Shutdown);
-        m_pPlugin->Shutdown();
+        CallPlugin(ELifeCycleCall::Shutdown, [this] { m_pPlugin->Shutdown(); });
     }
     if (m_bQmlLoaded)
     {
-        Note(ELifeCycleCall::UnloadResources);
-        m_pPlugin->UnloadResources();
+        CallPlugin(ELifeCycleCall::UnloadResources, [this] { m_pPlugin->UnloadResources(); });
     }
-    Note(ELifeCycleCall::DestroyPlugin);
-    m_Library.Destroy(std::exchange(m_pPlugin, nullptr));
+    CallPlugin(ELifeCycleCall::DestroyPlugin, [this] { m_Library.Destroy(std::exchange(m_pPlugin, nullptr)); });
     m_bInitialised = false;
     m_bQmlLoaded = false;
+}
+
+/// The end of a plug-in goes on whatever one of its calls throws.
+void VPluginHost::CallPlugin(ELifeCycleCall i_Call, const std::function<void()>& i_rCall)
+{
+    Note(i_Call);
+    try
+    {
+        i_rCall();
+    }
+    catch (...)
+    {
+        const std::string text = std::string(ToText(i_Call)) + " threw: " + ReasonThrown();
+        LogLine(TQL::ELogSeverity::Error, text);
+        m_rServices.FaultList()->Add(text);
+    }
 }
 
 /// False when a subscription of the module is left.
@@ -222,12 +268,42 @@ bool VPluginHost::SweepSubscriptions()
     VSubscriptionAudit audit(m_rServices.Ledger());
     m_rServices.WatchSignals(audit);
     audit.Sweep();
-    const bool bAtRest = m_rServices.DrainPosts();
+    const bool bAtRest = m_rServices.DrainPosts(m_rServices.Options().Patience);
     audit.Purge();
     const std::vector<std::string> leaks = audit.Leaks();
     for (const std::string& rLeak : leaks)
         m_rServices.FaultList()->Add(rLeak);
     return bAtRest && leaks.empty();
+}
+
+/// False when a handler of the module, or what subscribed to it, is left in the preferences store.
+bool VPluginHost::FindHandlers()
+{
+    const std::vector<std::string> leftovers = m_pHandlers->Leftovers();
+    for (const std::string& rLeftover : leftovers)
+        m_rServices.FaultList()->Add(rLeftover);
+    return leftovers.empty();
+}
+
+/// False when the module has something of the host's that it may be called through.
+bool VPluginHost::FindInUse()
+{
+    const std::vector<std::string> texts = m_rServices.FindInUse();
+    for (const std::string& rText : texts)
+        m_rServices.FaultList()->Add(rText);
+    return texts.empty();
+}
+
+void VPluginHost::FindGraphics()
+{
+    if (!m_pGraphics)
+        return;
+    if (VGraphicsAudit::IsAWindowOpen())
+        LogLine(TQL::ELogSeverity::Information, "OpenGL objects are not looked for while a window shows OpenGL");
+    else
+        for (const std::string& rText : m_pGraphics->Leftovers())
+            m_rServices.FaultList()->Add(rText);
+    m_pGraphics.reset();
 }
 
 void VPluginHost::Note(ELifeCycleCall i_Call)

@@ -8,6 +8,8 @@
 
 #include <cstdint>
 #include <filesystem>
+#include <functional>
+#include <memory>
 #include <set>
 #include <string>
 #include <vector>
@@ -15,6 +17,8 @@
 namespace Services
 {
 
+class VGraphicsAudit;
+class VHandlerAudit;
 class VHostServices;
 
 /// Loads one plug-in module, opens its contents and unloads it so that none of its code is left queued or subscribed.
@@ -48,7 +52,8 @@ public:
     /// Closes the contents, drains the postal services, unregisters, then Shutdown, UnloadResources, DestroyPlugin, and
     /// unmaps. OkButPartial when something still needs the module's code, which then stays mapped: a leaked
     /// subscription or a pool that does not come to rest; the faults of the services name it. Ok when nothing was
-    /// loaded. The host's own timers on the worker pool must have been stopped.
+    /// loaded. The host's own timers on the worker pool must have been stopped. A checking host also finds what the
+    /// plug-in holds and, when no window of the program shows OpenGL any more, which OpenGL objects it left.
     [[nodiscard]] TQL::IResult Unload();
 
 private:
@@ -56,7 +61,11 @@ private:
     [[nodiscard]] TQL::IResult Start(std::string& o_rMessage);
     void DropFromHost();
     void EndPlugin();
+    void CallPlugin(ELifeCycleCall i_Call, const std::function<void()>& i_rCall);
     [[nodiscard]] bool SweepSubscriptions();
+    [[nodiscard]] bool FindHandlers();
+    [[nodiscard]] bool FindInUse();
+    void FindGraphics();
     void ForgetClosedContents();
 
     VHostServices& m_rServices;
@@ -69,6 +78,8 @@ private:
     std::set<std::string> m_ContentNames;
     std::set<std::string> m_RootProperties;
     std::vector<QPointer<QWidget>> m_Contents;
+    std::unique_ptr<VHandlerAudit> m_pHandlers;  ///< of the life that runs
+    std::unique_ptr<VGraphicsAudit> m_pGraphics; ///< the same; null where nothing is checked
 };
 
 } // namespace Services

@@ -16,13 +16,13 @@ VQmlEngineHost::~VQmlEngineHost() = default;
 
 QQmlEngine* VQmlEngineHost::GetEngine()
 {
-    CheckUiThread(m_pCheck, "IQmlEngineHost::GetEngine");
+    CheckThread(m_pCheck, "IQmlEngineHost::GetEngine");
     return m_pEngine.get();
 }
 
 void VQmlEngineHost::SetRootContextProperty(const std::string& i_rName, QObject* i_pObject)
 {
-    CheckUiThread(m_pCheck, "IQmlEngineHost::SetRootContextProperty");
+    CheckThread(m_pCheck, "IQmlEngineHost::SetRootContextProperty");
     m_pEngine->rootContext()->setContextProperty(QString::fromStdString(i_rName), i_pObject);
     if (i_pObject)
         m_NamesWithObject.insert(i_rName);

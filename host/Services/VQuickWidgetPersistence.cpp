@@ -37,7 +37,7 @@ VQuickWidgetPersistence::VQuickWidgetPersistence(ThreadCheckPointer i_pCheck) : 
 
 void VQuickWidgetPersistence::ReadProperties(TQL::IQuickWidget* i_pWidget, Entries& o_rEntries)
 {
-    CheckUiThread(m_pCheck, "IQuickWidgetPersistence::ReadProperties");
+    CheckThread(m_pCheck, "IQuickWidgetPersistence::ReadProperties");
     o_rEntries.clear();
     if (!i_pWidget)
         return;
@@ -52,7 +52,7 @@ void VQuickWidgetPersistence::ReadProperties(TQL::IQuickWidget* i_pWidget, Entri
 
 void VQuickWidgetPersistence::WriteProperties(const Entries& i_rEntries, TQL::IQuickWidget* i_pWidget)
 {
-    CheckUiThread(m_pCheck, "IQuickWidgetPersistence::WriteProperties");
+    CheckThread(m_pCheck, "IQuickWidgetPersistence::WriteProperties");
     if (!i_pWidget)
         return;
     QQmlPropertyMap* pMap = i_pWidget->PersistentProperties();

@@ -41,13 +41,13 @@ VSelectionSource::VSelectionSource(ThreadCheckPointer i_pCheck)
 
 std::shared_ptr<const TQL::ISelection> VSelectionSource::GetSelection() const
 {
-    CheckUiThread(m_pCheck, "ISelectionSource::GetSelection");
+    CheckThread(m_pCheck, "ISelectionSource::GetSelection");
     return std::make_shared<const VSelection>(m_Items);
 }
 
 void VSelectionSource::Set(const std::vector<TQL::SelectionItem>& i_rItems)
 {
-    CheckUiThread(m_pCheck, "ISelectionSource::Set");
+    CheckThread(m_pCheck, "ISelectionSource::Set");
     std::vector<TQL::SelectionItem> items;
     Append(items, i_rItems);
     Replace(std::move(items));
@@ -55,21 +55,27 @@ void VSelectionSource::Set(const std::vector<TQL::SelectionItem>& i_rItems)
 
 void VSelectionSource::Add(const std::vector<TQL::SelectionItem>& i_rItems)
 {
-    CheckUiThread(m_pCheck, "ISelectionSource::Add");
+    CheckThread(m_pCheck, "ISelectionSource::Add");
     std::vector<TQL::SelectionItem> items = m_Items;
     Append(items, i_rItems);
     Replace(std::move(items));
 }
 
+std::shared_ptr<TQL::IMultiCallbackPostal<void(bool)>> VSelectionSource::Changed() const
+{
+    CheckThread(m_pCheck, "ISelectionSource::Changed");
+    return m_pChanged;
+}
+
 std::uint64_t VSelectionSource::RootSegment(std::uint64_t i_Subject) const
 {
-    CheckUiThread(m_pCheck, "ISelectionSource::RootSegment");
+    CheckThread(m_pCheck, "ISelectionSource::RootSegment");
     return m_RootSegment ? m_RootSegment(i_Subject) : 0;
 }
 
 TQL::IResult VSelectionSource::GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const
 {
-    CheckUiThread(m_pCheck, "ISelectionSource::GetDevices");
+    CheckThread(m_pCheck, "ISelectionSource::GetDevices");
     o_rItems = m_Devices;
     return TQL::Result::Ok;
 }

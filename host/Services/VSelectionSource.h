@@ -23,7 +23,7 @@ public:
     std::shared_ptr<const TQL::ISelection> GetSelection() const override;
     void Set(const std::vector<TQL::SelectionItem>& i_rItems) override; ///< an equal selection raises nothing
     void Add(const std::vector<TQL::SelectionItem>& i_rItems) override;
-    std::shared_ptr<TQL::IMultiCallbackPostal<void(bool)>> Changed() const override { return m_pChanged; }
+    std::shared_ptr<TQL::IMultiCallbackPostal<void(bool)>> Changed() const override;
     std::uint64_t RootSegment(std::uint64_t i_Subject) const override; ///< 0 until SetRootSegments
     TQL::IResult GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const override;
 

@@ -14,7 +14,7 @@ VSourceMap::VSourceMap(std::shared_ptr<TQL::IChangeSignal> i_pChanged, ThreadChe
 
 std::set<std::string> VSourceMap::GetNames() const
 {
-    CheckUiThread(m_pCheck, "ISourceMap::GetNames");
+    CheckThread(m_pCheck, "ISourceMap::GetNames");
     std::set<std::string> names;
     for (const auto& [name, pSource] : Copy())
         names.insert(name);
@@ -23,16 +23,22 @@ std::set<std::string> VSourceMap::GetNames() const
 
 std::shared_ptr<ITimeSource> VSourceMap::Find(std::string_view i_Name) const
 {
-    CheckUiThread(m_pCheck, "ISourceMap::Find");
+    CheckThread(m_pCheck, "ISourceMap::Find");
     return FindSource(i_Name);
 }
 
 void VSourceMap::ForEach(
     const std::function<void(const std::string&, const std::shared_ptr<ITimeSource>&)>& i_rVisit) const
 {
-    CheckUiThread(m_pCheck, "ISourceMap::ForEach");
+    CheckThread(m_pCheck, "ISourceMap::ForEach");
     for (const auto& [name, pSource] : Copy())
         i_rVisit(name, pSource);
+}
+
+std::shared_ptr<TQL::IChangeSignal> VSourceMap::Changed() const
+{
+    CheckThread(m_pCheck, "ISourceMap::Changed");
+    return m_pChanged;
 }
 
 void VSourceMap::Insert(const std::string& i_rName, std::shared_ptr<VTimeSource> i_pSource)

@@ -24,7 +24,7 @@ public:
     void
     ForEach(const std::function<void(const std::string&, const std::shared_ptr<OrvanePluginInterface::ITimeSource>&)>&
                 i_rVisit) const override;
-    std::shared_ptr<TQL::IChangeSignal> Changed() const override { return m_pChanged; }
+    std::shared_ptr<TQL::IChangeSignal> Changed() const override;
 
     void Insert(const std::string& i_rName, std::shared_ptr<VTimeSource> i_pSource); ///< replaces one of that name
     bool Erase(std::string_view i_Name);

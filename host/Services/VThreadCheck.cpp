@@ -12,10 +12,10 @@ VThreadCheck::VThreadCheck(std::shared_ptr<VFaultList> i_pFaults)
 {
 }
 
-void VThreadCheck::CheckUiThread(const char* i_pOperation) const
+void VThreadCheck::Check(const HostOperation& i_rOperation) const
 {
-    if (m_pFaults->IsOn() && std::this_thread::get_id() != m_UiThread)
-        m_pFaults->Add(std::string(i_pOperation) + " was called on another thread than the UI thread");
+    if (i_rOperation.Threads == EThreads::Ui && std::this_thread::get_id() != m_UiThread)
+        m_pFaults->Add(std::string(i_rOperation.pName) + " was called on another thread than the UI thread");
 }
 
 } // namespace Services

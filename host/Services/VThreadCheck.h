@@ -1,5 +1,7 @@
 #pragma once
 
+#include "Services/HostOperations.h"
+
 #include <memory>
 #include <thread>
 
@@ -9,14 +11,15 @@ namespace Services
 class VFaultList;
 
 /// Notes every operation that belongs to the UI thread and was called on another one. The thread that makes this object
-/// is the UI thread. One for the whole host, shared by its services; any thread.
+/// is the UI thread. One for the whole host, shared by its services, which have none where nothing is checked; any
+/// thread.
 class VThreadCheck
 {
 public:
     explicit VThreadCheck(std::shared_ptr<VFaultList> i_pFaults);
 
-    /// Records a fault that names the operation, for example "IHostCoreServices::GetChannelService".
-    void CheckUiThread(const char* i_pOperation) const;
+    /// Records a fault that names the operation when this thread may not call it.
+    void Check(const HostOperation& i_rOperation) const;
 
 private:
     const std::shared_ptr<VFaultList> m_pFaults;
@@ -26,10 +29,10 @@ private:
 /// What the services hold: null checks nothing.
 using ThreadCheckPointer = std::shared_ptr<const VThreadCheck>;
 
-inline void CheckUiThread(const ThreadCheckPointer& i_rpCheck, const char* i_pOperation)
+inline void CheckThread(const ThreadCheckPointer& i_rpCheck, const HostOperation& i_rOperation)
 {
     if (i_rpCheck)
-        i_rpCheck->CheckUiThread(i_pOperation);
+        i_rpCheck->Check(i_rOperation);
 }
 
 } // namespace Services

@@ -20,36 +20,38 @@ VTimeController::VTimeController(std::shared_ptr<TQL::IPostalService> i_pUiPosta
 
 std::shared_ptr<ISourceMap> VTimeController::GetSourceMap() const
 {
-    CheckUiThread(m_pCheck, "ITimeController::GetSourceMap");
+    CheckThread(m_pCheck, "ITimeController::GetSourceMap");
     return m_pSourceMap;
 }
 
 void VTimeController::GetCurrentSourceName(std::string& o_rName) const
 {
-    CheckUiThread(m_pCheck, "ITimeController::GetCurrentSourceName");
+    CheckThread(m_pCheck, "ITimeController::GetCurrentSourceName");
     o_rName = m_CurrentName;
 }
 
 std::shared_ptr<ITimeSource> VTimeController::GetCurrentSource() const
 {
-    CheckUiThread(m_pCheck, "ITimeController::GetCurrentSource");
+    CheckThread(m_pCheck, "ITimeController::GetCurrentSource");
     return m_pSourceMap->FindSource(m_CurrentName);
 }
 
 void VTimeController::SeekTo(std::int64_t i_Tick)
 {
-    CheckUiThread(m_pCheck, "ITimeController::SeekTo");
+    CheckThread(m_pCheck, "ITimeController::SeekTo");
     if (const auto pSource = CurrentReview())
         pSource->SetCurrentTick(i_Tick);
 }
 
 std::shared_ptr<TQL::IChangeSignal> VTimeController::SourceListChanged() const
 {
+    CheckThread(m_pCheck, "ITimeController::SourceListChanged");
     return m_SourceListSignal.Signal();
 }
 
 std::shared_ptr<TQL::IChangeSignal> VTimeController::CurrentSourceChanged() const
 {
+    CheckThread(m_pCheck, "ITimeController::CurrentSourceChanged");
     return m_CurrentSourceSignal.Signal();
 }
 
@@ -72,6 +74,7 @@ bool VTimeController::RemoveSource(const std::string& i_rName)
 {
     if (!m_pSourceMap->Erase(i_rName))
         return false;
+    m_Marks.erase(i_rName);
     if (i_rName == m_CurrentName)
     {
         m_CurrentName.clear();
@@ -123,7 +126,7 @@ void VTimeController::Play(double i_Rate)
     if (!pSource || pSource->Range().IsEmpty() || i_Rate == 0.0)
         return;
     const TQL::TickRange range = pSource->Range();
-    if (AdvancePlay(pSource->CurrentTick(), 0, i_Rate, range, pSource->FramePeriod()).bEnded)
+    if (!m_bLooping && AdvancePlay(pSource->CurrentTick(), 0, i_Rate, range, pSource->FramePeriod()).bEnded)
         pSource->SetCurrentTick(i_Rate > 0.0 ? range.First : range.Last);
     SetPlaying(true, i_Rate);
 }
@@ -133,11 +136,49 @@ void VTimeController::Pause()
     SetPlaying(false, m_Rate);
 }
 
+void VTimeController::SetRate(double i_Rate)
+{
+    if (i_Rate != 0.0)
+        SetPlaying(m_bPlaying, i_Rate);
+}
+
+void VTimeController::SetLooping(bool i_bLooping)
+{
+    if (m_bLooping == i_bLooping)
+        return;
+    m_bLooping = i_bLooping;
+    m_PlaySignal.RaiseLater();
+}
+
+void VTimeController::SetMarks(const TQL::TickRange& i_rMarks)
+{
+    if (m_CurrentName.empty())
+        return;
+    if (i_rMarks.IsEmpty())
+        m_Marks.erase(m_CurrentName);
+    else
+        m_Marks[m_CurrentName] = i_rMarks;
+    m_PlaySignal.RaiseLater();
+}
+
+TQL::TickRange VTimeController::Marks() const
+{
+    const auto found = m_Marks.find(m_CurrentName);
+    return found != m_Marks.end() ? found->second : TQL::TickRange();
+}
+
 void VTimeController::Advance(std::int64_t i_ElapsedTicks)
 {
     const auto pSource = CurrentReview();
     if (!m_bPlaying || !pSource)
         return;
+    if (m_bLooping)
+    {
+        const TQL::TickRange loop = LoopRange(Marks(), pSource->Range(), pSource->FramePeriod());
+        pSource->SetCurrentTick(
+            AdvanceLoop(pSource->CurrentTick(), i_ElapsedTicks, m_Rate, loop, pSource->FramePeriod()));
+        return;
+    }
     const PlayStep step =
         AdvancePlay(pSource->CurrentTick(), i_ElapsedTicks, m_Rate, pSource->Range(), pSource->FramePeriod());
     pSource->SetCurrentTick(step.Tick);

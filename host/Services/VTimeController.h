@@ -4,6 +4,7 @@
 #include "Services/VSourceMap.h"
 #include "Services/VTimeSource.h"
 
+#include <map>
 #include <memory>
 #include <string>
 
@@ -39,10 +40,16 @@ public:
     void Pause();
     bool IsPlaying() const { return m_bPlaying; }
     double Rate() const { return m_Rate; }
-    /// Moves a playing source on by this much real time, in ticks, and pauses it at the end.
+    void SetRate(double i_Rate); ///< of this play and the ones that follow; 0 does nothing
+    /// Whether play goes round and round: over the marks of the current source, or all of it where it has none.
+    void SetLooping(bool i_bLooping);
+    bool IsLooping() const { return m_bLooping; }
+    void SetMarks(const TQL::TickRange& i_rMarks); ///< of the current source; an empty range takes them away
+    TQL::TickRange Marks() const;                  ///< of the current source; empty when it has none
+    /// Moves a playing source on by this much real time, in ticks. Without a loop it is paused at the end.
     void Advance(std::int64_t i_ElapsedTicks);
 
-    /// Play began or ended. Not part of the interface that a plug-in sees.
+    /// Play began or ended, or rate, loop or marks changed. Not part of the interface that a plug-in sees.
     std::shared_ptr<TQL::IChangeSignal> PlayChanged() const;
 
 private:
@@ -58,9 +65,11 @@ private:
     VDeferredSignal m_PlaySignal;
     const std::shared_ptr<VSourceMap> m_pSourceMap;
     std::string m_CurrentName;
+    std::map<std::string, TQL::TickRange> m_Marks;         ///< by source name
     NotificationSystem::VSubscriptions m_ModeSubscription; ///< of the current source
     bool m_bPlaying = false;
     double m_Rate = 1.0;
+    bool m_bLooping = false;
 };
 
 } // namespace Services

@@ -10,7 +10,7 @@ VTimeControllerRegistry::VTimeControllerRegistry(ThreadCheckPointer i_pCheck) : 
 void VTimeControllerRegistry::GetTimeController(std::string_view i_Name,
                                                 std::shared_ptr<ITimeController>& o_rpController) const
 {
-    CheckUiThread(m_pCheck, "ITimeControllerRegistry::GetTimeController");
+    CheckThread(m_pCheck, "ITimeControllerRegistry::GetTimeController");
     const auto found = m_Controllers.find(i_Name);
     o_rpController = found == m_Controllers.end() ? nullptr : found->second;
 }

@@ -18,13 +18,13 @@ VTimeSource::VTimeSource(int i_Mode, const std::shared_ptr<TQL::IPostalService>&
 
 int VTimeSource::GetMode() const
 {
-    CheckUiThread(m_pCheck, "ITimeSource::GetMode");
+    CheckThread(m_pCheck, "ITimeSource::GetMode");
     return Mode();
 }
 
 bool VTimeSource::GetTimeState(TimeState& o_rState) const
 {
-    CheckUiThread(m_pCheck, "ITimeSource::GetTimeState");
+    CheckThread(m_pCheck, "ITimeSource::GetTimeState");
     const std::lock_guard lock(m_Mutex);
     if (m_Range.IsEmpty())
         return false;
@@ -38,11 +38,13 @@ bool VTimeSource::GetTimeState(TimeState& o_rState) const
 
 std::shared_ptr<TQL::IChangeSignal> VTimeSource::StateChanged() const
 {
+    CheckThread(m_pCheck, "ITimeSource::StateChanged");
     return m_StateSignal.Signal();
 }
 
 std::shared_ptr<TQL::IChangeSignal> VTimeSource::SecondStateChanged() const
 {
+    CheckThread(m_pCheck, "ITimeSource::SecondStateChanged");
     return m_StateSignal.Signal();
 }
 

@@ -2,6 +2,7 @@
 
 #include "Channels/ChannelTypes.h"
 #include "Channels/VChannelContext.h"
+#include "Channels/VSourceChannel.h"
 #include "Recordings/NamePattern.h"
 
 #include <QtCore/QCoreApplication>
@@ -22,6 +23,25 @@ std::string NameOf(const TQL::IChannel& i_rChannel)
         return {};
     const std::string* pName = std::get_if<std::string>(&value);
     return pName ? *pName : std::string();
+}
+
+std::vector<std::string> UnitsOf(const Channels::ChannelDefinition& i_rDefinition)
+{
+    std::vector<std::string> units;
+    if (!i_rDefinition.Units.empty())
+        units.push_back(i_rDefinition.Units);
+    if (i_rDefinition.TypeName == Channels::SegmentPoseType)
+        units.push_back("rad");
+    return units;
+}
+
+QStringList Texts(const std::vector<std::string>& i_rTexts)
+{
+    QStringList texts;
+    for (const std::string& rText : i_rTexts)
+        if (!rText.empty())
+            texts.append(QString::fromStdString(rText));
+    return texts;
 }
 
 QString BranchOf(const std::string& i_rTypeName)
@@ -48,7 +68,11 @@ std::vector<SelectableChannel> ListChannels(const Channels::VChannelContext& i_r
     std::vector<SelectableChannel> channels;
     for (const auto& rpChannel : *i_rContext.GetChannels())
         if (auto item = Channels::SelectionOfChannel(rpChannel->GetInstanceId()))
-            channels.push_back({NameOf(*rpChannel), rpChannel->GetInstanceId().TypeName, std::move(*item)});
+        {
+            const Channels::ChannelDefinition& rDefinition = rpChannel->GetDefinition();
+            channels.push_back({NameOf(*rpChannel), rpChannel->GetInstanceId().TypeName, std::move(*item),
+                                UnitsOf(rDefinition), Channels::ComponentNamesOf(rDefinition)});
+        }
     return channels;
 }
 
@@ -59,7 +83,9 @@ std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableChannel> i_Cha
     {
         const QString name = QString::fromStdString(rChannel.Name);
         const qsizetype colon = name.indexOf(QLatin1Char(':'));
-        ChannelTreeLeaf leaf{{BranchOf(rChannel.TypeName)}, name.mid(colon + 1), rChannel.Item};
+        const QString kind = BranchOf(rChannel.TypeName);
+        ChannelTreeLeaf leaf{{kind}, name.mid(colon + 1), rChannel.Item, {}};
+        leaf.Search = {name, kind, Texts(rChannel.Units), Texts(rChannel.Components)};
         if (colon > 0)
             leaf.Branches.prepend(name.left(colon));
         leaves.push_back(std::move(leaf));

@@ -20,6 +20,8 @@ struct SelectableChannel
     std::string Name;     ///< as shown: "Walker1:LFHD"
     std::string TypeName; ///< of its id
     TQL::SelectionItem Item;
+    std::vector<std::string> Units = {};      ///< of its components, each once
+    std::vector<std::string> Components = {}; ///< names
 };
 
 /// In the order of the context.

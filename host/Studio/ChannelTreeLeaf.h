@@ -1,6 +1,7 @@
 #pragma once
 
 #include "ChannelSystem/ISelectionSource.h"
+#include "Studio/ChannelSearch.h"
 
 #include <QtCore/QString>
 #include <QtCore/QStringList>
@@ -15,6 +16,9 @@ struct ChannelTreeLeaf
     QStringList Branches;
     QString Text;
     TQL::SelectionItem Item;
+    ChannelSearchText Search = {};
+
+    friend bool operator==(const ChannelTreeLeaf&, const ChannelTreeLeaf&) = default;
 };
 
 } // namespace Studio

@@ -1,5 +1,7 @@
 #include "Studio/CommandLine.h"
 
+#include "Streaming/OscAddress.h"
+
 #include <algorithm>
 #include <cctype>
 #include <charconv>
@@ -21,6 +23,7 @@ constexpr unsigned window = Bit(ECommand::Window);
 constexpr unsigned channels = Bit(ECommand::Channels);
 constexpr unsigned table = Bit(ECommand::Export);
 constexpr unsigned snapshot = Bit(ECommand::Snapshot);
+constexpr unsigned record = Bit(ECommand::Record);
 
 /// Puts the text of an option into the struct. False when the text does not fit.
 using Apply = bool (*)(CommandLine& o_rCommandLine, const std::string& i_rText);
@@ -89,6 +92,15 @@ bool ReadAfter(std::string_view i_Text, std::optional<int>& o_rMilliseconds)
     return true;
 }
 
+bool ReadBetween(std::string_view i_Text, double i_Lowest, double i_Highest, double& o_rValue)
+{
+    double value = 0.0;
+    if (!ReadNumber(i_Text, value) || !(value >= i_Lowest && value <= i_Highest))
+        return false;
+    o_rValue = value;
+    return true;
+}
+
 bool ReadSubjects(std::string_view i_Text, std::uint32_t& o_rSubjects)
 {
     std::uint32_t subjects = 0;
@@ -120,6 +132,22 @@ constexpr OptionRow options[] = {
     {"--after", "MS", snapshot,
      [](CommandLine& o_r, const std::string& i_r) { return ReadAfter(i_r, o_r.AfterMilliseconds); },
      "milliseconds from 0 to 600000"},
+    {"--osc", "[ADDRESS:]PORT", window | record,
+     [](CommandLine& o_r, const std::string& i_r)
+     { return Streaming::ReadOscEndpoint(i_r, o_r.OscAddress, o_r.OscPort); },
+     "a UDP port from 1 to 65535, with an address of this machine before it if others shall send"},
+    {"--osc-rate", "HZ", window | record,
+     [](CommandLine& o_r, const std::string& i_r) { return ReadBetween(i_r, 0.1, 100'000.0, o_r.OscRate); },
+     "a rate from 0.1 to 100000"},
+    {"--replay", "FILE", window, [](CommandLine& o_r, const std::string& i_r) { return ReadText(o_r.ReplayPath, i_r); },
+     "the path of a recording"},
+    {"--speed", "X", window,
+     [](CommandLine& o_r, const std::string& i_r) { return ReadBetween(i_r, 0.01, 100.0, o_r.Speed); },
+     "a number from 0.01 to 100"},
+    {"--loop", "", window, [](CommandLine& o_r, const std::string&) { return o_r.bLoop = true; }, ""},
+    {"--seconds", "N", record,
+     [](CommandLine& o_r, const std::string& i_r) { return ReadBetween(i_r, 0.1, 86'400.0, o_r.Seconds); },
+     "a number of seconds from 0.1 to 86400"},
     {"--module", "PATH", window | snapshot,
      [](CommandLine& o_r, const std::string& i_r) { return ReadText(o_r.ModulePath, i_r); }, "the path of a module"},
     {"--check", "", window | snapshot, [](CommandLine& o_r, const std::string&) { return o_r.bCheck = true; }, ""},
@@ -129,7 +157,11 @@ constexpr struct
 {
     std::string_view Name;
     ECommand Command;
-} commands[] = {{"channels", ECommand::Channels}, {"export", ECommand::Export}, {"snapshot", ECommand::Snapshot}};
+} commands[] = {{"channels", ECommand::Channels},
+                {"export", ECommand::Export},
+                {"snapshot", ECommand::Snapshot},
+                {"check-store", ECommand::CheckStore},
+                {"record", ECommand::Record}};
 
 std::string_view NameOf(ECommand i_Command)
 {
@@ -142,6 +174,11 @@ std::string_view NameOf(ECommand i_Command)
 bool IsDigits(std::string_view i_Text)
 {
     return !i_Text.empty() && std::ranges::all_of(i_Text, [](unsigned char i_C) { return std::isdigit(i_C) != 0; });
+}
+
+bool IsC3dPath(std::string_view i_Path)
+{
+    return i_Path.ends_with(".c3d") || i_Path.ends_with(".C3D");
 }
 
 /// Walks over the words once.
@@ -242,6 +279,20 @@ private:
         const std::string name(NameOf(r.Command));
         if ((r.Command == ECommand::Channels || r.Command == ECommand::Export) && r.Files.size() != 1)
             return Fail(name + (r.Files.empty() ? " needs the path of a recording" : " takes one recording at a time"));
+        if (r.Command == ECommand::CheckStore && r.Files.size() != 1)
+            return Fail(r.Files.empty() ? "check-store needs the path of a store file"
+                                        : "check-store takes one store file at a time");
+        if (r.Command == ECommand::Record && (r.Files.size() != 1 || r.OscPort == 0 || r.Seconds == 0.0))
+            return Fail("record needs --osc PORT, --seconds N, and the path of one file to write");
+        if (r.Command == ECommand::Record && !IsC3dPath(r.Files.front()))
+            return Fail("record writes C3D files; let the path end in .c3d");
+        if (r.Command == ECommand::Window &&
+            (r.bLive ? 1 : 0) + (r.OscPort ? 1 : 0) + (r.ReplayPath.empty() ? 0 : 1) > 1)
+            return Fail("there is one live input at a time: give --live, --osc or --replay");
+        if (r.OscRate != 0.0 && r.OscPort == 0)
+            return Fail("--osc-rate goes with --osc PORT");
+        if ((r.bLoop || r.Speed != 1.0) && r.ReplayPath.empty())
+            return Fail("--speed and --loop go with --replay FILE");
         if (r.Command == ECommand::Export && r.CsvPath.empty())
             return Fail("export needs --csv OUT, the path of the table to write");
         if (r.Command != ECommand::Snapshot)
@@ -279,21 +330,33 @@ std::string HelpText()
 {
     return "Usage:\n"
            "  graphplots-studio [FILE...] [--live [SUBJECTS]]\n"
+           "  graphplots-studio [FILE...] --osc [ADDRESS:]PORT [--osc-rate HZ]\n"
+           "  graphplots-studio [FILE...] --replay FILE [--speed X] [--loop]\n"
            "  graphplots-studio channels FILE [--json]\n"
            "  graphplots-studio export FILE --csv OUT [--channel PATTERN]...\n"
            "  graphplots-studio snapshot FILE|--live [SUBJECTS] --out PNG [--channel PATTERN]...\n"
            "                    [--size WxH] [--range A:B] [--values A:B] [--after MS]\n"
+           "  graphplots-studio record --osc [ADDRESS:]PORT [--osc-rate HZ] --seconds N OUT.c3d\n"
+           "  graphplots-studio check-store FILE\n"
            "\n"
-           "Without arguments the studio opens the recording that comes with it and a simulated live capture.\n"
+           "Without arguments the studio opens empty and says what to do.\n"
            "  --channel PATTERN  channels by name; * stands for any characters, ? for one\n"
            "  --size WxH         of the picture, in pixels\n"
            "  --range A:B        the time axis, in frames\n"
            "  --values A:B       the value axes, in the units of the channels\n"
            "  --after MS         how long to wait before the picture is taken\n"
+           "  --osc PORT         listens for Open Sound Control messages from this machine; with an address of this\n"
+           "                     machine before it (0.0.0.0: all) also from others\n"
+           "  --osc-rate HZ      the rate at which they come (default: measured on the first ones)\n"
+           "  --replay FILE      shows a recording as if it were captured now, --speed X times as fast, once or in a "
+           "--loop\n"
            "  --module PATH      the Graph Plots module (default: graphplots.so beside the program)\n"
            "  --check            report at the end where the module broke the rules of its host\n"
            "\n"
-           "Exit status: 0, or 2 with one line on standard error that says what is wrong.\n";
+           "check-store prints what a store file (preferences, graphs) holds, and where it has problems.\n"
+           "\n"
+           "Exit status: 0; 1 where check-store found problems; 2 with one line on standard error that says what is\n"
+           "wrong.\n";
 }
 
 } // namespace Studio

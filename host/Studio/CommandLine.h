@@ -14,10 +14,12 @@ namespace Studio
 
 enum class ECommand
 {
-    Window,   ///< open the studio
-    Channels, ///< list the channels of a file
-    Export,   ///< write channels as a table
-    Snapshot, ///< write a picture of a Graph Plots window
+    Window,     ///< open the studio
+    Channels,   ///< list the channels of a file
+    Export,     ///< write channels as a table
+    Snapshot,   ///< write a picture of a Graph Plots window
+    CheckStore, ///< print what a store file holds and what is wrong with it
+    Record,     ///< write what comes in over the network as a recording
     Help
 };
 
@@ -27,7 +29,14 @@ struct CommandLine
     ECommand Command = ECommand::Window;
     std::vector<std::string> Files;
     bool bLive = false;
-    std::uint32_t Subjects = 2; ///< of the simulated capture
+    std::uint32_t Subjects = 2;           ///< of the simulated capture
+    std::string OscAddress = "127.0.0.1"; ///< where to listen for Open Sound Control messages
+    std::uint16_t OscPort = 0;            ///< 0: not at all
+    double OscRate = 0.0;                 ///< frames a second; 0: measured
+    std::string ReplayPath;               ///< a recording to replay as live; empty: none
+    double Speed = 1.0;                   ///< of the replay
+    bool bLoop = false;                   ///< replay again and again
+    double Seconds = 0.0;                 ///< how long to record
     bool bJson = false;
     std::string CsvPath;
     std::string PicturePath;

@@ -17,6 +17,17 @@ ItemKey KeyOf(const TQL::SelectionItem& i_rItem)
     return {i_rItem.Kind, i_rItem.First, i_rItem.Second, i_rItem.Text};
 }
 
+/// "Walker1:LFHD: X, Y, Z in mm".
+QString ToolTipOf(const ChannelSearchText& i_rText)
+{
+    QString text = i_rText.Name;
+    if (!i_rText.Components.isEmpty())
+        text += QStringLiteral(": ") + i_rText.Components.join(QStringLiteral(", "));
+    if (!i_rText.Units.isEmpty())
+        text += VChannelTreeModel::tr(" in %1").arg(i_rText.Units.join(QStringLiteral(", ")));
+    return text;
+}
+
 } // namespace
 
 VChannelTreeModel::VChannelTreeModel(QObject* i_pParent) : QAbstractItemModel(i_pParent), m_Nodes(1) {}
@@ -70,6 +81,7 @@ void VChannelTreeModel::SetLeaves(const std::vector<ChannelTreeLeaf>& i_rLeaves)
     {
         const std::size_t leaf = AddNode(BranchFor(rLeaf.Branches), rLeaf.Text);
         m_Nodes[leaf].Item = rLeaf.Item;
+        m_Nodes[leaf].Search = rLeaf.Search;
         for (std::size_t node = leaf;; node = m_Nodes[node].Parent)
         {
             ++m_Nodes[node].Leaves;
@@ -130,6 +142,29 @@ void VChannelTreeModel::Tick(std::size_t i_Leaf, bool i_bTicked)
         std::erase(m_TickedLeaves, i_Leaf);
 }
 
+void VChannelTreeModel::TickLeaves(const QModelIndexList& i_rLeaves, bool i_bTicked)
+{
+    bool bChanged = false;
+    for (const QModelIndex& rLeaf : i_rLeaves)
+    {
+        const std::size_t leaf = NodeOf(rLeaf);
+        if (!IsLeaf(leaf) || (m_Nodes[leaf].TickedLeaves != 0) == i_bTicked)
+            continue;
+        Tick(leaf, i_bTicked);
+        bChanged = true;
+    }
+    if (!bChanged)
+        return;
+    AnnounceAll(0);
+    Q_EMIT TickedChanged();
+}
+
+const ChannelSearchText* VChannelTreeModel::SearchTextOf(const QModelIndex& i_rIndex) const
+{
+    const std::size_t node = NodeOf(i_rIndex);
+    return IsLeaf(node) ? &m_Nodes[node].Search : nullptr;
+}
+
 void VChannelTreeModel::TickBelow(std::size_t i_Node, bool i_bTicked)
 {
     if (IsLeaf(i_Node))
@@ -177,6 +212,8 @@ QVariant VChannelTreeModel::data(const QModelIndex& i_rIndex, int i_Role) const
     const Node& rNode = m_Nodes[NodeOf(i_rIndex)];
     if (i_Role == Qt::DisplayRole)
         return rNode.Text;
+    if (i_Role == Qt::ToolTipRole)
+        return ToolTipOf(rNode.Search);
     if (i_Role != Qt::CheckStateRole)
         return {};
     if (rNode.TickedLeaves == 0)

@@ -29,6 +29,14 @@ public:
 
     std::vector<TQL::SelectionItem> Ticked() const;
 
+    /// Ticks or clears some leaves, emitting TickedChanged once, unless all are so already.
+    void TickLeaves(const QModelIndexList& i_rLeaves, bool i_bTicked);
+
+    /// What a search looks at in a leaf; null for a branch.
+    const ChannelSearchText* SearchTextOf(const QModelIndex& i_rIndex) const;
+
+    int LeafCount() const { return m_Nodes.front().Leaves; }
+
     /// The leaf that comes first in the tree; an item of kind None when there is none.
     TQL::SelectionItem FirstItem() const;
 
@@ -52,7 +60,8 @@ private:
         int Row = 0;
         std::vector<std::size_t> Children;
         TQL::SelectionItem Item; ///< kind None for a branch
-        int Leaves = 0;          ///< below and including this node
+        ChannelSearchText Search;
+        int Leaves = 0; ///< below and including this node
         int TickedLeaves = 0;
     };
 

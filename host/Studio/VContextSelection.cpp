@@ -23,9 +23,14 @@ std::vector<TQL::SelectionItem> KnownOnes(const std::vector<TQL::SelectionItem>&
 std::vector<TQL::SelectionItem> VContextSelection::Show(const std::string& i_rContext,
                                                         const std::vector<TQL::SelectionItem>& i_rKnown)
 {
+    if (i_rKnown.empty()) // a live input whose channels are still to come
+    {
+        m_Context.clear();
+        return {};
+    }
     const auto found = m_ByContext.find(i_rContext);
     std::vector<TQL::SelectionItem> items = KnownOnes(found != m_ByContext.end() ? found->second : m_Current, i_rKnown);
-    if (items.empty() && found == m_ByContext.end() && !i_rKnown.empty())
+    if (items.empty() && (found == m_ByContext.end() || !found->second.empty()))
         items.push_back(i_rKnown.front());
     m_Context = i_rContext;
     Remember(items);

@@ -10,7 +10,8 @@ namespace Studio
 {
 
 /// Remembers what was selected in each context, so that going to another one and back finds everything as it was.
-/// A context that is shown for the first time takes over what it knows of the selection before, else its first channel.
+/// A context that is shown for the first time takes over what it knows of the selection before, else its first channel;
+/// so does one of which no channel that was selected is left. One without any channel does not count as shown.
 class VContextSelection
 {
 public:

@@ -54,6 +54,12 @@ bool VLiveCapture::IsPaused() const
     return !m_Clock.IsRunning();
 }
 
+bool VLiveCapture::HasEnded() const
+{
+    const std::lock_guard lock(m_Mutex);
+    return m_bEnded;
+}
+
 void VLiveCapture::Work()
 {
     std::int64_t done = 0;
@@ -67,12 +73,12 @@ void VLiveCapture::Work()
             lock.unlock();
             const TQL::IResult result = m_Produce(m_FirstFrame + done, count);
             lock.lock();
+            m_bEnded = result.IsError() || result == TQL::Result::OkButNoEffect;
             if (result.IsError())
-            {
                 TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error, "Studio/VLiveCapture",
                                  __LINE__, "The live capture has stopped: %1%", result.Description());
+            if (m_bEnded)
                 return;
-            }
             done += count;
         }
         else if (m_Clock.IsRunning())

@@ -17,7 +17,8 @@ namespace Studio
 class VLiveCapture
 {
 public:
-    /// Delivers the frames [first, first + count). Called on the capture's thread. An error ends the capture.
+    /// Delivers the frames [first, first + count). Called on the capture's thread. An error ends the
+    /// capture, and so does OkButNoEffect, which says that there are no more frames.
     using Produce = std::function<TQL::IResult(std::int64_t i_First, std::int64_t i_Count)>;
 
     /// Begins with i_FirstFrame, at once.
@@ -28,6 +29,7 @@ public:
 
     void SetPaused(bool i_bPaused);
     bool IsPaused() const;
+    bool HasEnded() const; ///< there will be no more frames
 
 private:
     void Work();
@@ -38,6 +40,7 @@ private:
     std::condition_variable m_Wake;
     VFrameClock m_Clock;      // guarded by m_Mutex
     bool m_bStopping = false; // guarded by m_Mutex
+    bool m_bEnded = false;    // guarded by m_Mutex
     std::thread m_Thread;
 };
 

@@ -1,185 +1,317 @@
 #include "Studio/VMainWindow.h"
 
-#include "Channels/VChannelContext.h"
-#include "Channels/VChannelService.h"
-#include "Services/VSelectionSource.h"
 #include "Services/VTimeController.h"
 #include "Services/VUiPostalService.h"
-#include "Studio/ChannelLeaves.h"
 #include "Studio/Paths.h"
-#include "Studio/VChannelTreeModel.h"
-#include "Studio/VPlotFrame.h"
+#include "Studio/PlotStates.h"
+#include "Studio/VChangedFilesBar.h"
+#include "Studio/VChannelPanel.h"
+#include "Studio/VEventList.h"
+#include "Studio/VFileActions.h"
+#include "Studio/VLiveActions.h"
+#include "Studio/VLoadingBar.h"
+#include "Studio/VLogModel.h"
+#include "Studio/VLogPanel.h"
+#include "Studio/VMainActions.h"
+#include "Studio/VNoticeBar.h"
+#include "Studio/VOpenFiles.h"
+#include "Studio/VPlotArea.h"
+#include "Studio/VShortcutsDialog.h"
+#include "Studio/VStartPage.h"
 #include "Studio/VStudioSession.h"
+#include "Studio/VTransport.h"
 #include "Studio/VTransportBar.h"
+#include "Studio/WidgetKeys.h"
+#include "Studio/WindowLayout.h"
 
+#include <QtCore/QMimeData>
+#include <QtCore/QUrl>
 #include <QtGui/QAction>
-#include <QtGui/QKeySequence>
+#include <QtGui/QCloseEvent>
+#include <QtGui/QDragEnterEvent>
+#include <QtGui/QDropEvent>
+#include <QtGui/QScreen>
 #include <QtWidgets/QDockWidget>
-#include <QtWidgets/QFileDialog>
-#include <QtWidgets/QMdiArea>
-#include <QtWidgets/QMdiSubWindow>
 #include <QtWidgets/QMenu>
 #include <QtWidgets/QMenuBar>
-#include <QtWidgets/QStatusBar>
+#include <QtWidgets/QPushButton>
+#include <QtWidgets/QStackedWidget>
 #include <QtWidgets/QToolBar>
-#include <QtWidgets/QTreeView>
+#include <QtWidgets/QVBoxLayout>
+
+#include <utility>
+#include <vector>
 
 namespace Studio
 {
 
-VMainWindow::VMainWindow(VStudioSession& i_rSession, QWidget* i_pParent)
+namespace
+{
+
+std::filesystem::path LayoutFile(const VStudioSession& i_rSession)
+{
+    return i_rSession.SettingsFolder().empty() ? std::filesystem::path()
+                                               : i_rSession.SettingsFolder() / "window-layout.json";
+}
+
+std::filesystem::path StatesFile(const VStudioSession& i_rSession)
+{
+    return i_rSession.SettingsFolder().empty() ? std::filesystem::path()
+                                               : i_rSession.SettingsFolder() / "window-states.json";
+}
+
+std::vector<std::filesystem::path> LocalFiles(const QMimeData& i_rData)
+{
+    std::vector<std::filesystem::path> paths;
+    for (const QUrl& rUrl : i_rData.urls())
+        if (rUrl.isLocalFile())
+            paths.push_back(PathFromText(rUrl.toLocalFile().toStdString()));
+    return paths;
+}
+
+QSize UsualSize(const QWidget& i_rWindow)
+{
+    const QSize wished(i_rWindow.fontMetrics().averageCharWidth() * 230, i_rWindow.fontMetrics().lineSpacing() * 58);
+    return wished.boundedTo(i_rWindow.screen()->availableSize() * 9 / 10);
+}
+
+} // namespace
+
+VMainWindow::VMainWindow(VStudioSession& i_rSession, VLogModel* i_pLog, QWidget* i_pParent)
     : QMainWindow(i_pParent), m_rSession(i_rSession), m_Subscriptions(i_rSession.Host().Ledger())
 {
     setWindowTitle(tr("Graph Plots Studio"));
-    m_pArea = new QMdiArea(this);
-    setCentralWidget(m_pArea);
-    BuildTree();
-    m_pTransport = new VTransportBar(m_rSession, this);
-    auto* pBar = new QToolBar(tr("Transport"), this);
-    pBar->setObjectName(QStringLiteral("transport"));
-    pBar->setMovable(false);
-    pBar->addWidget(m_pTransport);
-    addToolBar(Qt::BottomToolBarArea, pBar);
+    setAcceptDrops(true);
+    new VWidgetKeys(this);
+    m_pActions = new VMainActions(this);
+    m_pFiles = new VOpenFiles(m_rSession, this);
+    m_pTransport = new VTransport(m_rSession, this);
+    BuildCentre();
+    BuildTransport();
+    BuildPanels(i_pLog ? *i_pLog : *new VLogModel(VLogModel::UsualLimit, this));
     BuildMenus();
-    statusBar();
-    resize(1280, 800);
-    Subscribe();
-    ShowTreeOfCurrentContext();
+    ConnectTransport();
+    ConnectOther();
+    resize(UsualSize(*this));
+    ShowCentre();
 }
 
 VMainWindow::~VMainWindow() = default;
 
-void VMainWindow::BuildTree()
+void VMainWindow::BuildCentre()
 {
-    m_pTreeModel = new VChannelTreeModel(this);
-    m_pTree = new QTreeView(this);
-    m_pTree->setModel(m_pTreeModel);
-    m_pTree->setHeaderHidden(true);
-    m_pTree->setUniformRowHeights(true);
-    auto* pDock = new QDockWidget(tr("Channels"), this);
-    pDock->setObjectName(QStringLiteral("channels"));
-    pDock->setFeatures(QDockWidget::DockWidgetMovable | QDockWidget::DockWidgetClosable);
-    pDock->setWidget(m_pTree);
-    addDockWidget(Qt::LeftDockWidgetArea, pDock);
-    resizeDocks({pDock}, {240}, Qt::Horizontal);
-    connect(m_pTreeModel, &VChannelTreeModel::TickedChanged, this, &VMainWindow::SetSelection);
+    auto* pColumn = new QWidget(this);
+    auto* pLayout = new QVBoxLayout(pColumn);
+    pLayout->setContentsMargins(0, 0, 0, 0);
+    pLayout->setSpacing(0);
+    m_pNotices = new VNoticeBar(pColumn);
+    pLayout->addWidget(new VLoadingBar(m_pFiles->Loader(), pColumn));
+    pLayout->addWidget(new VChangedFilesBar(*m_pFiles, pColumn));
+    pLayout->addWidget(m_pNotices);
+
+    m_pCentre = new QStackedWidget(pColumn);
+    auto* pStart = new VStartPage(*m_pActions, m_pFiles->Recent(), m_pCentre);
+    connect(pStart, &VStartPage::OpenRequested, this,
+            [this](const QString& i_rPath) { OpenFile(PathFromText(i_rPath.toStdString())); });
+    m_pStartPage = pStart;
+    m_pPlots = new VPlotArea(m_rSession, *m_pActions, m_pCentre);
+    m_pNoPlots = new QWidget(m_pCentre);
+    auto* pNew = new QPushButton(tr("&New Graph Plots window (Ctrl+T)"), m_pNoPlots);
+    connect(pNew, &QPushButton::clicked, m_pActions->Get(EAction::NewPlot), &QAction::trigger);
+    auto* pNoPlotsLayout = new QVBoxLayout(m_pNoPlots);
+    pNoPlotsLayout->addWidget(pNew, 0, Qt::AlignCenter);
+    for (QWidget* pPage : {m_pStartPage, m_pNoPlots, static_cast<QWidget*>(m_pPlots)})
+        m_pCentre->addWidget(pPage);
+    pLayout->addWidget(m_pCentre, 1);
+    setCentralWidget(pColumn);
+}
+
+void VMainWindow::BuildTransport()
+{
+    auto* pBar = new QToolBar(tr("Transport"), this);
+    pBar->setObjectName(QStringLiteral("transport"));
+    pBar->setMovable(false);
+    pBar->toggleViewAction()->setVisible(false); // always there
+    pBar->addWidget(new VTransportBar(m_rSession, *m_pTransport, *m_pActions, pBar));
+    addToolBar(Qt::BottomToolBarArea, pBar);
+}
+
+void VMainWindow::BuildPanels(VLogModel& i_rLog)
+{
+    m_pChannels = new VChannelPanel(m_rSession, *m_pActions, this);
+    m_pLog = new VLogPanel(i_rLog, this);
+    auto* pChannels = AddPanel("channels", tr("Channels"), m_pChannels, Qt::LeftDockWidgetArea, EAction::ShowChannels);
+    auto* pEvents = AddPanel("events", tr("Events"), new VEventList(*m_pTransport, this), Qt::LeftDockWidgetArea,
+                             EAction::ShowEvents);
+    m_pLogDock = AddPanel("logPanel", tr("Log"), m_pLog, Qt::BottomDockWidgetArea, EAction::ShowLog);
+    m_pLogDock->hide();
+    ShowWhichPanels();
+    const int width = fontMetrics().averageCharWidth() * 42;
+    resizeDocks({pChannels, pEvents}, {width, width}, Qt::Horizontal);
+    resizeDocks({pChannels, pEvents}, {3, 1}, Qt::Vertical);
+    resizeDocks({m_pLogDock}, {fontMetrics().lineSpacing() * 12}, Qt::Vertical);
+}
+
+QDockWidget* VMainWindow::AddPanel(const char* i_pName, const QString& i_rTitle, QWidget* i_pPanel,
+                                   Qt::DockWidgetArea i_Area, EAction i_Action)
+{
+    auto* pDock = new QDockWidget(i_rTitle, this);
+    pDock->setObjectName(QString::fromLatin1(i_pName));
+    pDock->setWidget(i_pPanel);
+    addDockWidget(i_Area, pDock);
+    QAction* pAction = m_pActions->Get(i_Action);
+    connect(pAction, &QAction::triggered, pDock, &QWidget::setVisible);
+    // A panel behind another's tab, or of a window that is not shown yet, is not hidden.
+    connect(pDock->toggleViewAction(), &QAction::toggled, pAction, &QAction::setChecked);
+    return pDock;
+}
+
+void VMainWindow::ShowWhichPanels()
+{
+    const std::pair<const char*, EAction> panels[] = {
+        {"channels", EAction::ShowChannels}, {"events", EAction::ShowEvents}, {"logPanel", EAction::ShowLog}};
+    for (const auto& [pName, action] : panels)
+        m_pActions->Get(action)->setChecked(!findChild<QDockWidget*>(QString::fromLatin1(pName))->isHidden());
 }
 
 void VMainWindow::BuildMenus()
 {
-    QMenu* pFile = menuBar()->addMenu(tr("&File"));
-    pFile->addAction(tr("&Open…"), QKeySequence(QKeySequence::Open), this, &VMainWindow::ChooseFile);
-    pFile->addSeparator();
-    pFile->addAction(tr("&Quit"), QKeySequence(QKeySequence::Quit), this, &QWidget::close);
-
-    QMenu* pPlay = menuBar()->addMenu(tr("&Playback"));
-    pPlay->addAction(tr("&Play or pause"), QKeySequence(Qt::Key_Space), m_pTransport, &VTransportBar::TogglePlay);
-    pPlay->addAction(tr("&Next frame"), QKeySequence(Qt::CTRL | Qt::Key_Right), this,
-                     [this] { m_pTransport->StepBy(1); });
-    pPlay->addAction(tr("P&revious frame"), QKeySequence(Qt::CTRL | Qt::Key_Left), this,
-                     [this] { m_pTransport->StepBy(-1); });
-
-    QMenu* pWindow = menuBar()->addMenu(tr("&Window"));
-    pWindow->addAction(tr("New &Graph Plots window"), QKeySequence(QKeySequence::New), this,
-                       [this]
-                       {
-                           std::string error;
-                           OpenPlot(error);
-                       });
-    pWindow->addAction(tr("&Tile"), m_pArea, &QMdiArea::tileSubWindows);
-    pWindow->addAction(tr("&Cascade"), m_pArea, &QMdiArea::cascadeSubWindows);
+    m_pActions->AddMenus(*menuBar());
+    auto* pLive = new QMenu(tr("&Live"), this);
+    menuBar()->insertMenu(m_pActions->Menu(EMenu::Window)->menuAction(), pLive);
+    new VLiveActions(m_rSession, *pLive, *this, [this](const std::string& i_rText) { ShowMessage(i_rText); });
+    m_pFileActions = new VFileActions(m_rSession, *m_pActions, *m_pFiles, *m_pNotices, *this);
+    m_pFileActions->AddRecentMenu(*m_pActions);
+    connect(m_pFileActions, &VFileActions::ProblemsRequested, this, &VMainWindow::ShowLogOfProblems);
 }
 
-void VMainWindow::Subscribe()
+void VMainWindow::ConnectTransport()
 {
-    auto& rHost = m_rSession.Host();
-    m_Subscriptions.Subscribe(
-        rHost.TimeController()->CurrentSourceChanged(), [this] { ShowTreeOfCurrentContext(); }, rHost.Ui());
-    m_Subscriptions.Subscribe(
-        m_rSession.Channels().ContextListChanged(), [this] { ShowTreeOfCurrentContext(); }, rHost.Ui());
-    m_Subscriptions.Subscribe(
-        rHost.Selection()->Changed(), [this](bool) { TakeSelection(); }, rHost.Ui());
-}
-
-void VMainWindow::ShowTreeOfCurrentContext()
-{
-    const auto pContext = m_rSession.CurrentContext();
-    if (!pContext)
+    const auto on = [this](EAction i_Action, auto i_Function)
     {
-        m_pTreeModel->SetLeaves({});
-        return;
-    }
-    const auto channels = ListChannels(*pContext);
-    std::vector<TQL::SelectionItem> known;
-    for (const SelectableChannel& rChannel : channels)
-        known.push_back(rChannel.Item);
-    m_pTreeModel->SetLeaves(MakeLeaves(channels));
-    const auto items = m_Selection.Show(pContext->GetName(), known);
-    m_pTreeModel->SetTicked(items);
-    m_pTree->expandToDepth(channels.size() > 200 ? 0 : 1);
-    m_rSession.Host().Selection()->Set(items);
+        connect(m_pActions->Get(i_Action), &QAction::triggered, m_pTransport, i_Function);
+    };
+    VTransport* pTransport = m_pTransport;
+    on(EAction::Play, &VTransport::TogglePlay);
+    on(EAction::NextFrame, [pTransport] { pTransport->StepBy(1); });
+    on(EAction::PreviousFrame, [pTransport] { pTransport->StepBy(-1); });
+    on(EAction::TenFramesOn, [pTransport] { pTransport->StepBy(10); });
+    on(EAction::TenFramesBack, [pTransport] { pTransport->StepBy(-10); });
+    on(EAction::FirstFrame, &VTransport::GoToStart);
+    on(EAction::LastFrame, &VTransport::GoToEnd);
+    on(EAction::NextEvent, [pTransport] { pTransport->GoToEvent(1); });
+    on(EAction::PreviousEvent, [pTransport] { pTransport->GoToEvent(-1); });
+    on(EAction::Faster, [pTransport] { pTransport->ChangeSpeed(1); });
+    on(EAction::Slower, [pTransport] { pTransport->ChangeSpeed(-1); });
+    on(EAction::NormalSpeed, [pTransport] { pTransport->SetSpeed(1.0); });
+    on(EAction::Loop, &VTransport::SetLooping);
+    on(EAction::LoopStart, &VTransport::MarkLoopStart);
+    on(EAction::LoopEnd, &VTransport::MarkLoopEnd);
+    on(EAction::ClearLoop, &VTransport::ClearMarks);
+    on(EAction::Live, [pTransport] { pTransport->SetLive(true); });
+    on(EAction::Review, [pTransport] { pTransport->SetLive(false); });
 }
 
-void VMainWindow::TakeSelection()
+void VMainWindow::ConnectOther()
 {
-    const auto items = AllItems(*m_rSession.Host().Selection()->GetSelection());
-    if (HoldSameItems(items, m_pTreeModel->Ticked()))
-        return;
-    m_pTreeModel->SetTicked(items);
-    m_Selection.Remember(m_pTreeModel->Ticked());
+    connect(m_pChannels, &VChannelPanel::Left, m_pPlots, &VPlotArea::FocusCurrent);
+    connect(m_pActions->Get(EAction::FindChannel), &QAction::triggered, this,
+            [this]
+            {
+                if (QAction* pShow = m_pActions->Get(EAction::ShowChannels); !pShow->isChecked())
+                    pShow->trigger();
+                m_pChannels->FocusSearch();
+            });
+    connect(m_pPlots, &VPlotArea::Failed, m_pNotices, [this](const QString& i_rText) { m_pNotices->Add(i_rText); });
+    connect(m_pPlots, &VPlotArea::CountChanged, this, &VMainWindow::ShowCentre);
+    connect(m_pActions->Get(EAction::Shortcuts), &QAction::triggered, this,
+            [this]
+            {
+                VShortcutsDialog dialog(*menuBar(), this);
+                dialog.exec();
+            });
+    m_Subscriptions.Subscribe(
+        m_rSession.Host().TimeController()->CurrentSourceChanged(), [this] { ShowCentre(); }, m_rSession.Host().Ui());
 }
 
-void VMainWindow::SetSelection()
+bool VMainWindow::Restore(std::string& o_rError)
 {
-    m_Selection.Remember(m_pTreeModel->Ticked());
-    m_rSession.Host().Selection()->Set(m_pTreeModel->Ticked());
-}
-
-void VMainWindow::ChooseFile()
-{
-    const QStringList paths = QFileDialog::getOpenFileNames(this, tr("Open recordings"), QString(),
-                                                            tr("Motion files (*.c3d *.C3D);;All files (*)"));
-    for (const QString& rPath : paths)
-        OpenFile(PathFromText(rPath.toStdString()));
-}
-
-void VMainWindow::OpenFile(const std::filesystem::path& i_rPath)
-{
-    std::string name, error;
-    if (m_rSession.OpenFile(i_rPath, name, error).IsError())
-    {
-        ShowMessage(error);
-        return;
-    }
-    m_rSession.ShowContext(name);
-    ShowMessage("Opened " + TextFromPath(i_rPath));
-}
-
-bool VMainWindow::OpenPlot(std::string& o_rError)
-{
-    auto* pFrame = new VPlotFrame;
-    QMdiSubWindow* pWindow = m_pArea->addSubWindow(pFrame);
-    pWindow->setAttribute(Qt::WA_DeleteOnClose);
-    if (pFrame->Open(m_rSession, o_rError).IsError())
-    {
-        delete pWindow;
-        ShowMessage(o_rError);
+    WindowLayout layout = ReadLayout(LayoutFile(m_rSession)).value_or(WindowLayout());
+    if (layout.Plots.empty())
+        layout.Plots = TilePlots(1);
+    if (!layout.Geometry.isEmpty())
+        restoreGeometry(layout.Geometry); // puts it onto a screen that is there
+    if (!layout.Panels.isEmpty())
+        restoreState(layout.Panels);
+    ShowWhichPanels();
+    if (!m_pPlots->Restore(layout, o_rError))
         return false;
-    }
-    pFrame->setWindowTitle(tr("Graph Plots %1").arg(++m_PlotNumber));
-    if (m_pArea->subWindowList().size() == 1)
-        pWindow->showMaximized();
-    else
+    if (const auto pStates = StatesFile(m_rSession).empty() ? nullptr : ReadPlotStates(StatesFile(m_rSession)))
     {
-        pWindow->show();
-        m_pArea->tileSubWindows();
+        const auto contents = m_pPlots->Contents();
+        for (std::size_t i = 0; i < contents.size(); ++i)
+            if (contents[i])
+                LoadPlotState(*pStates, i, *contents[i]);
     }
     return true;
 }
 
+void VMainWindow::SaveLayout() const
+{
+    WindowLayout layout;
+    layout.Geometry = saveGeometry();
+    layout.Panels = saveState();
+    m_pPlots->Save(layout);
+    WriteLayout(LayoutFile(m_rSession), layout);
+    if (!StatesFile(m_rSession).empty())
+        SavePlotStates(StatesFile(m_rSession), m_pPlots->Contents());
+}
+
+void VMainWindow::closeEvent(QCloseEvent* i_pEvent)
+{
+    SaveLayout();
+    QMainWindow::closeEvent(i_pEvent);
+}
+
+void VMainWindow::dragEnterEvent(QDragEnterEvent* i_pEvent)
+{
+    if (!LocalFiles(*i_pEvent->mimeData()).empty())
+        i_pEvent->acceptProposedAction();
+}
+
+void VMainWindow::dropEvent(QDropEvent* i_pEvent)
+{
+    OpenFiles(LocalFiles(*i_pEvent->mimeData()));
+    i_pEvent->acceptProposedAction();
+}
+
+void VMainWindow::OpenFiles(std::span<const std::filesystem::path> i_Paths)
+{
+    m_pFileActions->Open(i_Paths);
+}
+
+void VMainWindow::ShowLogOfProblems()
+{
+    m_pLogDock->show();
+    m_pLogDock->raise();
+    m_pLog->ShowProblems();
+}
+
+/// Nothing open: what to do. No plots: how to get one.
+void VMainWindow::ShowCentre()
+{
+    QWidget* pPage = m_pPlots->Count() > 0 ? static_cast<QWidget*>(m_pPlots) : m_pNoPlots;
+    m_pCentre->setCurrentWidget(m_rSession.CurrentContextName().empty() ? m_pStartPage : pPage);
+}
+
+bool VMainWindow::OpenPlot(std::string& o_rError)
+{
+    return m_pPlots->OpenPlot(o_rError);
+}
+
 void VMainWindow::ShowMessage(const std::string& i_rText)
 {
-    statusBar()->showMessage(QString::fromStdString(i_rText));
+    m_pNotices->Add(QString::fromStdString(i_rText));
 }
 
 } // namespace Studio

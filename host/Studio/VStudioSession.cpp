@@ -3,7 +3,6 @@
 #include "ChannelSystemSelection/VChannelSelectionManager.h"
 #include "Channels/ChannelTypes.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VLiveContext.h"
 #include "Channels/VRecordedContext.h"
 #include "OrvanePluginInterface/ITimeController.h"
 #include "Recordings/OpenRecording.h"
@@ -12,11 +11,14 @@
 #include "Services/VPluginHost.h"
 #include "Services/VSelectionSource.h"
 #include "Services/VTimeController.h"
+#include "Services/VTimeSource.h"
 #include "Studio/ContextNames.h"
 #include "Studio/Paths.h"
 #include "Studio/VLiveCapture.h"
-#include "Studio/VSimulatedFeed.h"
+#include "Studio/VOscCapture.h"
 #include "TQL/Log.h"
+
+#include <QtCore/QStandardPaths>
 
 #include <set>
 #include <system_error>
@@ -28,6 +30,24 @@ namespace
 {
 
 constexpr const char* contentKind = "Graph Plots";
+
+/// A session that checks leaves the operator's own folder alone.
+std::filesystem::path FindSettingsFolder(const VStudioSession::Options& i_rOptions)
+{
+    if (!i_rOptions.UserDirectory.empty())
+        return PathFromText(i_rOptions.UserDirectory);
+    if (i_rOptions.bCheck)
+        return {};
+    return PathFromText(QStandardPaths::writableLocation(QStandardPaths::AppConfigLocation).toStdString());
+}
+
+/// What a reader had to guess goes to the log.
+void LogWarnings(const Recordings::VRecording& i_rRecording, const std::filesystem::path& i_rPath)
+{
+    for (const std::string& rWarning : i_rRecording.Warnings)
+        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/VStudioSession", __LINE__,
+                         "%1%: %2%", TextFromPath(i_rPath.filename()), rWarning);
+}
 
 /// What the selection means in channels, for all types of this host. The manager subscribes to the selection by itself,
 /// so the ledger is told that this subscriber is no plug-in's.
@@ -42,7 +62,7 @@ std::shared_ptr<TQL::IChannelSelectionManager> MakeSelectionManager(Services::VH
 
 } // namespace
 
-VStudioSession::VStudioSession(const Options& i_rOptions)
+VStudioSession::VStudioSession(const Options& i_rOptions) : m_SettingsFolder(FindSettingsFolder(i_rOptions))
 {
     Services::HostOptions options;
     options.bChecking = i_rOptions.bCheck;
@@ -65,15 +85,13 @@ TQL::IResult VStudioSession::OpenFile(const std::filesystem::path& i_rPath, std:
     Recordings::VRecording recording;
     if (const TQL::IResult result = Recordings::OpenRecording(i_rPath, recording, o_rError); result.IsError())
         return result;
-    for (const std::string& rWarning : recording.Warnings)
-        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/VStudioSession", __LINE__,
-                         "%1%: %2%", TextFromPath(i_rPath.filename()), rWarning);
-    o_rContextName = AddRecording(std::move(recording));
+    o_rContextName = AddRecording(std::move(recording), i_rPath);
     return TQL::Result::Ok;
 }
 
-std::string VStudioSession::AddRecording(Recordings::VRecording i_Recording)
+std::string VStudioSession::AddRecording(Recordings::VRecording i_Recording, const std::filesystem::path& i_rPath)
 {
+    LogWarnings(i_Recording, i_rPath);
     std::set<std::string> taken;
     for (const auto& rpContext : m_pChannels->GetContexts())
         taken.insert(rpContext->GetName());
@@ -82,7 +100,32 @@ std::string VStudioSession::AddRecording(Recordings::VRecording i_Recording)
         std::make_shared<Channels::VRecordedContext>(
             name, m_pChannels->GetSubTypes(), std::make_shared<const Recordings::VRecording>(std::move(i_Recording))),
         OrvanePluginInterface::ETimeMode::Review);
+    if (!i_rPath.empty())
+        m_Files[name] = i_rPath;
     return name;
+}
+
+bool VStudioSession::ReplaceRecording(const std::string& i_rContextName, Recordings::VRecording i_Recording)
+{
+    const auto pBefore =
+        std::dynamic_pointer_cast<Channels::VRecordedContext>(m_pChannels->FindContext(i_rContextName));
+    if (!pBefore)
+        return false;
+    LogWarnings(i_Recording, FileOf(i_rContextName));
+    const auto pTime = m_pHost->TimeController()->FindSource(i_rContextName);
+    AddContext(std::make_shared<Channels::VRecordedContext>(
+                   i_rContextName, m_pChannels->GetSubTypes(),
+                   std::make_shared<const Recordings::VRecording>(std::move(i_Recording)), pBefore.get()),
+               OrvanePluginInterface::ETimeMode::Review);
+    if (pTime)
+        m_pHost->TimeController()->FindSource(i_rContextName)->SetCurrentTick(pTime->CurrentTick());
+    return true;
+}
+
+std::filesystem::path VStudioSession::FileOf(const std::string& i_rContextName) const
+{
+    const auto file = m_Files.find(i_rContextName);
+    return file == m_Files.end() ? std::filesystem::path() : file->second;
 }
 
 void VStudioSession::AddContext(const std::shared_ptr<Channels::VChannelContext>& i_rpContext, int i_TimeMode)
@@ -93,40 +136,6 @@ void VStudioSession::AddContext(const std::shared_ptr<Channels::VChannelContext>
     m_pChannels->AddContext(i_rpContext);
     const auto pSource = m_pHost->TimeController()->AddSource(rName, i_TimeMode);
     m_TimeFeeds[rName] = std::make_unique<Services::VContextTimeFeed>(i_rpContext, pSource, m_pHost->Ledger());
-}
-
-void VStudioSession::StartLive(std::uint32_t i_Subjects, std::int64_t i_HistoryFrames)
-{
-    StopLive();
-    const auto pContext = std::make_shared<Channels::VLiveContext>(LiveContextName, m_pChannels->GetSubTypes(),
-                                                                   Channels::VLiveContext::Options());
-    Simulation::VWalkSimulator::Options options;
-    options.Subjects = i_Subjects;
-    const auto pFeed = std::make_shared<VSimulatedFeed>(options, pContext);
-    if (i_HistoryFrames > 0)
-        if (const TQL::IResult result = pFeed->Produce(0, i_HistoryFrames); result.IsError())
-            TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error, "Studio/VStudioSession",
-                             __LINE__, "The live capture has no history: %1%", result.Description());
-    AddContext(pContext, OrvanePluginInterface::ETimeMode::Live);
-    m_pCapture = std::make_unique<VLiveCapture>([pFeed](std::int64_t i_First, std::int64_t i_Count)
-                                                { return pFeed->Produce(i_First, i_Count); },
-                                                Simulation::VWalkSimulator::FrameRate, i_HistoryFrames);
-}
-
-void VStudioSession::StopLive()
-{
-    m_pCapture.reset();
-}
-
-void VStudioSession::SetLivePaused(bool i_bPaused)
-{
-    if (m_pCapture)
-        m_pCapture->SetPaused(i_bPaused);
-}
-
-bool VStudioSession::IsLivePaused() const
-{
-    return m_pCapture && m_pCapture->IsPaused();
 }
 
 bool VStudioSession::ShowContext(const std::string& i_rName)

@@ -1,23 +1,25 @@
 #include "Studio/VTransportBar.h"
 
 #include "Services/VTimeController.h"
-#include "Services/VTimeSource.h"
 #include "Services/VUiPostalService.h"
 #include "Studio/TimeText.h"
+#include "Studio/TransportIcons.h"
+#include "Studio/TransportRules.h"
+#include "Studio/VMainActions.h"
 #include "Studio/VStudioSession.h"
-#include "TQL/ITick.h"
+#include "Studio/VTimeSlider.h"
+#include "Studio/VTransport.h"
 
+#include <QtCore/QLocale>
 #include <QtCore/QSignalBlocker>
+#include <QtGui/QAction>
 #include <QtWidgets/QComboBox>
 #include <QtWidgets/QHBoxLayout>
 #include <QtWidgets/QLabel>
-#include <QtWidgets/QSlider>
 #include <QtWidgets/QSpinBox>
-#include <QtWidgets/QStyle>
 #include <QtWidgets/QToolButton>
 
 #include <algorithm>
-#include <chrono>
 #include <limits>
 
 namespace Studio
@@ -26,168 +28,218 @@ namespace Studio
 namespace
 {
 
-constexpr std::chrono::milliseconds refreshPeriod{40};
-
 int ToInt(std::int64_t i_Value)
 {
     return static_cast<int>(
         std::clamp<std::int64_t>(i_Value, std::numeric_limits<int>::min(), std::numeric_limits<int>::max()));
 }
 
+QLabel* MakeTimeLabel(const char* i_pName, const QString& i_rToolTip, const QString& i_rWidest, QWidget* i_pParent)
+{
+    auto* pLabel = new QLabel(i_pParent);
+    pLabel->setObjectName(QString::fromLatin1(i_pName));
+    pLabel->setToolTip(i_rToolTip);
+    pLabel->setAccessibleName(i_rToolTip);
+    pLabel->setAlignment(Qt::AlignRight | Qt::AlignVCenter);
+    pLabel->setMinimumWidth(pLabel->fontMetrics().horizontalAdvance(i_rWidest));
+    return pLabel;
+}
+
 } // namespace
 
-VTransportBar::VTransportBar(VStudioSession& i_rSession, QWidget* i_pParent)
+VTransportBar::VTransportBar(VStudioSession& i_rSession, VTransport& i_rTransport, VMainActions& i_rActions,
+                             QWidget* i_pParent)
     : QWidget(i_pParent)
     , m_rSession(i_rSession)
-    , m_pController(i_rSession.Host().TimeController())
+    , m_rTransport(i_rTransport)
+    , m_rActions(i_rActions)
     , m_Subscriptions(i_rSession.Host().Ledger())
-    , m_SourceSubscription(i_rSession.Host().Ledger())
 {
-    BuildControls();
-    m_TimeRefresh.setSingleShot(true);
-    m_TimeRefresh.setInterval(refreshPeriod);
-    connect(&m_TimeRefresh, &QTimer::timeout, this, &VTransportBar::RefreshTime);
-    Subscribe();
+    auto* pLayout = new QHBoxLayout(this);
+    BuildSource(*pLayout);
+    AddButtons(*pLayout, {EAction::FirstFrame, EAction::PreviousEvent, EAction::PreviousFrame, EAction::Play,
+                          EAction::NextFrame, EAction::NextEvent, EAction::LastFrame});
+    BuildPosition(*pLayout);
+    BuildTime(*pLayout);
+    ShowIcons();
+    Connect();
     RefreshSources();
-    RefreshCurrent();
+    Refresh();
 }
 
 VTransportBar::~VTransportBar() = default;
 
-void VTransportBar::BuildControls()
+void VTransportBar::BuildSource(QBoxLayout& o_rLayout)
 {
     m_pContexts = new QComboBox(this);
     m_pContexts->setObjectName(QStringLiteral("contexts"));
+    m_pContexts->setAccessibleName(tr("What is shown"));
     m_pContexts->setToolTip(tr("What is shown: the live capture or a recording"));
     m_pContexts->setSizeAdjustPolicy(QComboBox::AdjustToContents);
-    m_pPlay = new QToolButton(this);
-    m_pPlay->setObjectName(QStringLiteral("play"));
-    m_pPlay->setAutoRaise(true);
-    m_pSlider = new QSlider(Qt::Horizontal, this);
-    m_pSlider->setObjectName(QStringLiteral("position"));
-    m_pFrame = new QSpinBox(this);
-    m_pFrame->setObjectName(QStringLiteral("frame"));
-    m_pFrame->setToolTip(tr("Frame"));
-    m_pFrame->setKeyboardTracking(false);
-    m_pTime = new QLabel(this);
-    m_pTime->setObjectName(QStringLiteral("time"));
-    m_pTime->setMinimumWidth(m_pTime->fontMetrics().horizontalAdvance(QStringLiteral("00:00:00.000")));
-    m_pTime->setAlignment(Qt::AlignRight | Qt::AlignVCenter);
-
-    auto* pLayout = new QHBoxLayout(this);
-    pLayout->setContentsMargins(6, 3, 6, 3);
-    pLayout->addWidget(m_pContexts);
-    pLayout->addWidget(m_pPlay);
-    pLayout->addWidget(m_pSlider, 1);
-    pLayout->addWidget(m_pFrame);
-    pLayout->addWidget(m_pTime);
-
-    connect(m_pContexts, &QComboBox::activated, this,
-            [this](int) { m_rSession.ShowContext(m_pContexts->currentText().toStdString()); });
-    connect(m_pPlay, &QToolButton::clicked, this, &VTransportBar::TogglePlay);
-    connect(m_pSlider, &QSlider::valueChanged, this, [this](int i_Frame) { SeekToFrame(i_Frame); });
-    connect(m_pFrame, &QSpinBox::valueChanged, this, [this](int i_Frame) { SeekToFrame(i_Frame); });
+    o_rLayout.addWidget(m_pContexts);
+    AddButtons(o_rLayout, {EAction::Live, EAction::Review});
 }
 
-void VTransportBar::Subscribe()
+void VTransportBar::BuildPosition(QBoxLayout& o_rLayout)
 {
+    m_pSlider = new VTimeSlider(this);
+    o_rLayout.addWidget(m_pSlider, 1);
+    m_pFrame = new QSpinBox(this);
+    m_pFrame->setObjectName(QStringLiteral("frame"));
+    m_pFrame->setAccessibleName(tr("Frame"));
+    m_pFrame->setToolTip(tr("Frame"));
+    m_pFrame->setKeyboardTracking(false);
+    m_pFrame->setGroupSeparatorShown(false);
+    m_pFrame->setFocusPolicy(Qt::StrongFocus);
+    o_rLayout.addWidget(m_pFrame);
+}
+
+void VTransportBar::BuildTime(QBoxLayout& o_rLayout)
+{
+    m_pTime = MakeTimeLabel("time", tr("Time"), QStringLiteral("00:00:00.000"), this);
+    m_pTimecode = MakeTimeLabel("timecode", tr("Timecode: hours, minutes, seconds, frames"),
+                                QStringLiteral("00:00:00:000"), this);
+    m_pSpeed = new QComboBox(this);
+    m_pSpeed->setObjectName(QStringLiteral("speed"));
+    m_pSpeed->setAccessibleName(tr("Speed"));
+    m_pSpeed->setToolTip(tr("Speed of play (Ctrl+Up, Ctrl+Down)"));
+    for (const double speed : PlaySpeeds())
+        m_pSpeed->addItem(QLocale().toString(speed) + QStringLiteral(" ×"), speed);
+    o_rLayout.addWidget(m_pTime);
+    o_rLayout.addWidget(m_pTimecode);
+    o_rLayout.addWidget(m_pSpeed);
+    AddButtons(o_rLayout, {EAction::Loop});
+}
+
+void VTransportBar::AddButtons(QBoxLayout& o_rLayout, std::initializer_list<EAction> i_Actions)
+{
+    for (const EAction action : i_Actions)
+    {
+        auto* pButton = new QToolButton(this);
+        pButton->setDefaultAction(m_rActions.Get(action));
+        pButton->setObjectName(m_rActions.Get(action)->objectName() + QStringLiteral("Button"));
+        pButton->setAccessibleName(m_rActions.Get(action)->iconText());
+        pButton->setFocusPolicy(Qt::TabFocus);
+        pButton->setAutoRaise(true);
+        o_rLayout.addWidget(pButton);
+    }
+}
+
+void VTransportBar::Connect()
+{
+    connect(m_pContexts, &QComboBox::activated, this,
+            [this](int) { m_rSession.ShowContext(m_pContexts->currentText().toStdString()); });
+    connect(m_pSpeed, &QComboBox::activated, this,
+            [this](int i_Row) { m_rTransport.SetSpeed(m_pSpeed->itemData(i_Row).toDouble()); });
+    connect(m_pSlider, &QSlider::valueChanged, &m_rTransport, &VTransport::SeekToFrame);
+    connect(m_pFrame, &QSpinBox::valueChanged, &m_rTransport, &VTransport::SeekToFrame);
+    connect(&m_rTransport, &VTransport::Changed, this, &VTransportBar::Refresh);
+    connect(&m_rTransport, &VTransport::EventsChanged, this,
+            [this]
+            {
+                m_pSlider->SetEvents(m_rTransport.Events());
+                Refresh();
+            });
+    m_pSlider->SetEvents(m_rTransport.Events());
+    const auto& rpController = m_rSession.Host().TimeController();
     const auto& rpUi = m_rSession.Host().Ui();
     m_Subscriptions.Subscribe(
-        m_pController->SourceListChanged(), [this] { RefreshSources(); }, rpUi);
+        rpController->SourceListChanged(), [this] { RefreshSources(); }, rpUi);
     m_Subscriptions.Subscribe(
-        m_pController->CurrentSourceChanged(), [this] { RefreshCurrent(); }, rpUi);
-    m_Subscriptions.Subscribe(
-        m_pController->PlayChanged(), [this] { RefreshTime(); }, rpUi);
+        rpController->CurrentSourceChanged(), [this] { RefreshSources(); }, rpUi);
 }
 
 void VTransportBar::RefreshSources()
 {
     const QSignalBlocker blocker(m_pContexts);
     m_pContexts->clear();
-    for (const std::string& rName : m_pController->GetSourceMap()->GetNames())
+    for (const std::string& rName : m_rSession.Host().TimeController()->GetSourceMap()->GetNames())
         m_pContexts->addItem(QString::fromStdString(rName));
-    m_pContexts->setCurrentText(QString::fromStdString(m_rSession.CurrentContextName()));
-}
-
-void VTransportBar::RefreshCurrent()
-{
-    const QSignalBlocker blocker(m_pContexts);
     m_pContexts->setCurrentIndex(m_pContexts->findText(QString::fromStdString(m_rSession.CurrentContextName())));
-    m_SourceSubscription.Drain();
-    if (const auto pSource = m_pController->GetCurrentSource())
-        m_SourceSubscription.Subscribe(
-            pSource->StateChanged(), [this] { RefreshTimeSoon(); }, m_rSession.Host().Ui());
-    RefreshTime();
+    m_pContexts->setEnabled(m_pContexts->count() > 0);
 }
 
-void VTransportBar::RefreshTimeSoon()
+void VTransportBar::Refresh()
 {
-    if (!m_TimeRefresh.isActive())
-        m_TimeRefresh.start();
+    const TransportState state = m_rTransport.State();
+    RefreshActions(state);
+    RefreshPosition(state);
 }
 
-void VTransportBar::RefreshTime()
+void VTransportBar::ShowIcons()
 {
-    const auto pSource = m_pController->GetCurrentSource();
-    OrvanePluginInterface::TimeState state;
-    const bool bState = pSource && pSource->GetTimeState(state) && state.FramePeriodTicks > 0;
-    const bool bLive = IsLive();
-    const bool bRunning = bLive ? !m_rSession.IsLivePaused() : m_pController->IsPlaying();
-    m_pPlay->setIcon(style()->standardIcon(bRunning ? QStyle::SP_MediaPause : QStyle::SP_MediaPlay));
-    m_pPlay->setToolTip(bRunning ? tr("Pause (Space)") : tr("Play (Space)"));
-    m_pPlay->setEnabled(pSource != nullptr);
-    m_pSlider->setEnabled(bState && !bLive);
-    m_pFrame->setEnabled(bState && !bLive);
-    if (!bState)
+    static constexpr struct
+    {
+        EAction Action;
+        ETransportIcon Icon;
+    } rows[] = {{EAction::FirstFrame, ETransportIcon::First},
+                {EAction::PreviousEvent, ETransportIcon::PreviousEvent},
+                {EAction::NextEvent, ETransportIcon::NextEvent},
+                {EAction::PreviousFrame, ETransportIcon::PreviousFrame},
+                {EAction::NextFrame, ETransportIcon::NextFrame},
+                {EAction::LastFrame, ETransportIcon::Last},
+                {EAction::Loop, ETransportIcon::Loop}};
+    for (const auto& rRow : rows)
+        m_rActions.Get(rRow.Action)->setIcon(MakeTransportIcon(rRow.Icon, palette()));
+}
+
+void VTransportBar::ShowRunning(bool i_bRunning)
+{
+    if (m_bShownRunning == i_bRunning)
+        return;
+    m_bShownRunning = i_bRunning;
+    QAction* pPlay = m_rActions.Get(EAction::Play);
+    pPlay->setIcon(MakeTransportIcon(i_bRunning ? ETransportIcon::Pause : ETransportIcon::Play, palette()));
+    pPlay->setToolTip(i_bRunning ? tr("Pause (Space)") : tr("Play (Space)"));
+}
+
+void VTransportBar::RefreshActions(const TransportState& i_rState)
+{
+    ShowRunning(i_rState.bRunning);
+    m_rActions.Get(EAction::Play)->setEnabled(i_rState.bSource);
+    const bool bReview = i_rState.bRange && !i_rState.bLive;
+    for (const EAction action :
+         {EAction::NextFrame, EAction::PreviousFrame, EAction::TenFramesOn, EAction::TenFramesBack, EAction::FirstFrame,
+          EAction::LastFrame, EAction::LoopStart, EAction::LoopEnd})
+        m_rActions.Get(action)->setEnabled(bReview);
+    for (const EAction action : {EAction::NextEvent, EAction::PreviousEvent})
+        m_rActions.Get(action)->setEnabled(bReview && !m_rTransport.Events().empty());
+    m_rActions.Get(EAction::ClearLoop)->setEnabled(!i_rState.Marks.IsEmpty());
+    m_rActions.Get(EAction::Loop)->setChecked(i_rState.bLooping);
+    m_rActions.Get(EAction::Live)->setEnabled(m_rTransport.HasCapture());
+    m_rActions.Get(EAction::Review)->setEnabled(i_rState.bSource);
+    m_rActions.Get(i_rState.bLive ? EAction::Live : EAction::Review)->setChecked(i_rState.bSource);
+    const QSignalBlocker blocker(m_pSpeed);
+    m_pSpeed->setEnabled(bReview);
+    m_pSpeed->setCurrentIndex(m_pSpeed->findData(i_rState.Speed));
+}
+
+void VTransportBar::RefreshPosition(const TransportState& i_rState)
+{
+    const bool bReview = i_rState.bRange && !i_rState.bLive;
+    m_pSlider->setEnabled(bReview);
+    m_pFrame->setEnabled(bReview);
+    if (!i_rState.bRange)
     {
         m_pTime->clear();
+        m_pTimecode->clear();
         return;
     }
-    const std::int64_t period = state.FramePeriodTicks;
-    const std::int64_t first = TQL::FloorDivide(state.FirstTick, period);
-    const std::int64_t last = first + std::max<std::int64_t>(1, state.LengthTicks / period) - 1;
-    const std::int64_t frame = TQL::FloorDivide(state.CurrentTick, period);
     const QSignalBlocker sliderBlocker(m_pSlider);
     const QSignalBlocker frameBlocker(m_pFrame);
-    m_pSlider->setRange(ToInt(first), ToInt(last));
-    m_pSlider->setPageStep(std::max(1, ToInt((last - first) / 20)));
-    m_pFrame->setRange(ToInt(first), ToInt(last));
+    m_pSlider->setRange(ToInt(i_rState.First), ToInt(i_rState.Last));
+    m_pSlider->setPageStep(std::max(1, ToInt((i_rState.Last - i_rState.First) / 20)));
+    const std::int64_t period = i_rState.FramePeriod;
+    m_pSlider->SetLoop(i_rState.bLooping ? TQL::TickRange{i_rState.Marks.First / period, i_rState.Marks.Last / period}
+                                         : TQL::TickRange());
+    m_pFrame->setRange(ToInt(i_rState.First), ToInt(i_rState.Last));
     if (!m_pSlider->isSliderDown())
-        m_pSlider->setValue(ToInt(frame));
-    if (!m_pFrame->hasFocus() || bRunning)
-        m_pFrame->setValue(ToInt(frame));
-    m_pTime->setText(QString::fromStdString(FormatTime(state.CurrentTick)));
-}
-
-bool VTransportBar::IsLive() const
-{
-    const auto pSource = m_pController->GetCurrentSource();
-    return pSource && pSource->GetMode() == OrvanePluginInterface::ETimeMode::Live;
-}
-
-void VTransportBar::TogglePlay()
-{
-    if (IsLive())
-        m_rSession.SetLivePaused(!m_rSession.IsLivePaused());
-    else if (m_pController->IsPlaying())
-        m_pController->Pause();
-    else
-        m_pController->Play();
-    RefreshTime();
-}
-
-void VTransportBar::StepBy(std::int64_t i_Frames)
-{
-    if (m_pFrame->isEnabled())
-        SeekToFrame(m_pFrame->value() + i_Frames);
-}
-
-void VTransportBar::SeekToFrame(std::int64_t i_Frame)
-{
-    OrvanePluginInterface::TimeState state;
-    const auto pSource = m_pController->GetCurrentSource();
-    if (pSource && pSource->GetTimeState(state))
-        m_pController->SeekTo(i_Frame * state.FramePeriodTicks);
+        m_pSlider->setValue(ToInt(i_rState.Frame));
+    const bool bTyping = m_pFrame->hasFocus() && m_pFrame->cleanText() != QString::number(m_pFrame->value());
+    if (!bTyping || i_rState.bRunning)
+        m_pFrame->setValue(ToInt(i_rState.Frame));
+    m_pTime->setText(QString::fromStdString(FormatTime(i_rState.Tick)));
+    m_pTimecode->setText(QString::fromStdString(FormatTimecode(i_rState.Tick, period)));
 }
 
 } // namespace Studio

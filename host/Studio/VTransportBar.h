@@ -2,65 +2,62 @@
 
 #include "Services/VHostSubscriptions.h"
 
-#include <QtCore/QTimer>
 #include <QtWidgets/QWidget>
 
-#include <cstdint>
-#include <memory>
+#include <initializer_list>
+#include <optional>
 
+class QBoxLayout;
 class QComboBox;
 class QLabel;
-class QSlider;
 class QSpinBox;
-class QToolButton;
-
-namespace Services
-{
-class VTimeController;
-}
 
 namespace Studio
 {
 
+class VMainActions;
 class VStudioSession;
+class VTimeSlider;
+class VTransport;
+enum class EAction;
+struct TransportState;
 
-/// The bar at the foot of the window: which context is shown (the live capture or a recording), play and pause, and
-/// where it stands. In review the slider and the frame number seek; in live they follow, and pause holds the capture.
-/// The session outlives it. UI thread.
+/// The bar at the foot of the window: which context is shown, live or review, play and the ways to move, and where the
+/// time stands. A view of the transport, with the buttons of the window's actions. Session, transport and actions
+/// outlive it. UI thread.
 class VTransportBar : public QWidget
 {
     Q_OBJECT
 
 public:
-    explicit VTransportBar(VStudioSession& i_rSession, QWidget* i_pParent = nullptr);
+    VTransportBar(VStudioSession& i_rSession, VTransport& i_rTransport, VMainActions& i_rActions,
+                  QWidget* i_pParent = nullptr);
     ~VTransportBar() override;
 
-    /// Plays or pauses, whichever is not the case.
-    void TogglePlay();
-
-    /// Moves by frames in review; no effect in live.
-    void StepBy(std::int64_t i_Frames);
-
 private:
-    void BuildControls();
-    void Subscribe();
+    void BuildSource(QBoxLayout& o_rLayout);
+    void BuildTime(QBoxLayout& o_rLayout);
+    void BuildPosition(QBoxLayout& o_rLayout);
+    void AddButtons(QBoxLayout& o_rLayout, std::initializer_list<EAction> i_Actions);
+    void Connect();
     void RefreshSources();
-    void RefreshCurrent();
-    void RefreshTime();
-    void RefreshTimeSoon();
-    void SeekToFrame(std::int64_t i_Frame);
-    bool IsLive() const;
+    void Refresh();
+    void ShowIcons();
+    void ShowRunning(bool i_bRunning);
+    void RefreshActions(const TransportState& i_rState);
+    void RefreshPosition(const TransportState& i_rState);
 
     VStudioSession& m_rSession;
-    const std::shared_ptr<Services::VTimeController> m_pController;
+    VTransport& m_rTransport;
+    VMainActions& m_rActions;
     QComboBox* m_pContexts = nullptr;
-    QToolButton* m_pPlay = nullptr;
-    QSlider* m_pSlider = nullptr;
+    QComboBox* m_pSpeed = nullptr;
+    VTimeSlider* m_pSlider = nullptr;
     QSpinBox* m_pFrame = nullptr;
     QLabel* m_pTime = nullptr;
-    QTimer m_TimeRefresh; ///< a capture moves faster than anyone reads
+    QLabel* m_pTimecode = nullptr;
+    std::optional<bool> m_bShownRunning;
     Services::VHostSubscriptions m_Subscriptions;
-    Services::VHostSubscriptions m_SourceSubscription; ///< of the current source
 };
 
 } // namespace Studio

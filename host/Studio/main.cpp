@@ -65,6 +65,10 @@ int Run(const CommandLine& i_rCommandLine, int& o_rArgumentCount, char** o_ppArg
         return RunChannels(i_rCommandLine, o_rError);
     case ECommand::Export:
         return RunExport(i_rCommandLine, o_rError);
+    case ECommand::CheckStore:
+        return RunCheckStore(i_rCommandLine, o_rError);
+    case ECommand::Record:
+        return RunRecord(i_rCommandLine, o_rError);
     case ECommand::Window:
     case ECommand::Snapshot:
         break;
@@ -91,7 +95,7 @@ int main(int i_ArgumentCount, char** i_ppArguments)
     int status = StatusFailed;
     if (ParseCommandLine(words, commandLine, error).IsSuccess())
         status = Run(commandLine, i_ArgumentCount, i_ppArguments, error);
-    if (status != StatusOk)
+    if (status == StatusFailed)
         std::fprintf(stderr, "graphplots-studio: %s\n", OneLine(error).c_str());
     return status;
 }

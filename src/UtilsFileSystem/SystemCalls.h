@@ -79,6 +79,13 @@ void UnmapView(void* i_pView, std::uint64_t i_Length);
 /// Gives back the memory of a view for reading; the file is read again where the view is touched again.
 void ForgetView(void* i_pView, std::uint64_t i_Length);
 
+/// Lets reads of a view go on with zeros where another program has shortened the file, instead of ending the process.
+/// Gives a number for the two calls below; negative where there is no guard, because the system needs none or because
+/// too many views are guarded already. The guard is released before its view is unmapped.
+int GuardView(void* i_pView, std::uint64_t i_Length);
+bool HasGuardActed(int i_Guard); ///< zeros were read
+void ReleaseGuard(int i_Guard);
+
 /// The bytes that the file has now, 0 where that cannot be told.
 std::uint64_t GetSizeNow(const MappedFile& i_rFile);
 

@@ -2,6 +2,8 @@
 
 #include "UtilsFileSystem/FileResult.h"
 
+#include <algorithm>
+
 namespace UtilsFileSystem
 {
 namespace
@@ -41,6 +43,7 @@ void VMemoryMappedFileBase::CloseFile()
 {
     {
         const std::lock_guard lock(m_Mutex);
+        ReleaseGuards();
         for (const auto& [base, length] : m_Views)
             System::UnmapView(reinterpret_cast<void*>(base), length);
         m_Views.clear();
@@ -71,6 +74,29 @@ void VMemoryMappedFileBase::ForgetViews()
         System::ForgetView(reinterpret_cast<void*>(base), length);
 }
 
+void VMemoryMappedFileBase::GuardViews()
+{
+    const std::lock_guard lock(m_Mutex);
+    ReleaseGuards();
+    for (const auto& [base, length] : m_Views)
+        if (const int guard = System::GuardView(reinterpret_cast<void*>(base), length); guard >= 0)
+            m_Guards.push_back(guard);
+}
+
+bool VMemoryMappedFileBase::IsStillWhole()
+{
+    const std::lock_guard lock(m_Mutex);
+    return System::GetSizeNow(m_File) >= m_File.Size && std::ranges::none_of(m_Guards, System::HasGuardActed);
+}
+
+/// Under the mutex.
+void VMemoryMappedFileBase::ReleaseGuards()
+{
+    for (const int guard : m_Guards)
+        System::ReleaseGuard(guard);
+    m_Guards.clear();
+}
+
 void VMemoryMappedFileBase::UnmapView(const std::byte* i_pView)
 {
     const std::lock_guard lock(m_Mutex);
@@ -80,6 +106,7 @@ void VMemoryMappedFileBase::UnmapView(const std::byte* i_pView)
     --found;
     if (reinterpret_cast<std::uintptr_t>(i_pView) - found->first >= found->second)
         return;
+    ReleaseGuards(); // nobody unmaps single views of a file that is guarded, but none shall outlive its view
     System::UnmapView(reinterpret_cast<void*>(found->first), found->second);
     m_Views.erase(found);
 }

@@ -9,6 +9,7 @@
 #include <mutex>
 #include <string>
 #include <utility>
+#include <vector>
 
 namespace UtilsFileSystem
 {
@@ -43,8 +44,12 @@ public:
     /// Gives back the memory that the views of an input file hold; where they are read again, so is the file.
     void ForgetViews();
 
-    /// Whether the open file still has all its bytes. Another program may have shortened it.
-    bool IsStillWhole() const { return System::GetSizeNow(m_File) >= m_File.Size; }
+    /// From now on reads of the views that there are give zeros where another program has shortened the file, instead
+    /// of ending the process, as far as the system can do that. Ask IsStillWhole before what was read is believed.
+    void GuardViews();
+
+    /// Whether the open file still has all its bytes, and had them whenever a guarded view was read.
+    bool IsStillWhole();
 
 protected:
     std::uint64_t GetFileSize() const { return m_File.Size; }
@@ -53,8 +58,11 @@ private:
     TQL::IResult Open(const std::string& i_rPath, System::EMapping i_Mapping, std::uint64_t i_Size);
 
     System::MappedFile m_File;
+    void ReleaseGuards();
+
     std::mutex m_Mutex;
     std::map<std::uintptr_t, std::uint64_t> m_Views; // base address to length; guarded by m_Mutex
+    std::vector<int> m_Guards;                       // guarded by m_Mutex
     const std::uint64_t m_Granularity = System::GetAllocationGranularity();
 };
 

@@ -11,7 +11,7 @@ namespace UtilsFileSystem
 
 /// Reads a file through one view of the whole of it, or through the two pages used last where the whole cannot be
 /// mapped or a window size is asked for. Belongs to one thread at a time. Another program that shortens the file
-/// meanwhile makes reads fault, as with every mapping.
+/// meanwhile makes reads fault, as with every mapping, unless GuardViews was called.
 class VMemoryMappedInputFile : private VMemoryMappedFileBase
 {
 public:
@@ -30,6 +30,7 @@ public:
     void Close();
 
     using VMemoryMappedFileBase::ForgetViews;
+    using VMemoryMappedFileBase::GuardViews;
     using VMemoryMappedFileBase::IsOpen;
     using VMemoryMappedFileBase::IsStillWhole;
 

@@ -33,11 +33,12 @@ const std::map<std::string, Rooms> s_Below = {
      {"NotificationSystem", "ChannelSystem", "OrvanePluginInterface", "CoreGraphics", "IOInterfaceQt"}},
     {"GraphPlotUI", {"GraphPlotSystem", "ZarvoQtQuick"}},
     {"GraphPlotUIOrvane", {"GraphPlotUI", "StoreIO"}},
-    {"Recordings", {"TQL"}},
+    {"Recordings", {"UtilsFileSystem"}},
     {"Simulation", {"Recordings"}},
     {"Channels", {"Recordings", "NotificationSystem", "ChannelSystem"}},
-    {"Services", {"Channels", "OrvanePluginInterface", "CoreGraphics", "ChannelSystemSelection"}},
-    {"Studio", {"Services", "Simulation"}},
+    {"Streaming", {"Channels"}},
+    {"Services", {"Channels", "OrvanePluginInterface", "CoreGraphics", "ChannelSystemSelection", "StoreIO"}},
+    {"Studio", {"Services", "Simulation", "Streaming"}},
 };
 
 Rooms Reachable(const std::string& i_rRoom)
@@ -49,9 +50,10 @@ Rooms Reachable(const std::string& i_rRoom)
 }
 
 /// Those that build without Qt.
-const Rooms s_WithoutQt = {"StoreInterface",         "Store",      "StoreParameters",    "StoreIO",
-                           "UtilsFileSystem",        "TQL",        "NotificationSystem", "ChannelSystem",
-                           "ChannelSystemSelection", "Recordings", "Simulation",         "Channels"};
+const Rooms s_WithoutQt = {
+    "StoreInterface",     "Store",         "StoreParameters",        "StoreIO",    "UtilsFileSystem", "TQL",
+    "NotificationSystem", "ChannelSystem", "ChannelSystemSelection", "Recordings", "Simulation",      "Channels",
+    "Streaming"};
 
 /// What stands between the delimiters of an include line, with its opening delimiter; empty for any other line.
 std::string_view IncludeOf(std::string_view i_Line)
@@ -97,6 +99,24 @@ TEST(Architecture, IncludesFollowTheArrows)
     }
     EXPECT_GT(files, 100) << "the sources were not found";
     EXPECT_GT(arrows, files) << "the include lines were not understood";
+}
+
+/// An example shows what an application would write: it stays small, and knows the module by its file alone.
+TEST(Architecture, TheMinimalHostStaysMinimal)
+{
+    int lines = 0;
+    const auto folder = std::filesystem::path(GRAPHPLOTS_SOURCE_DIR) / "examples" / "minimal-host";
+    for (const auto& rEntry : std::filesystem::directory_iterator(folder))
+    {
+        std::ifstream file(rEntry.path());
+        for (std::string line; std::getline(file, line); ++lines)
+        {
+            const std::string_view included = IncludeOf(line);
+            EXPECT_FALSE(included.starts_with("\"GraphPlot") || included.starts_with("\"Studio/")) << line;
+        }
+    }
+    EXPECT_GT(lines, 0);
+    EXPECT_LE(lines, 250);
 }
 
 } // namespace

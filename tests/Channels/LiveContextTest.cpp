@@ -138,8 +138,8 @@ TEST_F(LiveContext, BadBatchesAppendNothing)
 
 TEST_F(LiveContext, KeepsTheHistoryThatItMayAndForgetsTheRest)
 {
-    // 3 marker values and 2 x 10 device values a frame, 12 bytes each.
-    constexpr std::uint64_t bytesPerFrame = 23 * 12;
+    // 3 marker values and 2 x 10 device values a frame, 6 bytes each.
+    constexpr std::uint64_t bytesPerFrame = 23 * 6 + 1;
     struct Case
     {
         std::int64_t HistoryFrames;

@@ -100,6 +100,26 @@ TEST(Summary, BucketsCoverEverySampleOnce)
     EXPECT_TRUE(IsSame(Channels::Combine({}), LodRecord{}));
 }
 
+/// Compares records of i_RowsEach rows with the slow way.
+void ExpectRecords(std::span<const LodRecord> i_Records, std::span<const float> i_Rows, std::size_t i_Width,
+                   std::size_t i_RowsEach)
+{
+    for (std::size_t i = 0; i < i_Records.size(); ++i)
+    {
+        const std::size_t first = i / i_Width * i_RowsEach * i_Width;
+        const auto column = i_Rows.subspan(first + i % i_Width, i_RowsEach * i_Width - i % i_Width);
+        ASSERT_TRUE(IsSame(i_Records[i], SlowSummary(column, i_Width)))
+            << i_Width << " wide, record " << i << " of " << i_RowsEach << " rows";
+    }
+}
+
+std::vector<LodRecord> UnpackAll(const std::vector<Channels::PackedRecord>& i_rRecords)
+{
+    std::vector<LodRecord> records(i_rRecords.size());
+    Channels::Unpack(i_rRecords.data(), records.size(), records.data());
+    return records;
+}
+
 TEST(Summary, RecordsOfFewRowsAgreeWithTheSlowWay)
 {
     // Every pattern of missing samples among four rows of two components.
@@ -108,71 +128,51 @@ TEST(Summary, RecordsOfFewRowsAgreeWithTheSlowWay)
         std::array<float, 8> rows{};
         for (unsigned i = 0; i < rows.size(); ++i)
             rows[i] = (pattern >> i & 1) != 0 ? NaN : static_cast<float>(i) - 3.0f;
-        const std::span<const float> all(rows);
-        std::array<LodRecord, 4> pairs;
-        Channels::SummarisePairs(rows.data(), 2, 2, pairs.data());
-        std::array<Channels::PackedRecord, 4> packed;
-        Channels::SummariseFours(rows.data(), 2, 1, packed.data());
-        Channels::SummariseFours(rows.data(), 2, 1, packed.data() + 2);
-        std::array<Channels::PackedRecord, 2> combined;
-        Channels::CombinePairs(packed.data(), 2, 1, combined.data());
-        for (std::size_t c = 0; c < 2; ++c)
+        for (const std::size_t rowsEach : {2u, 4u})
         {
-            EXPECT_TRUE(IsSame(pairs[c], SlowSummary(all.subspan(c, 3), 2))) << pattern;
-            EXPECT_TRUE(IsSame(pairs[2 + c], SlowSummary(all.subspan(4 + c), 2))) << pattern;
-            LodRecord four;
-            Channels::Unpack(&packed[c], 1, &four);
-            EXPECT_TRUE(IsSame(four, SlowSummary(all.subspan(c), 2))) << pattern;
-            LodRecord twice;
-            Channels::Unpack(&combined[c], 1, &twice);
-            four.Count *= 2;
-            EXPECT_TRUE(IsSame(twice, four)) << pattern;
+            std::vector<LodRecord> records(2 * 4 / rowsEach);
+            Channels::SummariseFew(rows.data(), 2, rowsEach, 4 / rowsEach, records.data());
+            ExpectRecords(records, rows, 2, rowsEach);
         }
     }
 }
 
-TEST(Summary, RecordsOfFewRowsForEveryWidthAndOfExtremeValues)
+TEST(Summary, RecordsForEveryWidthAndOfExtremeValues)
 {
     constexpr float huge = std::numeric_limits<float>::max();
     for (std::size_t width = 1; width <= 13; ++width)
     {
-        constexpr std::size_t records = 5;
-        std::vector<float> rows = RandomSamples(records * 4 * width, static_cast<std::uint32_t>(width));
-        std::fill_n(rows.begin(), 2 * width, huge);
+        constexpr std::size_t count = 128; // rows
+        std::vector<float> rows = RandomSamples(count * width, static_cast<std::uint32_t>(width));
+        std::fill_n(rows.begin(), 4 * width, huge);
+        std::fill_n(rows.begin() + static_cast<std::ptrdiff_t>(32 * width), 20 * width, NaN);
         rows[rows.size() - 1] = Infinity;
-        std::vector<LodRecord> pairs(2 * records * width);
-        Channels::SummarisePairs(rows.data(), width, 2 * records, pairs.data());
-        std::vector<Channels::PackedRecord> packed(records * width);
-        Channels::SummariseFours(rows.data(), width, records, packed.data());
-        std::vector<LodRecord> fours(packed.size());
-        Channels::Unpack(packed.data(), packed.size(), fours.data());
-        const std::span<const float> all(rows);
-        for (std::size_t i = 0; i < pairs.size(); ++i)
+        for (const std::size_t rowsEach : {2u, 4u, 8u})
         {
-            const std::size_t first = i / width * 2 * width;
-            ASSERT_TRUE(IsSame(pairs[i], SlowSummary(all.subspan(first + i % width, 2 * width - i % width), width)))
-                << width << " wide, pair " << i;
+            std::vector<LodRecord> records(count / rowsEach * width);
+            Channels::SummariseFew(rows.data(), width, rowsEach, count / rowsEach, records.data());
+            ExpectRecords(records, rows, width, rowsEach);
         }
-        for (std::size_t i = 0; i < fours.size(); ++i)
-        {
-            const std::size_t first = i / width * 4 * width;
-            ASSERT_TRUE(IsSame(fours[i], SlowSummary(all.subspan(first + i % width, 4 * width - i % width), width)))
-                << width << " wide, four " << i;
-        }
+        std::vector<Channels::PackedRecord> sixteens(count / 16 * width);
+        Channels::SummariseSixteens(rows.data(), width, count / 16, sixteens.data());
+        ExpectRecords(UnpackAll(sixteens), rows, width, 16);
+        std::vector<LodRecord> pairs(count / 32 * width);
+        Channels::CombinePairs(sixteens.data(), width, count / 32, pairs.data());
+        ExpectRecords(pairs, rows, width, 32);
+        std::vector<Channels::PackedRecord> fours(count / 64 * width);
+        Channels::CombineFours(sixteens.data(), width, count / 64, fours.data());
+        ExpectRecords(UnpackAll(fours), rows, width, 64);
     }
 }
 
 TEST(Summary, CombiningWeighsByCount)
 {
     const std::array<Channels::PackedRecord, 4> records{{{1.0f, 1.0f, 1.0f, 3}, {5.0f, 5.0f, 5.0f, 1}, {}, {}}};
-    std::array<Channels::PackedRecord, 2> combined;
+    std::array<LodRecord, 2> combined;
     Channels::CombinePairs(records.data(), 1, 2, combined.data());
     EXPECT_EQ(combined[0].Mean, 2.0f);
     EXPECT_EQ(combined[0].Count, 4u);
-    EXPECT_EQ(combined[1].Count, 0u);
-    EXPECT_EQ(combined[1].Mean, 0.0f);
-    EXPECT_EQ(combined[1].Maximum, -Infinity);
-    EXPECT_EQ(combined[1].Minimum, Infinity);
+    EXPECT_TRUE(IsSame(combined[1], LodRecord{}));
 }
 
 } // namespace ChannelsTest

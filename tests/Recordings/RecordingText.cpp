@@ -18,6 +18,24 @@ using Recordings::RecordedChannel;
 namespace
 {
 
+const char* NameOf(EChannelKind i_Kind)
+{
+    switch (i_Kind)
+    {
+    case EChannelKind::Marker:
+        return "marker ";
+    case EChannelKind::SegmentPose:
+        return "pose ";
+    case EChannelKind::Analog:
+        return "analog ";
+    case EChannelKind::JointAngles:
+        return "joint ";
+    case EChannelKind::Column:
+        break;
+    }
+    return "column ";
+}
+
 void AppendSamples(const RecordedChannel& i_rChannel, std::ostringstream& io_rText)
 {
     for (std::size_t i = 0; i < i_rChannel.Samples.size(); ++i)
@@ -40,7 +58,7 @@ std::string TextOf(const Recordings::VRecording& i_rRecording)
          << i_rRecording.FramePeriod << "\n";
     for (const RecordedChannel& rChannel : i_rRecording.Channels)
     {
-        text << (rChannel.Kind == EChannelKind::Marker ? "marker " : "analog ") << rChannel.Name;
+        text << NameOf(rChannel.Kind) << rChannel.Name;
         if (!rChannel.Subject.empty())
             text << " of " << rChannel.Subject;
         text << " [" << rChannel.Units << "] " << rChannel.Rate << " Hz, " << rChannel.FirstTick << " by "

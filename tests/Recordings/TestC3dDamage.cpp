@@ -44,7 +44,7 @@ void ReadAnything(const std::vector<std::byte>& i_rBytes, const std::string& i_r
     VRecording recording;
     recording.Name = "before";
     std::string error;
-    if (Recordings::ReadC3d(i_rBytes, recording, error).IsError())
+    if (Recordings::ReadC3d(i_rBytes, {}, recording, error).IsError())
     {
         ASSERT_EQ(recording.Name, "before") << i_rWhat;
         ASSERT_TRUE(error.ends_with(".") && error.find('\n') == std::string::npos) << i_rWhat << error;
@@ -175,7 +175,7 @@ TEST(C3dDamage, SaysWhatIsWrong)
         rCase.pChange(built, bytes);
         VRecording recording;
         std::string error;
-        EXPECT_TRUE(Recordings::ReadC3d(bytes, recording, error).IsError());
+        EXPECT_TRUE(Recordings::ReadC3d(bytes, {}, recording, error).IsError());
         EXPECT_TRUE(error.starts_with(rCase.Message)) << error;
     }
 }
@@ -188,7 +188,7 @@ TEST(C3dDamage, BehindWhatTheValuesNeedIsAWarning)
     spec.Parameters.push_back(damaged);
     VRecording recording;
     std::string error;
-    ASSERT_TRUE(Recordings::ReadC3d(BuildC3d(spec).Bytes, recording, error).IsSuccess()) << error;
+    ASSERT_TRUE(Recordings::ReadC3d(BuildC3d(spec).Bytes, {}, recording, error).IsSuccess()) << error;
     ASSERT_EQ(recording.Warnings.size(), 1u);
     EXPECT_TRUE(recording.Warnings[0].starts_with("The parameter section is damaged behind UNITS;"))
         << recording.Warnings[0];

@@ -25,7 +25,7 @@ VRecording Read(const C3dSpec& i_rSpec)
 {
     VRecording recording;
     std::string error;
-    EXPECT_TRUE(Recordings::ReadC3d(BuildC3d(i_rSpec).Bytes, recording, error).IsSuccess()) << error;
+    EXPECT_TRUE(Recordings::ReadC3d(BuildC3d(i_rSpec).Bytes, {}, recording, error).IsSuccess()) << error;
     return recording;
 }
 
@@ -386,7 +386,7 @@ TEST(C3dKinds, MoreFramesThanTheHeaderCanSay)
     built.Bytes.resize(built.DataOffset + 50000 * 8 + 3);
     VRecording recording;
     std::string error;
-    ASSERT_TRUE(Recordings::ReadC3d(built.Bytes, recording, error).IsSuccess()) << error;
+    ASSERT_TRUE(Recordings::ReadC3d(built.Bytes, {}, recording, error).IsSuccess()) << error;
     EXPECT_EQ(recording.Channels[0].RowCount(), 50000u);
     ASSERT_EQ(recording.Warnings.size(), 1u);
     EXPECT_TRUE(recording.Warnings[0].starts_with("The file ends after frame 50000 of 70000;"))

@@ -1,7 +1,7 @@
 #include "RecordingText.h"
 
-#include "Recordings/C3dReader.h"
 #include "Recordings/C3dWriter.h"
+#include "Recordings/OpenRecording.h"
 
 #include <gtest/gtest.h>
 
@@ -93,7 +93,7 @@ void ExpectRoundTrip(const VRecording& i_rRecording)
     ASSERT_EQ(Recordings::WriteC3d(i_rRecording, folder / "written.c3d", error), TQL::Result::Ok) << error;
     EXPECT_EQ(folder.FileNames(), std::vector<std::string>{"written.c3d"});
     VRecording again;
-    ASSERT_TRUE(Recordings::OpenC3d(folder / "written.c3d", again, error).IsSuccess()) << error;
+    ASSERT_TRUE(Recordings::OpenRecording(folder / "written.c3d", again, error).IsSuccess()) << error;
     EXPECT_EQ(again.Name, "written");
     // Compared as booleans: the difference of two long texts takes longer to print than anybody would read.
     EXPECT_TRUE(TextOf(again) == TextOf(i_rRecording)) << WarningsOf(again);

@@ -56,14 +56,40 @@ TEST(OpenRecording, ContentComesBeforeTheEnding)
     }
 }
 
+TEST(OpenRecording, KindsOfText)
+{
+    const char* const pTrc = "PathFileType\t4\nFrame#\tTime\tA\n1\t0\t1\t2\t3\n";
+    const char* const pStorage = "x\nendheader\ntime\tb\n0\t1\n";
+    const char* const pTable = "time,x\n0,1\n";
+    struct Case
+    {
+        const char* Name;
+        const char* Text;
+        const char* Format;
+    };
+    const Case cases[] = {{"a.trc", pTrc, "TRC"},     {"a.csv", pTrc, "TRC"}, {"a.mot", pStorage, "MOT"},
+                          {"a.STO", pStorage, "STO"}, {"a", pStorage, "STO"}, {"a.csv", pTable, "CSV"},
+                          {"a.TXT", pTable, "CSV"},   {"a", pTable, "CSV"},   {"a.log", pTable, "CSV"}};
+    const TemporaryFolder folder;
+    for (const Case& rCase : cases)
+    {
+        WriteBytes(folder / rCase.Name, BytesOfText(rCase.Text));
+        VRecording recording;
+        std::string error;
+        EXPECT_TRUE(Recordings::OpenRecording(folder / rCase.Name, recording, error).IsSuccess()) << error;
+        EXPECT_EQ(recording.Format, rCase.Format) << rCase.Name;
+    }
+}
+
 TEST(OpenRecording, BadInputIsOneClearLine)
 {
     const TemporaryFolder folder;
     std::filesystem::create_directory(folder / "folder.c3d");
     WriteBytes(folder / "empty.c3d", {});
     WriteBytes(folder / "text.c3d", BytesOfText("time,x\n0,1\n"));
-    WriteBytes(folder / "text.csv", BytesOfText("time,x\n0,1\n"));
-    WriteBytes(folder / "likely.txt", BytesOfText("GPS" + std::string(2000, '.')));
+    WriteBytes(folder / "words.csv", BytesOfText("a walk\nand a run\n"));
+    WriteBytes(folder / "wide.csv", BytesOfText(std::string("\xFF\xFEt\0,\0x\0\n\0", 10)));
+    WriteBytes(folder / "likely.gps", BytesOfText("GPS" + std::string(2000, '.')));
     WriteBytes(folder / "new\nline.c3d", BytesOfText("x"));
     EXPECT_EQ(ErrorOf(folder / "folder.c3d", TQL::Result::InvalidArgument),
               "folder.c3d: this is a folder. Choose a file in it.");
@@ -72,9 +98,15 @@ TEST(OpenRecording, BadInputIsOneClearLine)
     EXPECT_EQ(ErrorOf(folder / "text.c3d", TQL::Result::InvalidFormat),
               "text.c3d: this is not a C3D file: its mark is missing. "
               "Choose a file that a motion capture program exported.");
-    const std::string unknown = ": this kind of file is not known. Files that can be opened: C3D (.c3d).";
-    EXPECT_EQ(ErrorOf(folder / "text.csv", TQL::Result::NotSupported), "text.csv" + unknown);
-    EXPECT_EQ(ErrorOf(folder / "likely.txt", TQL::Result::NotSupported), "likely.txt" + unknown);
+    EXPECT_EQ(
+        ErrorOf(folder / "words.csv", TQL::Result::InvalidFormat),
+        "words.csv: no row of numbers was found in its first lines. Choose a table with a row for each sample and "
+        "a column for each value.");
+    EXPECT_EQ(ErrorOf(folder / "wide.csv", TQL::Result::InvalidFormat),
+              "wide.csv: the file is written in 16-bit characters. Save it as UTF-8 text and open that.");
+    EXPECT_EQ(ErrorOf(folder / "likely.gps", TQL::Result::NotSupported),
+              "likely.gps: this kind of file is not known. Files that can be opened: C3D (.c3d), BVH (.bvh), "
+              "TRC (.trc), MOT (.mot), STO (.sto), CSV (.csv, .tsv, .txt).");
     EXPECT_EQ(ErrorOf(folder / "none.c3d", TQL::Result::FileNotFound),
               "none.c3d: there is no such file. Check the name and the folder.");
     EXPECT_TRUE(ErrorOf(folder / "new\nline.c3d", TQL::Result::InvalidFormat).starts_with("new line.c3d: "));

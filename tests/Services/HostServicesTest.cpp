@@ -12,13 +12,13 @@
 #include "Services/VSelectionSource.h"
 #include "Services/VSubscriptionAudit.h"
 #include "Services/VTimeController.h"
+#include "Services/VWorkerPostalService.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
 
 #include <gmock/gmock.h>
 
 #include <filesystem>
-#include <functional>
 #include <thread>
 
 namespace Services
@@ -64,7 +64,8 @@ TEST_F(HostServicesTest, GivesTheSameServicesEveryTime)
     EXPECT_FALSE(Get(rUi, &IHostUiServices::GetResources)->UsesSearchFolders());
     EXPECT_NE(Get(rUi, &IHostUiServices::GetQmlEngineHost)->GetEngine(), nullptr);
     EXPECT_EQ(Get(rCore, &IHostCoreServices::GetHostProfile)->GetProfileWord(), 5u);
-    EXPECT_EQ(Get(rCore, &IHostCoreServices::GetPreferencesStore), nullptr);
+    EXPECT_NE(Get(rCore, &IHostCoreServices::GetPreferencesStore), nullptr);
+    EXPECT_EQ(Get(rCore, &IHostCoreServices::GetPreferencesStore), Get(rCore, &IHostCoreServices::GetPreferencesStore));
     EXPECT_EQ(Get(rCore, &IHostCoreServices::GetFifthFactoryService), nullptr);
 
     std::shared_ptr<ITimeController> pController;
@@ -83,164 +84,17 @@ TEST_F(HostServicesTest, GivesTheSameServicesEveryTime)
     EXPECT_TRUE(pFiles->GetUserDirectories(3).empty());
 }
 
-TEST_F(HostServicesTest, NamesEveryOperationThatIsCalledOnAnotherThread)
-{
-    VHostServices services(Options(true));
-    IHostCoreServices& rCore = services;
-    IHostUiServices& rUi = services;
-    services.SetChannelService(std::make_shared<Fakes::FakeChannelService>());
-    const auto pChannels = Get(rCore, &IHostCoreServices::GetChannelService);
-    const auto pTime = services.TimeController();
-    const auto pSource = pTime->AddSource("Live", ETimeMode::Live);
-    const auto pMap = pTime->GetSourceMap();
-    const auto pTypes = Get(rCore, &IHostCoreServices::GetFourthFactoryService);
-    const auto pSelection = services.Selection();
-    const auto pProfile = Get(rCore, &IHostCoreServices::GetHostProfile);
-    const auto pFiles = Get(rCore, &IHostCoreServices::GetFileLocationService);
-    const auto pPersistence = Get(rUi, &IHostUiServices::GetQuickWidgetPersistence);
-    const auto pRegistry = Get(rCore, &IHostCoreServices::GetTimeControllerRegistry);
-
-    struct Case
-    {
-        const char* pName; ///< empty: any thread may
-        std::function<void()> Call;
-    };
-    std::vector<Case> cases = {
-        {"ITimeController::SeekTo",
-         [&]
-         {
-             pTime->SeekTo(0);
-         }},
-        {"ITimeController::GetCurrentSource",
-         [&]
-         {
-             pTime->GetCurrentSource();
-         }},
-        {"ITimeController::GetSourceMap",
-         [&]
-         {
-             pTime->GetSourceMap();
-         }},
-        {"ISourceMap::GetNames",
-         [&]
-         {
-             pMap->GetNames();
-         }},
-        {"ISourceMap::Find",
-         [&]
-         {
-             pMap->Find("Live");
-         }},
-        {"ITimeSource::GetMode",
-         [&]
-         {
-             pSource->GetMode();
-         }},
-        {"IChannelTypeRegistry::CanComputeMagnitude",
-         [&]
-         {
-             pTypes->CanComputeMagnitude("", "");
-         }},
-        {"ISelectionSource::GetSelection",
-         [&]
-         {
-             pSelection->GetSelection();
-         }},
-        {"IHostProfile::GetProfileWord",
-         [&]
-         {
-             pProfile->GetProfileWord();
-         }},
-        {"IFileLocationService::GetExtension",
-         [&]
-         {
-             pFiles->GetExtension(16);
-         }},
-        {"IQuickWidgetPersistence::WriteProperties",
-         [&]
-         {
-             pPersistence->WriteProperties({}, nullptr);
-         }},
-        {"IWorkspaceContentRegistry::UnregisterContent",
-         [&]
-         {
-             services.Contents()->UnregisterContent("");
-         }},
-        {"IQmlEngineHost::GetEngine",
-         [&]
-         {
-             services.EngineHost()->GetEngine();
-         }},
-        {"IChannelService::GetContextByName",
-         [&]
-         {
-             pChannels->GetContextByName("Live");
-         }},
-        {"IChannelService::CreateDerivedChannel",
-         [&]
-         {
-             pChannels->CreateDerivedChannel("Derivative", {}, {});
-         }},
-        {"",
-         [&]
-         {
-             pChannels->CreateDerivedChannel("Cache", {}, {});
-         }},
-        {"",
-         [&]
-         {
-             pChannels->GetChannel({});
-         }},
-        {"",
-         [&]
-         {
-             pSource->SetRange({0, 100}, 1);
-         }},
-        {"",
-         [&]
-         {
-             pTime->SourceListChanged();
-         }},
-    };
-    const auto addGetter = [&](const char* i_pName, auto& i_rHost, auto i_pGetter)
-    {
-        cases.push_back({i_pName, [&i_rHost, i_pGetter]
-                         {
-                             Get(i_rHost, i_pGetter);
-                         }});
-    };
-    addGetter("IHostCoreServices::GetFileLocationService", rCore, &IHostCoreServices::GetFileLocationService);
-    addGetter("IHostCoreServices::GetPreferencesStore", rCore, &IHostCoreServices::GetPreferencesStore);
-    addGetter("IHostCoreServices::GetFourthFactoryService", rCore, &IHostCoreServices::GetFourthFactoryService);
-    addGetter("IHostCoreServices::GetUiPostalService", rCore, &IHostCoreServices::GetUiPostalService);
-    addGetter("IHostCoreServices::GetWorkerPostalService", rCore, &IHostCoreServices::GetWorkerPostalService);
-    addGetter("IHostCoreServices::GetChannelService", rCore, &IHostCoreServices::GetChannelService);
-    addGetter("IHostUiServices::GetQmlEngineHost", rUi, &IHostUiServices::GetQmlEngineHost);
-    addGetter("IHostUiServices::GetContentRegistry", rUi, &IHostUiServices::GetContentRegistry);
-    addGetter("IHostUiServices::GetResources", rUi, &IHostUiServices::GetResources);
-
-    for (const Case& rCase : cases)
-    {
-        const std::size_t before = services.Faults().size();
-        rCase.Call();
-        EXPECT_EQ(services.Faults().size(), before) << rCase.pName << " on the UI thread is no fault";
-        std::thread(rCase.Call).join();
-        const std::vector<std::string> faults = services.Faults();
-        std::vector<std::string> expected(faults.begin(), faults.begin() + static_cast<std::ptrdiff_t>(before));
-        if (*rCase.pName != '\0')
-            expected.push_back(std::string(rCase.pName) + " was called on another thread than the UI thread");
-        EXPECT_EQ(faults, expected);
-    }
-    const std::size_t count = services.Faults().size();
-    std::thread([&] { pTime->SeekTo(0); }).join();
-    EXPECT_EQ(services.Faults().size(), count) << "one text a fault";
-}
-
 TEST_F(HostServicesTest, ChecksNothingUnlessAsked)
 {
     VHostServices services(Options(false));
     std::thread([&] { services.HasChannelBrowser(); }).join();
     EXPECT_THAT(services.Faults(), ElementsAre());
+    std::shared_ptr<TQL::IAsioPostalService> pWorker;
+    const auto count = services.Worker().use_count();
+    services.GetWorkerPostalService(pWorker);
+    EXPECT_EQ(pWorker, services.Worker()) << "nothing stands between";
+    EXPECT_EQ(services.Worker().use_count(), count + 1);
+    EXPECT_THAT(services.FindInUse(), ElementsAre());
 }
 
 TEST(VSubscriptionAudit, TellsTheDeadAndTheHostsOwnFromLeaks)

@@ -204,15 +204,6 @@ TEST_F(PluginHostTest, NamesALeakedSubscriptionAndKeepsItsCode)
     EXPECT_THAT(Told(), ElementsAre("leaked subscriber called"));
 }
 
-TEST_F(PluginHostTest, NamesACallOnTheWrongThread)
-{
-    std::string message;
-    ASSERT_TRUE(m_Host.Load(Module("FixtureOtherThread"), message).IsSuccess()) << message;
-    EXPECT_EQ(m_Host.Unload(), TQL::Result::Ok);
-    EXPECT_THAT(m_Services.Faults(),
-                ElementsAre("IHostCoreServices::HasChannelBrowser was called on another thread than the UI thread"));
-}
-
 TEST_F(PluginHostTest, OpensOnlyWhatTheModuleOffers)
 {
     QWidget frame;

@@ -1,17 +1,33 @@
+#include "ChannelSystemSelection/VChannelSelectionManager.h"
+#include "Channels/ChannelTypes.h"
+#include "Channels/VChannelService.h"
+#include "Channels/VRecordedContext.h"
 #include "FakeChannels.h"
 #include "Services/VContextTimeFeed.h"
 #include "Services/VHostServices.h"
+#include "Services/VHostSubscriptions.h"
 #include "Services/VPluginHost.h"
 #include "Services/VQmlEngineHost.h"
+#include "Services/VSelectionSource.h"
 #include "Services/VTimeController.h"
+#include "StoreInterface/ScopedAccess.h"
+#include "StoreInterface/TypedAccess.h"
 #include "support/LogGuard.h"
 
 #include <gmock/gmock.h>
 
 #include <QtCore/QCoreApplication>
+#include <QtCore/QElapsedTimer>
+#include <QtCore/QTemporaryDir>
 #include <QtQml/QQmlEngine>
 #include <QtQml/QQmlError>
+#include <QtQuick/QQuickWindow>
+#include <QtQuickWidgets/QQuickWidget>
 #include <QtWidgets/QVBoxLayout>
+
+#include <algorithm>
+#include <cmath>
+#include <functional>
 
 namespace Services
 {
@@ -20,12 +36,26 @@ namespace
 
 using ::testing::ElementsAre;
 
+/// A preference as a preferences dialogue finds it: its name, and its value before and after it is switched.
+std::string SwitchPreference(VHostServices& i_rServices, const char* i_pKey)
+{
+    std::shared_ptr<TQL::IStore> pStore;
+    i_rServices.GetPreferencesStore(pStore);
+    const TQL::ScopedWrite writer(*pStore);
+    const auto entry = pStore->GetEntry(Store::EntryPath("User/Preferences/Graph Plots") / i_pKey);
+    bool bValue = false;
+    EXPECT_TRUE(TQL::GetValue(*writer, entry, bValue));
+    EXPECT_TRUE(writer->SetValue(entry, Store::MakeValue(!bValue)).IsSuccess());
+    return writer->GetDisplayName(entry).value_or("") + (bValue ? ": on to off" : ": off to on");
+}
+
 /// The real module in the strict host: two whole lives in one process, with a window, a live context that grows and a
 /// change to a recording, and nothing left behind.
 TEST(RealModule, LivesTwiceInTheStrictHostWithoutAFault)
 {
     TestSupport::LogGuard log;
-    VHostServices services({.bChecking = true, .UserDirectory = ::testing::TempDir() + "RealModule"});
+    const QTemporaryDir folder;
+    VHostServices services({.bChecking = true, .UserDirectory = folder.path().toStdString()});
     const auto pChannels = std::make_shared<Fakes::FakeChannelService>();
     services.SetChannelService(pChannels);
     VTimeController& rTime = *services.TimeController();
@@ -54,6 +84,8 @@ TEST(RealModule, LivesTwiceInTheStrictHostWithoutAFault)
         ASSERT_TRUE(host.Load(REAL_MODULE, message).IsSuccess()) << message;
         EXPECT_EQ(host.BuildRevision(), 158731u);
         ASSERT_THAT(host.ContentNames(), ElementsAre("Graph Plots"));
+        EXPECT_EQ(SwitchPreference(services, "EnableRotationUnwrapping"),
+                  life == 0 ? "Enable rotation unwrapping: on to off" : "Enable rotation unwrapping: off to on");
 
         QWidget frame;
         frame.resize(640, 360);
@@ -80,6 +112,109 @@ TEST(RealModule, LivesTwiceInTheStrictHostWithoutAFault)
         EXPECT_THAT(services.Faults(), ElementsAre()) << "life " << life;
         rTime.SetCurrentSource("");
         QCoreApplication::processEvents();
+    }
+}
+
+/// Turns the event loop until the condition holds, for at most 20 s.
+bool WaitFor(const std::function<bool()>& i_rCondition)
+{
+    QElapsedTimer clock;
+    clock.start();
+    while (!i_rCondition() && !clock.hasExpired(20'000))
+    {
+        QCoreApplication::processEvents(QEventLoop::AllEvents | QEventLoop::WaitForMoreEvents, 20);
+        QCoreApplication::sendPostedEvents(nullptr, QEvent::DeferredDelete);
+    }
+    return i_rCondition();
+}
+
+std::shared_ptr<const Recordings::VRecording> MakeSine()
+{
+    Recordings::RecordedChannel channel;
+    channel.Name = "sine";
+    channel.ComponentNames = {""};
+    for (int row = 0; row < 1200; ++row)
+        channel.Samples.push_back(std::sin(static_cast<float>(row) / 20.0f));
+    Recordings::VRecording recording;
+    recording.Range = channel.GetTickRange();
+    recording.Channels.push_back(std::move(channel));
+    return std::make_shared<const Recordings::VRecording>(std::move(recording));
+}
+
+/// One window of the module and how often it was drawn.
+struct Window
+{
+    explicit Window(VPluginHost& i_rHost)
+    {
+        Frame.resize(400, 300);
+        pContent = i_rHost.OpenContent("Graph Plots", &Frame);
+        (new QVBoxLayout(&Frame))->addWidget(pContent);
+        QObject::connect(pContent->findChild<QQuickWidget*>()->quickWindow(), &QQuickWindow::afterRendering, &Frame,
+                         [this] { ++Drawn; });
+        Frame.show();
+    }
+
+    QWidget Frame;
+    QPointer<QWidget> pContent;
+    int Drawn = 0;
+};
+
+/// Two windows that plot while the recording plays, one closed in the middle of it, and the module loaded again.
+TEST(RealModule, GivesBackAllThatItTakesWhilePlaying)
+{
+    const TestSupport::LogGuard log;
+    HostOptions options;
+    options.bChecking = true;
+    VHostServices services(options);
+    const auto pChannels = std::make_shared<Channels::VChannelService>();
+    const auto pManager = TQL::MakeShared<ChannelSystemSelection::VChannelSelectionManager>(services.Selection());
+    services.Ledger()->Add(services.Selection()->Changed().get());
+    for (const Channels::ChannelType& rType : Channels::GetChannelTypeTable())
+        pManager->RegisterChannelType(rType.Name, rType.Kind, static_cast<std::uint32_t>(rType.Flags));
+    pChannels->SetSelectionManager(pManager);
+    services.SetChannelService(pChannels);
+    const auto pContext = std::make_shared<Channels::VRecordedContext>("walk", pChannels->GetSubTypes(), MakeSine());
+    pChannels->AddContext(pContext);
+    VTimeController& rTime = *services.TimeController();
+    const VContextTimeFeed feed(pContext, rTime.AddSource("walk", OrvanePluginInterface::ETimeMode::Review),
+                                services.Ledger());
+    rTime.SetCurrentSource("walk");
+    rTime.SetLooping(true);
+    services.Selection()->Set(
+        {Channels::SelectionOfChannel(pContext->GetChannels()->front()->GetInstanceId()).value()});
+
+    const bool bDraws = qEnvironmentVariableIsSet("DISPLAY");
+    VPluginHost host(services);
+    for (int life = 0; life < 2; ++life)
+    {
+        std::string message;
+        ASSERT_TRUE(host.Load(REAL_MODULE, message).IsSuccess()) << message;
+        auto pFirst = std::make_unique<Window>(host);
+        {
+            Window second(host);
+            rTime.Play(1.0);
+            const auto holdsOutputs = [&]
+            {
+                const auto inUse = services.FindInUse();
+                return std::ranges::any_of(inUse,
+                                           [](const auto& i_r) { return i_r.starts_with("IChannel::GetOutput"); });
+            };
+            EXPECT_TRUE(WaitFor(holdsOutputs)) << "the check sees what the module reads";
+            if (bDraws)
+            {
+                EXPECT_TRUE(WaitFor([&] { return pFirst->Drawn > 5 && second.Drawn > 5; }));
+            }
+            pFirst.reset();
+            const int drawn = second.Drawn;
+            EXPECT_TRUE(rTime.IsPlaying());
+            if (bDraws)
+            {
+                EXPECT_TRUE(WaitFor([&] { return second.Drawn > drawn + 5; })) << "the other goes on";
+            }
+        }
+        EXPECT_EQ(host.Unload(), TQL::Result::Ok) << "life " << life;
+        EXPECT_THAT(services.Faults(), ElementsAre()) << "life " << life;
+        EXPECT_THAT(services.FindInUse(), ElementsAre()) << "life " << life;
     }
 }
 

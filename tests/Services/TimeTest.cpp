@@ -85,6 +85,50 @@ TEST(TimeRules, PlayStopsAtTheEndOfItsDirection)
     }
 }
 
+TEST(TimeRules, ALoopGoesRoundWhateverTheSpeed)
+{
+    struct Case
+    {
+        const char* pName;
+        std::int64_t Tick;
+        std::int64_t Elapsed;
+        double Rate;
+        std::int64_t Expected;
+    };
+    const Case cases[] = {
+        {"inside", 10 * P, 3 * P, 1.0, 13 * P},
+        {"onto the latest frame", 98 * P, P, 1.0, 99 * P},
+        {"over the end", 98 * P, 4 * P, 1.0, 3 * P},
+        {"slowly from the latest frame", 99 * P, P, 0.1, P / 10},
+        {"many times round", 5 * P, 990 * P, 1.0, 5 * P},
+        {"backwards over the first", 2 * P, 5 * P, -1.0, 96 * P},
+        {"backwards onto the first", 2 * P, P, -2.0, 0},
+        {"from before", -50 * P, P, 1.0, 0},
+        {"from behind, backwards", 500 * P, P, -1.0, 99 * P},
+    };
+    for (const Case& rCase : cases)
+        EXPECT_EQ(AdvanceLoop(rCase.Tick, rCase.Elapsed, rCase.Rate, Frames(0, 100), P), rCase.Expected) << rCase.pName;
+    EXPECT_EQ(AdvanceLoop(7 * P, 5 * P, 1.0, Frames(7, 1), P), 7 * P) << "one frame";
+    const std::int64_t far = AdvanceLoop(0, P, 1e300, Frames(0, 100), P);
+    EXPECT_TRUE(far >= 0 && far <= 99 * P) << "enormous rate";
+}
+
+TEST(TimeRules, MarksStayTheRightWayRound)
+{
+    const TQL::TickRange all = Frames(10, 90), none;
+    EXPECT_EQ(MoveFirstMark(none, 30 * P + 5, all, P), Frames(30, 70));
+    EXPECT_EQ(MoveLastMark(none, 30 * P + 5, all, P), Frames(10, 21));
+    EXPECT_EQ(MoveFirstMark(Frames(20, 20), 30 * P, all, P), Frames(30, 10));
+    EXPECT_EQ(MoveFirstMark(Frames(20, 20), 40 * P, all, P), Frames(40, 60)) << "behind the other one";
+    EXPECT_EQ(MoveLastMark(Frames(20, 20), 19 * P, all, P), Frames(10, 10)) << "before the other one";
+    EXPECT_EQ(MoveLastMark(Frames(20, 20), 20 * P, all, P), Frames(20, 1));
+
+    EXPECT_EQ(LoopRange(none, all, P), all);
+    EXPECT_EQ(LoopRange(Frames(50, 10), all, P), Frames(50, 10));
+    EXPECT_EQ(LoopRange(Frames(0, 50), all, P), Frames(10, 40)) << "as far as it is in the range";
+    EXPECT_EQ(LoopRange(Frames(200, 10), all, P), all) << "the recording was replaced by a shorter one";
+}
+
 TEST(TimeRules, NanosecondsToTicks)
 {
     EXPECT_EQ(NanosecondsToTicks(1'000'000'000), TQL::DefaultTickRate);
@@ -242,6 +286,36 @@ TEST_F(TimeControllerTest, PlaysToTheEndAndStartsAgain)
     m_pController->FindSource("Walk")->SetMode(ETimeMode::Live);
     m_pUi->RunAll();
     EXPECT_FALSE(m_pController->IsPlaying()) << "live cannot be played";
+}
+
+TEST_F(TimeControllerTest, LoopsOverTheMarksOfItsSource)
+{
+    AddReview("Walk", 0, 100);
+    AddReview("Run", 0, 50);
+    m_pController->SetCurrentSource("Walk");
+    const auto pPlays = Count(m_pController->PlayChanged());
+    m_pController->SetLooping(true);
+    m_pController->SetMarks(Frames(20, 11));
+    m_pController->SetRate(2.0);
+    m_pUi->RunAll();
+    EXPECT_EQ(*pPlays, 1) << "a burst is told once";
+    m_pController->Play(m_pController->Rate());
+    for (const std::int64_t frame : {20, 26, 22, 28})
+    {
+        m_pController->Advance(3 * P);
+        EXPECT_EQ(CurrentFrame(), frame);
+    }
+    EXPECT_TRUE(m_pController->IsPlaying());
+
+    m_pController->SetCurrentSource("Run");
+    EXPECT_TRUE(m_pController->Marks().IsEmpty());
+    m_pController->SetCurrentSource("Walk");
+    EXPECT_EQ(m_pController->Marks(), Frames(20, 11));
+    m_pController->SetLooping(false);
+    m_pController->Play(m_pController->Rate());
+    m_pController->Advance(500 * P);
+    EXPECT_EQ(CurrentFrame(), 99);
+    EXPECT_FALSE(m_pController->IsPlaying()) << "marks without a loop hold nothing up";
 }
 
 TEST_F(TimeControllerTest, DriverMovesByItsClockWhilePlaying)

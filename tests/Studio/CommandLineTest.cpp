@@ -24,13 +24,20 @@ std::vector<std::string> Words(const std::string& i_rText)
 /// Everything that was understood, in one line.
 std::string Describe(const CommandLine& i_r)
 {
-    static constexpr const char* names[] = {"window", "channels", "export", "snapshot", "help"};
+    static constexpr const char* names[] = {"window",      "channels", "export", "snapshot",
+                                            "check-store", "record",   "help"};
     std::ostringstream text;
     text << names[static_cast<int>(i_r.Command)];
     for (const std::string& rFile : i_r.Files)
         text << " file=" << rFile;
     if (i_r.bLive)
         text << " live=" << i_r.Subjects;
+    if (i_r.OscPort != 0)
+        text << " osc=" << i_r.OscAddress << ":" << i_r.OscPort << "@" << i_r.OscRate;
+    if (!i_r.ReplayPath.empty())
+        text << " replay=" << i_r.ReplayPath << "*" << i_r.Speed << (i_r.bLoop ? " loop" : "");
+    if (i_r.Seconds != 0.0)
+        text << " seconds=" << i_r.Seconds;
     if (i_r.bJson)
         text << " json";
     if (!i_r.CsvPath.empty())
@@ -76,6 +83,11 @@ TEST(CommandLine, GoodOnesAreUnderstood)
         {"snapshot a.c3d --out p.png", "snapshot file=a.c3d out=p.png"},
         {"snapshot --live --out p.png --size 1280x720 --range -1200:0 --values -0.5:1e3 --after 0 --check",
          "snapshot live=2 out=p.png size=1280x720 range=-1200:0 values=-0.5:1000 after=0 check"},
+        {"check-store p.json", "check-store file=p.json"},
+        {"--osc 9000", "window osc=127.0.0.1:9000@0"},
+        {"a.c3d --osc 0.0.0.0:9000 --osc-rate 59.94", "window file=a.c3d osc=0.0.0.0:9000@59.94"},
+        {"--replay a.c3d --speed 4 --loop", "window replay=a.c3d*4 loop"},
+        {"record --osc [::1]:7 --seconds 2.5 out.c3d", "record file=out.c3d osc=::1:7@0 seconds=2.5"},
         {"--help", "help"},
         {"snapshot --help", "help"},
     };
@@ -108,6 +120,19 @@ TEST(CommandLine, BadOnesSayWhatIsWrongAndWhatToDo)
         {"export a.c3d", "export needs --csv OUT, the path of the table to write"},
         {"export a.c3d --csv", "--csv needs the path of the table to write"},
         {"export a.c3d --csv=", "--csv needs the path of the table to write, not \"\""},
+        {"check-store", "check-store needs the path of a store file"},
+        {"--osc",
+         "--osc needs a UDP port from 1 to 65535, with an address of this machine before it if others shall send"},
+        {"--osc 0", "--osc needs a UDP port from 1 to 65535, with an address of this machine before it if others shall "
+                    "send, not \"0\""},
+        {"--osc 9000 --live", "there is one live input at a time: give --live, --osc or --replay"},
+        {"--osc-rate 100", "--osc-rate goes with --osc PORT"},
+        {"--osc 9000 --osc-rate 0", "--osc-rate needs a rate from 0.1 to 100000, not \"0\""},
+        {"--speed 2", "--speed and --loop go with --replay FILE"},
+        {"--replay a.c3d --speed nan", "--speed needs a number from 0.01 to 100, not \"nan\""},
+        {"record out.c3d", "record needs --osc PORT, --seconds N, and the path of one file to write"},
+        {"record --osc 9000 --seconds 5 out.csv", "record writes C3D files; let the path end in .c3d"},
+        {"check-store a.json --json", "--json does not go with check-store; --help says which options do"},
         {"snapshot --out p.png", "snapshot needs the path of a recording, or --live"},
         {"snapshot a.c3d --live --out p.png", "snapshot takes one recording or --live, not both"},
         {"snapshot a.c3d b.c3d --out p.png", "snapshot takes one recording or --live, not both"},

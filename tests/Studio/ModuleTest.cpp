@@ -5,10 +5,10 @@
 #include "Studio/ContextNames.h"
 #include "Studio/Paths.h"
 #include "Studio/PlotContent.h"
+#include "Studio/VMainActions.h"
 #include "Studio/VMainWindow.h"
 #include "Studio/VPlotFrame.h"
 #include "Studio/VStudioSession.h"
-#include "Studio/VTransportBar.h"
 #include "support/LogGuard.h"
 
 #include <gtest/gtest.h>
@@ -16,6 +16,7 @@
 #include <QtCore/QCoreApplication>
 #include <QtCore/QElapsedTimer>
 #include <QtCore/QTemporaryDir>
+#include <QtGui/QAction>
 #include <QtQuickWidgets/QQuickWidget>
 #include <QtWidgets/QMdiArea>
 #include <QtWidgets/QMdiSubWindow>
@@ -104,7 +105,7 @@ TEST_F(StudioModule, AnOperatorsWalkThroughTheStudioLeavesNothingBehind)
         m_pSession->ShowContext(walk);
         EXPECT_TRUE(WaitFor([&] { return AllPlotsHaveData(window, 2); })) << "in review";
         const auto pController = m_pSession->Host().TimeController();
-        window.findChild<Studio::VTransportBar*>()->TogglePlay();
+        window.Actions().Get(Studio::EAction::Play)->trigger();
         const auto pSource = pController->FindSource(walk);
         EXPECT_TRUE(WaitFor([&] { return pSource->CurrentTick() > pSource->Range().First; })) << "it plays";
 

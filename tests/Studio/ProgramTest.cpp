@@ -85,6 +85,29 @@ TEST_F(StudioProgram, ExportsATable)
     EXPECT_EQ(content.count('\n'), 1 + 600);
 }
 
+TEST_F(StudioProgram, ChecksAStoreFile)
+{
+    const struct
+    {
+        const char* pText;
+        int Status;
+        const char* pOutput;
+    } rows[] = {{"{ \"Version\" : \"3.0\", \"Children\" : { } }", 0, "FILE: no problems\n"},
+                {"{ \"Version\" : \"3.0\" \n}", 1,
+                 "FILE:1:1: expected a member \"Children\", an object that holds the entries\nFILE: 1 problem\n"}};
+    for (const auto& rRow : rows)
+    {
+        QFile file(Path("store.json"));
+        ASSERT_TRUE(file.open(QIODevice::WriteOnly));
+        file.write(rRow.pText);
+        file.close();
+        const StudioRun run = RunStudio({"check-store", file.fileName()});
+        EXPECT_EQ(run.Status, rRow.Status);
+        EXPECT_EQ(run.Error, "");
+        EXPECT_EQ(QString(run.Output), QString(rRow.pOutput).replace("FILE", file.fileName()));
+    }
+}
+
 TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
 {
     const QString walk = Path("walk.c3d");
@@ -98,6 +121,7 @@ TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
         {{"channels", m_Folder.path()}, "folder"},
         {{"channels", Path("text.c3d")}, "text.c3d"},
         {{"export", walk, "--csv", Path("no/such/o.csv")}, "o.csv"},
+        {{"check-store", Path("missing.json")}, "missing.json"},
         {{"export", walk, "--csv", Path("o.csv"), "--channel", "Nobody*"}, "Nobody*"},
         {{"snapshot", walk, "--out", Path("p.png")},
          "no display: DISPLAY is not set; run it on a desktop or under xvfb-run"},

@@ -12,7 +12,6 @@
 #include "Studio/PlotContent.h"
 #include "Studio/VMainWindow.h"
 #include "Studio/VStudioSession.h"
-#include "Studio/VTransportBar.h"
 #include "support/LogGuard.h"
 
 #include <gtest/gtest.h>
@@ -21,11 +20,11 @@
 #include <QtCore/QFile>
 #include <QtCore/QTemporaryDir>
 #include <QtGui/QImage>
+#include <QtTest/QTest>
 #include <QtWidgets/QComboBox>
 #include <QtWidgets/QLabel>
 #include <QtWidgets/QSlider>
 #include <QtWidgets/QSpinBox>
-#include <QtWidgets/QStatusBar>
 #include <QtWidgets/QTreeView>
 
 #include <filesystem>
@@ -203,7 +202,7 @@ TEST_F(StudioSession, TheWindowFollowsContextTimeAndSelection)
         return m_Session.Host().Selection()->GetSelection()->Items(TQL::ESelectionKind::Label);
     };
     ASSERT_EQ(selected().size(), 1u) << "a first channel is ticked";
-    auto* pModel = window.findChild<QTreeView*>()->model();
+    auto* pModel = window.findChild<QTreeView*>(QStringLiteral("channelTree"))->model();
     const QModelIndex markers = pModel->index(0, 0, pModel->index(0, 0));
     pModel->setData(pModel->index(3, 0, markers), Qt::Checked, Qt::CheckStateRole);
     EXPECT_EQ(selected().size(), 2u);
@@ -217,7 +216,9 @@ TEST_F(StudioSession, TheWindowFollowsContextTimeAndSelection)
     EXPECT_EQ(pSource->CurrentTick() - pSource->Range().First, 120 * TQL::DefaultFramePeriod);
 
     window.OpenFile(m_Folder / "missing.c3d");
-    EXPECT_TRUE(window.statusBar()->currentMessage().contains(QStringLiteral("missing.c3d")));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return window.findChild<QLabel*>(QStringLiteral("noticeText")) != nullptr; }));
+    EXPECT_TRUE(
+        window.findChild<QLabel*>(QStringLiteral("noticeText"))->text().contains(QStringLiteral("missing.c3d")));
     EXPECT_EQ(m_Session.CurrentContextName(), "walk");
 }
 

@@ -85,6 +85,18 @@ void ForgetView(void* i_pView, std::uint64_t i_Length)
     (void)::VirtualUnlock(i_pView, i_Length); // of pages that are not locked: takes them off the working set
 }
 
+int GuardView(void*, std::uint64_t)
+{
+    return -1; // a file that is mapped cannot be shortened
+}
+
+bool HasGuardActed(int)
+{
+    return false;
+}
+
+void ReleaseGuard(int) {}
+
 std::uint64_t GetSizeNow(const MappedFile& i_rFile)
 {
     LARGE_INTEGER length;

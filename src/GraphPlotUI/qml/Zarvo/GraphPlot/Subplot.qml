@@ -1,4 +1,5 @@
 import QtQuick
+import QtQuick.Window
 import Zarvo.GraphPlot 1.0
 
 // One subplot with its value axis and the names of its traces. screenOrigin is where it stands in the framebuffer item.
@@ -34,6 +35,7 @@ Item {
             id: plot
             anchors.fill: parent
             screenRect: Qt.rect(root.screenOrigin.x + plotArea.x, root.screenOrigin.y, plotArea.width, plotArea.height)
+            devicePixelRatio: Screen.devicePixelRatio
             liveContext: root.traceManager.liveContext
             relativeTimeDisplay: root.traceManager.relativeTimeDisplay
             valueRangeX: root.traceManager.timeRange

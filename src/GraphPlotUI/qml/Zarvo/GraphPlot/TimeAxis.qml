@@ -1,4 +1,5 @@
 import QtQuick
+import QtQuick.Window
 import Zarvo.GraphPlot 1.0
 
 // The time axis below the subplots: ticks by its render type, labels and title as text.
@@ -12,6 +13,7 @@ Item {
         id: axis
         anchors.fill: parent
         screenRect: root.screenRect
+        devicePixelRatio: Screen.devicePixelRatio
         liveContext: root.traceManager.liveContext
         relativeTimeDisplay: root.traceManager.relativeTimeDisplay
         valueRange: root.traceManager.timeRange

@@ -1,4 +1,5 @@
 import QtQuick
+import QtQuick.Window
 import Zarvo.GraphPlot 1.0
 
 // The value axis to the left of a subplot: ticks by its render type, labels and title as text.
@@ -14,6 +15,7 @@ Item {
         id: axis
         anchors.fill: parent
         screenRect: root.screenRect
+        devicePixelRatio: Screen.devicePixelRatio
         valueRange: root.valueRange
         ticksOnFarEdge: true
 

@@ -1,0 +1,219 @@
+#include "Streaming/LiveRecording.h"
+
+#include "Channels/VChannelContext.h"
+
+#include <algorithm>
+#include <limits>
+#include <memory>
+#include <span>
+#include <utility>
+
+namespace Streaming
+{
+
+namespace
+{
+
+using Recordings::EChannelKind;
+using Recordings::RecordedChannel;
+using Recordings::VRecording;
+
+constexpr std::int64_t RowsAtOnce = 16384; ///< a reader keeps the writer waiting when that needs memory
+
+EChannelKind KindOf(const std::string& i_rTypeName)
+{
+    const Channels::ChannelType* pType = Channels::FindChannelType(i_rTypeName);
+    return pType ? pType->RecordedKind : EChannelKind::Column;
+}
+
+/// Reads what the store has of the channel's range. The channel's rows are missing before.
+void ReadRows(const Channels::VSampleStore& i_rSamples, const TQL::TickRange& i_rRange, RecordedChannel& io_rChannel)
+{
+    const std::int64_t period = io_rChannel.SamplePeriod;
+    const std::size_t components = io_rChannel.ComponentCount();
+    std::int64_t tick = i_rRange.First;
+    while (tick < i_rRange.Last)
+    {
+        // Asked each time: the oldest samples go while newer ones come.
+        const TQL::TickRange held = i_rSamples.GetRange();
+        tick = std::max(tick, held.First);
+        const std::int64_t end = std::min({tick + RowsAtOnce * period, held.Last, i_rRange.Last});
+        if (end <= tick)
+            return;
+        const auto first = static_cast<std::size_t>((tick - i_rRange.First) / period) * components;
+        const auto count = static_cast<std::size_t>((end - tick) / period) * components;
+        if (i_rSamples.ReadSamples({tick, end}, std::span(io_rChannel.Samples).subspan(first, count)).IsSuccess())
+            tick = end;
+        else if (i_rSamples.GetRange().First <= tick)
+            return; // not trimmed but replaced
+    }
+}
+
+/// Drops the rows before a tick.
+void CropBefore(std::int64_t i_Tick, RecordedChannel& io_rChannel)
+{
+    const auto rows = (i_Tick - io_rChannel.FirstTick) / io_rChannel.SamplePeriod;
+    const auto values = rows * static_cast<std::int64_t>(io_rChannel.ComponentCount());
+    io_rChannel.Samples.erase(io_rChannel.Samples.begin(), io_rChannel.Samples.begin() + values);
+    io_rChannel.FirstTick = i_Tick;
+}
+
+RecordedChannel CopyChannel(const Channels::VSourceChannel& i_rChannel, const TQL::TickRange& i_rRange)
+{
+    const Channels::ChannelDefinition& rDefinition = i_rChannel.GetDefinition();
+    RecordedChannel channel;
+    channel.Kind = KindOf(rDefinition.TypeName);
+    channel.Name = rDefinition.Name;
+    const std::size_t colon = channel.Name.find(':');
+    if (colon != std::string::npos && channel.Kind != EChannelKind::Column)
+        channel.Subject = channel.Name.substr(0, colon);
+    channel.ComponentNames = channel.Kind == EChannelKind::Marker ? std::vector<std::string>{"X", "Y", "Z"}
+                                                                  : Channels::ComponentNamesOf(rDefinition);
+    channel.Units = rDefinition.Units;
+    channel.SamplePeriod = i_rChannel.GetSamples()->Period();
+    channel.Rate = static_cast<double>(TQL::DefaultTickRate) / static_cast<double>(channel.SamplePeriod);
+    channel.FirstTick = i_rRange.First;
+    const auto rows = static_cast<std::size_t>((i_rRange.Last - i_rRange.First) / channel.SamplePeriod);
+    channel.Samples.assign(rows * channel.ComponentCount(), std::numeric_limits<float>::quiet_NaN());
+    ReadRows(*i_rChannel.GetSamples(), i_rRange, channel);
+    return channel;
+}
+
+} // namespace
+
+VRecording CopyContext(const Channels::VChannelContext& i_rContext)
+{
+    VRecording recording;
+    recording.Name = i_rContext.GetName();
+    recording.FramePeriod = i_rContext.GetFramePeriod();
+    recording.Range = i_rContext.GetTickRange();
+    const auto pChannels = i_rContext.GetChannels();
+    for (const auto& rpChannel : *pChannels)
+        if (!rpChannel->GetSamples()->IsEmpty())
+            recording.Channels.push_back(CopyChannel(*rpChannel, recording.Range));
+    const std::int64_t first =
+        std::min(std::max(i_rContext.GetTickRange().First, recording.Range.First), recording.Range.Last);
+    for (RecordedChannel& rChannel : recording.Channels)
+        CropBefore(first, rChannel);
+    recording.Range.First = first;
+    return recording;
+}
+
+namespace
+{
+
+bool BecomesAnalog(const RecordedChannel& i_rChannel)
+{
+    return i_rChannel.Kind == EChannelKind::Column || i_rChannel.Kind == EChannelKind::JointAngles ||
+           i_rChannel.Kind == EChannelKind::Analog;
+}
+
+void Say(std::size_t i_Count, const char* i_pOne, const char* i_pMany, std::vector<std::string>& o_rRemarks)
+{
+    if (i_Count != 0)
+        o_rRemarks.push_back(std::to_string(i_Count) + " " + (i_Count == 1 ? i_pOne : i_pMany));
+}
+
+/// One component of a channel as an analog channel of its own, each sample i_Repeats times.
+RecordedChannel TakeComponent(const RecordedChannel& i_rChannel, std::size_t i_Component, std::int64_t i_Repeats)
+{
+    const std::string& rComponent = i_rChannel.ComponentNames[i_Component];
+    RecordedChannel analog = {EChannelKind::Analog,
+                              i_rChannel.Name,
+                              {},
+                              {""},
+                              i_rChannel.Units,
+                              i_rChannel.Rate,
+                              i_rChannel.SamplePeriod / i_Repeats,
+                              i_rChannel.FirstTick,
+                              {}};
+    analog.Rate *= static_cast<double>(i_Repeats);
+    if (!rComponent.empty())
+        analog.Name += "." + rComponent;
+    analog.Samples.reserve(i_rChannel.RowCount() * static_cast<std::size_t>(i_Repeats));
+    for (std::size_t row = 0; row < i_rChannel.RowCount(); ++row)
+        analog.Samples.insert(analog.Samples.end(), static_cast<std::size_t>(i_Repeats),
+                              i_rChannel.Samples[row * i_rChannel.ComponentCount() + i_Component]);
+    return analog;
+}
+
+/// What was changed, counted.
+struct Changes
+{
+    std::size_t Poses = 0;
+    std::size_t OtherUnits = 0;
+    std::size_t MisfitRates = 0;
+    std::size_t Converted = 0;
+    std::size_t Repeated = 0;
+
+    void Say(std::vector<std::string>& o_rRemarks) const
+    {
+        Streaming::Say(Converted, "column or joint angle was written as analog channels",
+                       "columns and joint angles were written as analog channels", o_rRemarks);
+        Streaming::Say(Repeated, "analog channel was brought to the rate of the fastest by repeating its samples",
+                       "analog channels were brought to the rate of the fastest by repeating their samples",
+                       o_rRemarks);
+        Streaming::Say(Poses, "segment pose was left out: a C3D file has no place for it",
+                       "segment poses were left out: a C3D file has no place for them", o_rRemarks);
+        Streaming::Say(OtherUnits, "marker was left out: all have to have the unit of the first",
+                       "markers were left out: all have to have the unit of the first", o_rRemarks);
+        Streaming::Say(MisfitRates, "channel was left out: its rate does not fit the others",
+                       "channels were left out: their rates do not fit the others", o_rRemarks);
+    }
+};
+
+/// Moves one channel over, as what it becomes.
+void FitChannel(RecordedChannel&& i_rChannel, std::int64_t i_FramePeriod, std::int64_t i_AnalogPeriod,
+                std::vector<RecordedChannel>& o_rChannels, Changes& o_rChanges)
+{
+    if (i_rChannel.Kind == EChannelKind::SegmentPose)
+        ++o_rChanges.Poses;
+    else if (i_rChannel.Kind == EChannelKind::Marker)
+    {
+        const auto first = std::ranges::find(o_rChannels, EChannelKind::Marker, &RecordedChannel::Kind);
+        if (first != o_rChannels.end() && first->Units != i_rChannel.Units)
+            ++o_rChanges.OtherUnits;
+        else if (i_rChannel.SamplePeriod != i_FramePeriod)
+            ++o_rChanges.MisfitRates;
+        else
+            o_rChannels.push_back(std::move(i_rChannel));
+    }
+    else if (i_rChannel.SamplePeriod % i_AnalogPeriod != 0)
+        ++o_rChanges.MisfitRates;
+    else
+    {
+        const std::int64_t repeats = i_rChannel.SamplePeriod / i_AnalogPeriod;
+        o_rChanges.Repeated += repeats > 1 ? 1 : 0;
+        o_rChanges.Converted += i_rChannel.Kind == EChannelKind::Analog ? 0 : 1;
+        if (i_rChannel.ComponentCount() == 1 && repeats == 1)
+        {
+            i_rChannel.Kind = EChannelKind::Analog;
+            i_rChannel.ComponentNames = {""};
+            o_rChannels.push_back(std::move(i_rChannel));
+            return;
+        }
+        for (std::size_t component = 0; component < i_rChannel.ComponentCount(); ++component)
+            o_rChannels.push_back(TakeComponent(i_rChannel, component, repeats));
+    }
+}
+
+} // namespace
+
+void FitToC3d(VRecording& io_rRecording, std::vector<std::string>& o_rRemarks)
+{
+    std::int64_t analogPeriod = io_rRecording.FramePeriod;
+    for (const RecordedChannel& rChannel : io_rRecording.Channels)
+        if (BecomesAnalog(rChannel) && io_rRecording.FramePeriod % rChannel.SamplePeriod == 0)
+            analogPeriod = std::min(analogPeriod, rChannel.SamplePeriod);
+    Changes changes;
+    std::vector<RecordedChannel> channels;
+    for (RecordedChannel& rChannel : io_rRecording.Channels)
+    {
+        FitChannel(std::move(rChannel), io_rRecording.FramePeriod, analogPeriod, channels, changes);
+        rChannel.Samples = {}; // the copy stands instead
+    }
+    io_rRecording.Channels = std::move(channels);
+    changes.Say(o_rRemarks);
+}
+
+} // namespace Streaming

@@ -1,0 +1,27 @@
+#pragma once
+
+#include "Recordings/VRecording.h"
+
+#include <string>
+#include <vector>
+
+namespace Channels
+{
+class VChannelContext;
+}
+
+namespace Streaming
+{
+
+/// What a context has kept, as a recording: every channel from the context's first frame to its last, missing samples
+/// where a channel has none. The capture may go on meanwhile: what comes later is not part of it, and frames that the
+/// context forgets while they are copied are left out of all channels. Takes as much memory as the samples. Any thread.
+Recordings::VRecording CopyContext(const Channels::VChannelContext& i_rContext);
+
+/// Makes a recording one that a C3D file can hold. Columns and joint angles become analog channels, one a component
+/// ("name.component"), with their units. All analog channels get the rate of the fastest: each sample of a slower one
+/// stands until its next. What has no place (segment poses, markers in another unit than the first, rates that do not
+/// fit) is left out. o_rRemarks says what was changed or left out, a sentence for each kind of thing.
+void FitToC3d(Recordings::VRecording& io_rRecording, std::vector<std::string>& o_rRemarks);
+
+} // namespace Streaming

@@ -1,0 +1,23 @@
+#include "Streaming/SaveLive.h"
+
+#include "Channels/VChannelContext.h"
+#include "Recordings/C3dWriter.h"
+#include "Streaming/LiveRecording.h"
+
+namespace Streaming
+{
+
+TQL::IResult SaveAsC3d(const Channels::VChannelContext& i_rContext, const std::filesystem::path& i_rPath,
+                       std::vector<std::string>& o_rRemarks, std::string& o_rError)
+{
+    Recordings::VRecording recording = CopyContext(i_rContext);
+    if (recording.Channels.empty() || recording.Range.IsEmpty())
+    {
+        o_rError = "there are no live data yet to save";
+        return TQL::Result::NotAvailable;
+    }
+    FitToC3d(recording, o_rRemarks);
+    return Recordings::WriteC3d(recording, i_rPath, o_rError);
+}
+
+} // namespace Streaming

@@ -1,0 +1,220 @@
+#include "Studio/VChannelPanel.h"
+
+#include "Channels/VChannelContext.h"
+#include "Channels/VChannelService.h"
+#include "Services/VSelectionSource.h"
+#include "Services/VTimeController.h"
+#include "Services/VUiPostalService.h"
+#include "Studio/ChannelLeaves.h"
+#include "Studio/VChannelFilterModel.h"
+#include "Studio/VChannelTreeModel.h"
+#include "Studio/VChannelTreeView.h"
+#include "Studio/VMainActions.h"
+#include "Studio/VStudioSession.h"
+
+#include <QtGui/QAction>
+#include <QtGui/QKeyEvent>
+#include <QtWidgets/QHBoxLayout>
+#include <QtWidgets/QLabel>
+#include <QtWidgets/QLineEdit>
+#include <QtWidgets/QToolButton>
+#include <QtWidgets/QVBoxLayout>
+
+namespace Studio
+{
+
+namespace
+{
+
+constexpr int mostExpanded = 200; // channels; of more only the subjects are unfolded at first
+
+} // namespace
+
+VChannelPanel::VChannelPanel(VStudioSession& i_rSession, VMainActions& i_rActions, QWidget* i_pParent)
+    : QWidget(i_pParent), m_rSession(i_rSession), m_Subscriptions(i_rSession.Host().Ledger())
+{
+    BuildSearch();
+    BuildTree();
+    auto* pLayout = new QVBoxLayout(this);
+    pLayout->setContentsMargins(0, 0, 0, 0);
+    pLayout->addWidget(m_pSearch);
+    pLayout->addWidget(m_pTree, 1);
+    pLayout->addWidget(MakeFoot(i_rActions));
+    connect(i_rActions.Get(EAction::TickShown), &QAction::triggered, this,
+            [this] { m_pShown->Tick(m_pShown->AllLeaves(), true); });
+    connect(i_rActions.Get(EAction::UntickAll), &QAction::triggered, this,
+            [this]
+            {
+                m_pModel->SetTicked({});
+                SetSelection();
+            });
+    Subscribe();
+    ShowCurrentContext();
+}
+
+VChannelPanel::~VChannelPanel() = default;
+
+void VChannelPanel::BuildSearch()
+{
+    m_pSearch = new QLineEdit(this);
+    m_pSearch->setObjectName(QStringLiteral("channelSearch"));
+    m_pSearch->setAccessibleName(tr("Search channels"));
+    m_pSearch->setPlaceholderText(tr("Search channels (Ctrl+F)"));
+    m_pSearch->setToolTip(tr("Words of names, kinds, units or components; all of them must fit.\n"
+                             "For example: walker1 knee, or analog V"));
+    m_pSearch->setClearButtonEnabled(true);
+    m_pSearch->setAcceptDrops(false); // a file that is dropped here is to be opened, too
+    m_pSearch->installEventFilter(this);
+    connect(m_pSearch, &QLineEdit::textChanged, this, &VChannelPanel::Search);
+}
+
+void VChannelPanel::BuildTree()
+{
+    m_pModel = new VChannelTreeModel(this);
+    m_pShown = new VChannelFilterModel(*m_pModel, this);
+    m_pTree = new VChannelTreeView(this);
+    m_pTree->setModel(m_pShown);
+    connect(m_pModel, &VChannelTreeModel::TickedChanged, this, &VChannelPanel::SetSelection);
+    connect(m_pTree, &VChannelTreeView::Left, this, &VChannelPanel::Left);
+    connect(m_pTree, &VChannelTreeView::ToggleRequested, this,
+            [this] { m_pShown->Toggle(m_pTree->selectionModel()->selectedRows()); });
+}
+
+QWidget* VChannelPanel::MakeFoot(VMainActions& i_rActions)
+{
+    auto* pFoot = new QWidget(this);
+    auto* pLayout = new QHBoxLayout(pFoot);
+    pLayout->setContentsMargins(0, 0, 0, 0);
+    for (const EAction action : {EAction::TickShown, EAction::UntickAll})
+    {
+        auto* pButton = new QToolButton(pFoot);
+        pButton->setDefaultAction(i_rActions.Get(action));
+        pButton->setFocusPolicy(Qt::TabFocus);
+        pLayout->addWidget(pButton);
+    }
+    m_pCount = new QLabel(pFoot);
+    m_pCount->setObjectName(QStringLiteral("tickedCount"));
+    m_pCount->setAlignment(Qt::AlignRight | Qt::AlignVCenter);
+    pLayout->addWidget(m_pCount, 1);
+    return pFoot;
+}
+
+void VChannelPanel::Subscribe()
+{
+    auto& rHost = m_rSession.Host();
+    m_Subscriptions.Subscribe(
+        rHost.TimeController()->CurrentSourceChanged(), [this] { ShowCurrentContext(); }, rHost.Ui());
+    m_Subscriptions.Subscribe(
+        m_rSession.Channels().ContextListChanged(), [this] { ShowCurrentContext(); }, rHost.Ui());
+    m_Subscriptions.Subscribe(
+        rHost.Selection()->Changed(), [this](bool) { TakeSelection(); }, rHost.Ui());
+}
+
+void VChannelPanel::FocusSearch()
+{
+    m_pSearch->setFocus(Qt::ShortcutFocusReason);
+    m_pSearch->selectAll();
+}
+
+bool VChannelPanel::eventFilter(QObject* i_pObject, QEvent* i_pEvent)
+{
+    if (i_pObject == m_pSearch && i_pEvent->type() == QEvent::KeyPress)
+        return HandleSearchKey(static_cast<QKeyEvent*>(i_pEvent)->key());
+    return QWidget::eventFilter(i_pObject, i_pEvent);
+}
+
+bool VChannelPanel::HandleSearchKey(int i_Key)
+{
+    switch (i_Key)
+    {
+    case Qt::Key_Escape:
+        if (m_pSearch->text().isEmpty())
+            Q_EMIT Left();
+        m_pSearch->clear();
+        return true;
+    case Qt::Key_Down:
+    case Qt::Key_Return:
+    case Qt::Key_Enter:
+        if (const QModelIndexList found = m_pShown->AllLeaves(); !found.isEmpty())
+        {
+            m_pTree->setCurrentIndex(found.front());
+            m_pTree->setFocus(Qt::TabFocusReason);
+        }
+        return true;
+    default:
+        return false;
+    }
+}
+
+void VChannelPanel::Search(const QString& i_rText)
+{
+    m_pShown->SetSearch(i_rText);
+    ExpandTree();
+    RefreshCount();
+}
+
+/// What is found is all in view.
+void VChannelPanel::ExpandTree()
+{
+    if (m_pShown->IsSearching())
+        m_pTree->expandAll();
+    else
+        m_pTree->expandToDepth(m_pModel->LeafCount() > mostExpanded ? 0 : 1);
+}
+
+/// The same channels again leave the tree as the operator has it.
+void VChannelPanel::SetLeaves(std::vector<ChannelTreeLeaf> i_Leaves)
+{
+    if (i_Leaves == m_Leaves)
+        return;
+    m_Leaves = std::move(i_Leaves);
+    m_pModel->SetLeaves(m_Leaves);
+    ExpandTree();
+}
+
+void VChannelPanel::ShowCurrentContext()
+{
+    const auto pContext = m_rSession.CurrentContext();
+    if (pContext)
+    {
+        const auto channels = ListChannels(*pContext);
+        std::vector<TQL::SelectionItem> known;
+        for (const SelectableChannel& rChannel : channels)
+            known.push_back(rChannel.Item);
+        SetLeaves(MakeLeaves(channels));
+        const auto items = m_Selection.Show(pContext->GetName(), known);
+        m_pModel->SetTicked(items);
+        m_rSession.Host().Selection()->Set(items);
+    }
+    else
+        SetLeaves({});
+    RefreshCount();
+}
+
+void VChannelPanel::TakeSelection()
+{
+    const auto items = AllItems(*m_rSession.Host().Selection()->GetSelection());
+    if (HoldSameItems(items, m_pModel->Ticked()))
+        return;
+    m_pModel->SetTicked(items);
+    m_Selection.Remember(m_pModel->Ticked());
+    RefreshCount();
+}
+
+void VChannelPanel::SetSelection()
+{
+    m_Selection.Remember(m_pModel->Ticked());
+    m_rSession.Host().Selection()->Set(m_pModel->Ticked());
+    RefreshCount();
+}
+
+void VChannelPanel::RefreshCount()
+{
+    const int all = m_pModel->LeafCount();
+    QString text = tr("%1 of %2 ticked").arg(m_pModel->Ticked().size()).arg(all);
+    if (m_pShown->IsSearching())
+        text = tr("%1 found, %2").arg(m_pShown->AllLeaves().size()).arg(text);
+    m_pCount->setText(all == 0 ? QString() : text);
+}
+
+} // namespace Studio

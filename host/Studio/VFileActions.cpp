@@ -1,0 +1,136 @@
+#include "Studio/VFileActions.h"
+
+#include "Channels/VChannelService.h"
+#include "Channels/VRecordedContext.h"
+#include "Studio/ContextNames.h"
+#include "Studio/Paths.h"
+#include "Studio/VMainActions.h"
+#include "Studio/VNoticeBar.h"
+#include "Studio/VOpenFiles.h"
+#include "Studio/VStudioSession.h"
+
+#include <QtCore/QCoreApplication>
+#include <QtGui/QAction>
+#include <QtWidgets/QFileDialog>
+#include <QtWidgets/QMenu>
+
+#include <algorithm>
+#include <utility>
+#include <vector>
+
+namespace Studio
+{
+
+namespace
+{
+
+constexpr std::uint32_t simulatedSubjects = 2;
+
+} // namespace
+
+VFileActions::VFileActions(VStudioSession& i_rSession, VMainActions& i_rActions, VOpenFiles& i_rFiles,
+                           VNoticeBar& i_rNotices, QWidget& i_rWindow)
+    : QObject(&i_rWindow), m_rSession(i_rSession), m_rFiles(i_rFiles), m_rNotices(i_rNotices), m_rWindow(i_rWindow)
+{
+    connect(i_rActions.Get(EAction::OpenFile), &QAction::triggered, this, &VFileActions::ChooseFiles);
+    connect(i_rActions.Get(EAction::OpenSample), &QAction::triggered, this, &VFileActions::OpenSample);
+    connect(i_rActions.Get(EAction::StartSimulation), &QAction::triggered, this, &VFileActions::StartSimulation);
+    connect(i_rActions.Get(EAction::Quit), &QAction::triggered, &i_rWindow, &QWidget::close);
+    VRecordingLoader& rLoader = m_rFiles.Loader();
+    connect(&rLoader, &VRecordingLoader::Finished, this,
+            [this](int, const QString& i_rContextName) { TakeOpened(i_rContextName); });
+    connect(&rLoader, &VRecordingLoader::Failed, this,
+            [this](int, const QString& i_rMessage) { m_rNotices.Add(i_rMessage); });
+    // After the last file of a batch nothing waits to be shown any more.
+    const auto settle = [this, &rLoader]
+    {
+        m_bShowNext = m_bShowNext && !rLoader.IsIdle();
+    };
+    connect(&rLoader, &VRecordingLoader::Failed, this, settle);
+    connect(&rLoader, &VRecordingLoader::Cancelled, this, settle);
+}
+
+void VFileActions::AddRecentMenu(VMainActions& i_rActions)
+{
+    QMenu* pFiles = i_rActions.Menu(EMenu::File);
+    auto* pRecent = new QMenu(tr("Open &recent"), pFiles);
+    pRecent->setObjectName(QStringLiteral("recentFiles"));
+    pFiles->insertMenu(i_rActions.Get(EAction::OpenSample), pRecent);
+    connect(pRecent, &QMenu::aboutToShow, this, [this, pRecent] { FillRecentMenu(*pRecent); });
+}
+
+void VFileActions::FillRecentMenu(QMenu& o_rMenu)
+{
+    o_rMenu.clear();
+    const auto entries = m_rFiles.Recent().List();
+    int number = 0;
+    for (const VRecentFiles::Entry& rEntry : entries)
+    {
+        QString path = QString::fromStdString(TextFromPath(rEntry.Path)).replace(QLatin1Char('&'), QLatin1String("&&"));
+        if (rEntry.bMissing)
+            path = tr("%1 (missing)").arg(path);
+        // The first nine have a key.
+        const QString text = ++number < 10 ? QStringLiteral("&%1  ").arg(number) + path : path;
+        QAction* pAction = o_rMenu.addAction(text, this, [this, file = rEntry.Path] { Open(file); });
+        pAction->setEnabled(!rEntry.bMissing);
+    }
+    o_rMenu.addSeparator();
+    QAction* pClean =
+        o_rMenu.addAction(tr("&Forget missing files"), this, [this] { m_rFiles.Recent().RemoveMissing(); });
+    pClean->setEnabled(std::ranges::any_of(entries, &VRecentFiles::Entry::bMissing));
+}
+
+void VFileActions::ChooseFiles()
+{
+    const QStringList texts = QFileDialog::getOpenFileNames(
+        &m_rWindow, tr("Open recordings"), QString(),
+        tr("Motion files (*.c3d *.bvh *.trc *.mot *.sto *.csv *.txt *.C3D *.BVH *.TRC *.MOT *.STO *.CSV);;"
+           "All files (*)"));
+    std::vector<std::filesystem::path> paths;
+    for (const QString& rText : texts)
+        paths.push_back(PathFromText(rText.toStdString()));
+    Open(paths);
+}
+
+void VFileActions::Open(std::span<const std::filesystem::path> i_Paths)
+{
+    m_bShowNext = m_bShowNext || !i_Paths.empty();
+    for (const auto& rPath : i_Paths)
+        m_rFiles.Open(rPath);
+}
+
+void VFileActions::OpenSample()
+{
+    const auto sample = FindSample(PathFromText(QCoreApplication::applicationDirPath().toStdString()));
+    if (sample.empty())
+        m_rNotices.Add(tr("The sample recording is missing: samples/walk.c3d"));
+    else
+        Open(sample);
+}
+
+void VFileActions::StartSimulation()
+{
+    m_rSession.StartLive(simulatedSubjects);
+    m_rSession.ShowContext(LiveContextName);
+}
+
+void VFileActions::TakeOpened(const QString& i_rContextName)
+{
+    const std::string name = i_rContextName.toStdString();
+    if (std::exchange(m_bShowNext, false))
+        m_rSession.ShowContext(name);
+    const auto pContext =
+        std::dynamic_pointer_cast<Channels::VRecordedContext>(m_rSession.Channels().FindContext(name));
+    if (pContext && !pContext->GetRecording()->Warnings.empty())
+        TellWarnings(QString::fromStdString(TextFromPath(m_rSession.FileOf(name).filename())),
+                     static_cast<int>(pContext->GetRecording()->Warnings.size()));
+}
+
+void VFileActions::TellWarnings(const QString& i_rFile, int i_Count)
+{
+    const QString warnings = i_Count == 1 ? tr("a warning") : tr("%1 warnings").arg(i_Count);
+    m_rNotices.Add(tr("%1 was opened with %2: something had to be guessed or repaired.").arg(i_rFile, warnings),
+                   tr("Show in the lo&g"), [this] { Q_EMIT ProblemsRequested(); });
+}
+
+} // namespace Studio

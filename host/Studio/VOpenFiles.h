@@ -1,0 +1,58 @@
+#pragma once
+
+#include "Studio/VFileWatch.h"
+#include "Studio/VRecentFiles.h"
+#include "Studio/VRecordingLoader.h"
+
+#include <QtCore/QObject>
+#include <QtCore/QString>
+
+#include <filesystem>
+#include <map>
+#include <set>
+#include <string>
+
+namespace Studio
+{
+
+class VStudioSession;
+
+/// The files that a window has open: reads them, remembers them among the recent ones, watches them and reads them
+/// again on request. Knows no widgets. Owned by the main window; the session outlives it. UI thread.
+class VOpenFiles : public QObject
+{
+    Q_OBJECT
+
+public:
+    explicit VOpenFiles(VStudioSession& i_rSession, QObject* i_pParent = nullptr);
+
+    VRecordingLoader& Loader() { return m_Loader; }
+    VRecentFiles& Recent() { return m_Recent; }
+
+    /// Gives the loader's number of the file; the loader's signals tell how it goes on.
+    int Open(const std::filesystem::path& i_rPath);
+
+    /// Reads the file of a context again. Nothing happens for a context without a file.
+    void Reload(const QString& i_rContextName);
+
+Q_SIGNALS:
+    /// The file of a context was written again by somebody else since it was read.
+    void ChangedOnDisk(const QString& i_rContextName, const QString& i_rFileName);
+    /// What ChangedOnDisk said holds no more: the file is being read again.
+    void ChangeTaken(const QString& i_rContextName);
+
+private:
+    void End(int i_Number, const QString& i_rContextName);
+    void OfferChange(const std::filesystem::path& i_rPath);
+    std::set<std::string> ContextsOf(const std::filesystem::path& i_rPath) const;
+    bool IsBeingRead(const std::filesystem::path& i_rPath) const;
+
+    VStudioSession& m_rSession;
+    VRecentFiles m_Recent;
+    VFileWatch m_Watch;
+    std::map<int, std::filesystem::path> m_Reading;     ///< by number
+    std::set<std::filesystem::path> m_ChangedMeanwhile; ///< while they were read
+    VRecordingLoader m_Loader;                          ///< the first to go
+};
+
+} // namespace Studio
