@@ -6,6 +6,7 @@
 #include <cstring>
 #include <limits>
 #include <memory>
+#include <type_traits>
 
 namespace Streaming
 {
@@ -16,10 +17,13 @@ namespace
 constexpr std::string_view BundleMark{"#bundle\0", 8};
 constexpr std::uint64_t AtOnce = 1; ///< the time tag that says no time
 
+/// The library's handle is a void pointer in one version and one to a struct in another.
 struct MessageDeleter
 {
-    void operator()(void* i_pMessage) const { lo_message_free(i_pMessage); }
+    using pointer = lo_message;
+    void operator()(lo_message i_Message) const { lo_message_free(i_Message); }
 };
+using Message = std::unique_ptr<std::remove_pointer_t<lo_message>, MessageDeleter>;
 
 std::uint64_t BigEndian(std::span<const std::byte> i_Bytes)
 {
@@ -133,7 +137,7 @@ bool VOscPacketReader::ReadMessage(std::span<const std::byte> i_Message, std::op
     }
     m_Copy.assign(i_Message.begin(), i_Message.end());
     int error = 0;
-    const std::unique_ptr<void, MessageDeleter> pMessage(lo_message_deserialise(m_Copy.data(), m_Copy.size(), &error));
+    const Message pMessage(lo_message_deserialise(m_Copy.data(), m_Copy.size(), &error));
     if (!pMessage)
         return false;
     m_Values.clear();
