@@ -136,7 +136,8 @@ private:
     {
         if (i_rWriter.HasValue(i_Entry))
             return;
-        const ISchema& rSchema = TQL::IO::GetUniqueSchema(MakeSchema(0));
+        const ISchema made = MakeSchema(0);
+        const ISchema& rSchema = TQL::IO::GetUniqueSchema(made);
         const auto flags = static_cast<std::uint32_t>(m_Random()) & Store::EntryFlag::Mask;
         ASSERT_TRUE(i_rWriter.EnableFlags(i_Entry, flags).IsSuccess());
         const bool bProposed = (flags & Store::EntryFlag::VerifyRequired) && Below(3) != 0;
