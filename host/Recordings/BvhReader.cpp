@@ -45,9 +45,9 @@ struct MotionHeader
 double RateOfFrameTime(std::string_view i_Cell, std::vector<std::string>& io_rWarnings)
 {
     double time = 0.0;
-    if (ReadNumber(i_Cell, false, time) != ECell::Number || !(time > 0.0) || !std::isfinite(1.0 / time))
+    if (ReadNumber(i_Cell, false, time) != ECell::Number || !(time > 0.0) || !IsUsableRate(1.0 / time))
     {
-        io_rWarnings.push_back("The frame time \"" + CellText(i_Cell.substr(0, 40)) + "\" is no time; " +
+        io_rWarnings.push_back("The frame time \"" + CellText(i_Cell.substr(0, 40)) + "\" is no usable time; " +
                                NumberText(AssumedRate) + " frames a second are assumed.");
         return AssumedRate;
     }
