@@ -53,7 +53,9 @@ TQL::IResult ReadText(const std::string& i_rPath, std::string& o_rText)
 int RunChannels(const CommandLine& i_rCommandLine, std::string& o_rError)
 {
     Recordings::VRecording recording;
-    if (Recordings::OpenRecording(PathFromText(i_rCommandLine.Files.front()), recording, o_rError).IsError())
+    if (Recordings::OpenRecording(PathFromText(i_rCommandLine.Files.front()), recording, o_rError,
+                                  {.bResample = i_rCommandLine.bResample})
+            .IsError())
         return StatusFailed;
     PrintWarnings(recording);
     return Print(i_rCommandLine.bJson ? FormatChannelJson(recording) : FormatChannelTable(recording), o_rError);
@@ -62,7 +64,9 @@ int RunChannels(const CommandLine& i_rCommandLine, std::string& o_rError)
 int RunExport(const CommandLine& i_rCommandLine, std::string& o_rError)
 {
     Recordings::VRecording recording;
-    if (Recordings::OpenRecording(PathFromText(i_rCommandLine.Files.front()), recording, o_rError).IsError())
+    if (Recordings::OpenRecording(PathFromText(i_rCommandLine.Files.front()), recording, o_rError,
+                                  {.bResample = i_rCommandLine.bResample})
+            .IsError())
         return StatusFailed;
     PrintWarnings(recording);
     const TQL::IResult result =

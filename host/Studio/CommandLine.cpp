@@ -111,6 +111,7 @@ bool ReadSubjects(std::string_view i_Text, std::uint32_t& o_rSubjects)
 }
 
 constexpr OptionRow options[] = {
+    {"--resample", "", channels | table, [](CommandLine& o_r, const std::string&) { return o_r.bResample = true; }, ""},
     {"--json", "", channels, [](CommandLine& o_r, const std::string&) { return o_r.bJson = true; }, ""},
     {"--csv", "OUT", table, [](CommandLine& o_r, const std::string& i_r) { return ReadText(o_r.CsvPath, i_r); },
      "the path of the table to write"},
@@ -332,8 +333,8 @@ std::string HelpText()
            "  graphplots-studio [FILE...] [--live [SUBJECTS]]\n"
            "  graphplots-studio [FILE...] --osc [ADDRESS:]PORT [--osc-rate HZ]\n"
            "  graphplots-studio [FILE...] --replay FILE [--speed X] [--loop]\n"
-           "  graphplots-studio channels FILE [--json]\n"
-           "  graphplots-studio export FILE --csv OUT [--channel PATTERN]...\n"
+           "  graphplots-studio channels FILE [--json] [--resample]\n"
+           "  graphplots-studio export FILE --csv OUT [--channel PATTERN]... [--resample]\n"
            "  graphplots-studio snapshot FILE|--live [SUBJECTS] --out PNG [--channel PATTERN]...\n"
            "                    [--size WxH] [--range A:B] [--values A:B] [--after MS]\n"
            "  graphplots-studio record --osc [ADDRESS:]PORT [--osc-rate HZ] --seconds N OUT.c3d\n"
@@ -341,6 +342,7 @@ std::string HelpText()
            "\n"
            "Without arguments the studio opens empty and says what to do.\n"
            "  --channel PATTERN  channels by name; * stands for any characters, ? for one\n"
+           "  --resample         rows at uneven times are interpolated to the nearest even rate\n"
            "  --size WxH         of the picture, in pixels\n"
            "  --range A:B        the time axis, in frames\n"
            "  --values A:B       the value axes, in the units of the channels\n"

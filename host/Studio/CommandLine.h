@@ -37,6 +37,7 @@ struct CommandLine
     double Speed = 1.0;                   ///< of the replay
     bool bLoop = false;                   ///< replay again and again
     double Seconds = 0.0;                 ///< how long to record
+    bool bResample = false;               ///< rows at uneven times are laid on an even rate
     bool bJson = false;
     std::string CsvPath;
     std::string PicturePath;

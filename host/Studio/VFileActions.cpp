@@ -33,6 +33,8 @@ VFileActions::VFileActions(VStudioSession& i_rSession, VMainActions& i_rActions,
     : QObject(&i_rWindow), m_rSession(i_rSession), m_rFiles(i_rFiles), m_rNotices(i_rNotices), m_rWindow(i_rWindow)
 {
     connect(i_rActions.Get(EAction::OpenFile), &QAction::triggered, this, &VFileActions::ChooseFiles);
+    connect(i_rActions.Get(EAction::Resample), &QAction::toggled, this,
+            [this](bool i_bOn) { m_rFiles.Loader().SetResampling(i_bOn); });
     connect(i_rActions.Get(EAction::OpenSample), &QAction::triggered, this, &VFileActions::OpenSample);
     connect(i_rActions.Get(EAction::StartSimulation), &QAction::triggered, this, &VFileActions::StartSimulation);
     connect(i_rActions.Get(EAction::Quit), &QAction::triggered, &i_rWindow, &QWidget::close);

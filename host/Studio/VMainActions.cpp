@@ -19,6 +19,8 @@ constexpr ActionRow rows[] = {
     {EAction::OpenFile, EMenu::File, "openFile", QT_TRANSLATE_NOOP("Actions", "&Open…"), "Ctrl+O"},
     {EAction::OpenSample, EMenu::File, "openSample", QT_TRANSLATE_NOOP("Actions", "Open the &sample"), "", false, true},
     {EAction::StartSimulation, EMenu::File, "startSimulation", QT_TRANSLATE_NOOP("Actions", "Start a si&mulation"), ""},
+    {EAction::Resample, EMenu::File, "resample", QT_TRANSLATE_NOOP("Actions", "&Resample files with uneven times"), "",
+     true, true},
     {EAction::Quit, EMenu::File, "quit", QT_TRANSLATE_NOOP("Actions", "&Quit"), "Ctrl+Q", false, true},
 
     {EAction::FindChannel, EMenu::Channels, "findChannel", QT_TRANSLATE_NOOP("Actions", "&Search"), "Ctrl+F"},

@@ -19,6 +19,7 @@ enum class EAction
 {
     OpenFile,
     OpenSample,
+    Resample,
     StartSimulation,
     Quit,
     FindChannel,

@@ -27,6 +27,7 @@ struct VRecordingLoader::Job
     std::string ContextName; ///< to be replaced; empty for a new one
 
     std::atomic<bool> bDropped{false};
+    bool bResample = false;
     std::atomic<double> Fraction{0.0};
     std::atomic<bool> bProgressPosted{false}; ///< a notice of progress is on its way
 
@@ -87,7 +88,7 @@ private:
                                            &i_pJob->bDropped);
         try
         {
-            i_pJob->Result = m_Read(i_pJob->Path, i_pJob->Recording, i_pJob->Error, progress);
+            i_pJob->Result = m_Read(i_pJob->Path, i_pJob->Recording, i_pJob->Error, {i_pJob->bResample, &progress});
         }
         catch (const std::exception& rException) // memory, above all; the studio goes on
         {
@@ -123,23 +124,18 @@ private:
 };
 
 VRecordingLoader::VRecordingLoader(VStudioSession& i_rSession, QObject* i_pParent)
-    : VRecordingLoader(
-          [](const std::filesystem::path& i_rPath, Recordings::VRecording& o_rRecording, std::string& o_rError,
-             Recordings::VReadProgress& io_rProgress)
-          {
-              Recordings::ReadOptions options;
-              options.pProgress = &io_rProgress;
-              return Recordings::OpenRecording(i_rPath, o_rRecording, o_rError, options);
-          },
-          [&i_rSession](Recordings::VRecording i_Recording, const std::filesystem::path& i_rPath,
-                        const std::string& i_rContextName)
-          {
-              if (i_rContextName.empty())
-                  return i_rSession.AddRecording(std::move(i_Recording), i_rPath);
-              return i_rSession.ReplaceRecording(i_rContextName, std::move(i_Recording)) ? i_rContextName
-                                                                                         : std::string();
-          },
-          i_pParent)
+    : VRecordingLoader([](const std::filesystem::path& i_rPath, Recordings::VRecording& o_rRecording,
+                          std::string& o_rError, const Recordings::ReadOptions& i_rOptions)
+                       { return Recordings::OpenRecording(i_rPath, o_rRecording, o_rError, i_rOptions); },
+                       [&i_rSession](Recordings::VRecording i_Recording, const std::filesystem::path& i_rPath,
+                                     const std::string& i_rContextName)
+                       {
+                           if (i_rContextName.empty())
+                               return i_rSession.AddRecording(std::move(i_Recording), i_rPath);
+                           return i_rSession.ReplaceRecording(i_rContextName, std::move(i_Recording)) ? i_rContextName
+                                                                                                      : std::string();
+                       },
+                       i_pParent)
 {
 }
 
@@ -171,6 +167,7 @@ int VRecordingLoader::Enqueue(const std::filesystem::path& i_rPath, const std::s
     auto pJob = std::make_shared<Job>();
     const int number = pJob->Number = ++m_LastNumber;
     pJob->Path = i_rPath;
+    pJob->bResample = m_bResampling;
     pJob->ContextName = i_rContextName;
     m_Jobs.emplace(number, pJob);
     Q_EMIT Started(number, QString::fromStdString(TextFromPath(i_rPath.filename())));

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "Recordings/ReadOptions.h"
 #include "Recordings/VReadProgress.h"
 #include "Recordings/VRecording.h"
 #include "TQL/IResult.h"
@@ -27,9 +28,10 @@ class VRecordingLoader : public QObject
     Q_OBJECT
 
 public:
-    /// Reads a file; called on the loader's thread. The error is one line that names the file.
+    /// Reads a file; called on the loader's thread, with a progress in the options. The error is one line that names
+    /// the file.
     using Read = std::function<TQL::IResult(const std::filesystem::path& i_rPath, Recordings::VRecording& o_rRecording,
-                                            std::string& o_rError, Recordings::VReadProgress& io_rProgress)>;
+                                            std::string& o_rError, const Recordings::ReadOptions& i_rOptions)>;
     /// Takes what was read from a file, in place of the context of that name unless it is empty; gives the name of the
     /// context, empty when that context is gone. UI thread.
     using Take = std::function<std::string(Recordings::VRecording i_Recording, const std::filesystem::path& i_rPath,
@@ -44,6 +46,9 @@ public:
 
     /// Queues a file that takes the place of what a context holds.
     int Reload(const std::filesystem::path& i_rPath, const std::string& i_rContextName);
+
+    /// Whether files with uneven times that are queued from now on are resampled to an even rate. Off at first.
+    void SetResampling(bool i_bOn) { m_bResampling = i_bOn; }
 
     /// Drops a file that is queued or being read; an unknown number, or one that has ended, does nothing.
     void Cancel(int i_Number);
@@ -68,6 +73,7 @@ private:
 
     Take m_Take;
     int m_LastNumber = 0;
+    bool m_bResampling = false;
     std::map<int, std::shared_ptr<Job>> m_Jobs; ///< those that have not ended, by number
     std::unique_ptr<Worker> m_pWorker;
 };

@@ -30,8 +30,14 @@ protected:
     {
         m_pLoader = std::make_unique<VRecordingLoader>(
             [this](const std::filesystem::path& i_rPath, VRecording& o_rRecording, std::string& o_rError,
-                   VReadProgress& io_rProgress)
-            { return Read(i_rPath.filename().string(), o_rRecording, o_rError, io_rProgress); },
+                   const Recordings::ReadOptions& i_rOptions)
+            {
+                const TQL::IResult result =
+                    Read(i_rPath.filename().string(), o_rRecording, o_rError, *i_rOptions.pProgress);
+                if (i_rOptions.bResample)
+                    o_rRecording.Name += " at an even rate";
+                return result;
+            },
             [this](VRecording i_Recording, const std::filesystem::path&, const std::string& i_rContextName)
             {
                 m_Text += "take " + i_Recording.Name + " for '" + i_rContextName + "', ";
@@ -97,6 +103,19 @@ TEST_F(RecordingLoader, FilesAreReadInTurnAndEachEndsOnce)
                       "fail 3 throws: reading failed: std::bad_alloc., "
                       "take two for 'old', finish 4 context of two, "
                       "take three for 'closed', fail 5 three: the recording that it was to replace has been closed., ");
+}
+
+TEST_F(RecordingLoader, ResamplesWhatIsQueuedWhileThatIsWanted)
+{
+    m_pLoader->Open("/in/one");
+    m_pLoader->SetResampling(true);
+    m_pLoader->Open("/in/two");
+    m_pLoader->SetResampling(false);
+    m_pLoader->Open("/in/three");
+    ASSERT_TRUE(WaitUntilIdle());
+    EXPECT_EQ(m_Text, "start 1 one, start 2 two, start 3 three, take one for '', finish 1 context of one, "
+                      "take two at an even rate for '', finish 2 context of two at an even rate, "
+                      "take three for '', finish 3 context of three, ");
 }
 
 TEST_F(RecordingLoader, CancellingEndsAtOnceAndTheNextGoesOn)
