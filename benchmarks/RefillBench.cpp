@@ -163,7 +163,7 @@ void RunRefill(Table& o_rTable)
     const Recording hour(samples, 1);
     const Recording day(samples, 24);
     const Recording tenDays(samples, 240);
-    for (const std::uint8_t level : {0, 3, 4, 5, 8, 12})
+    for (const std::uint8_t level : {0, 1, 3, 4, 5, 8, 9, 12})
     {
         CompareLengths(o_rTable, day, "24 h", hour, level);
         CompareLengths(o_rTable, tenDays, "240 h", hour, level);

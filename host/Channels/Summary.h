@@ -16,17 +16,6 @@ namespace Channels
 
 using ChannelSystem::LodRecord;
 
-/// A summary record as it is kept in memory: 16 bytes, for at most 2^24 samples.
-struct PackedRecord
-{
-    float Mean = 0.0f;
-    float Maximum = -std::numeric_limits<float>::infinity();
-    float Minimum = std::numeric_limits<float>::infinity();
-    std::uint32_t Count = 0;
-};
-
-static_assert(sizeof(PackedRecord) == 16);
-
 /// Gathers samples and records into one record.
 class Accumulator
 {
@@ -38,8 +27,7 @@ public:
         AddRun(i_Sample, i_Sample, i_Sample, 1);
     }
 
-    template <typename TRecord>
-    void Add(const TRecord& i_rRecord)
+    void Add(const LodRecord& i_rRecord)
     {
         if (i_rRecord.Count != 0)
             AddRun(static_cast<double>(i_rRecord.Mean) * static_cast<double>(i_rRecord.Count), i_rRecord.Maximum,
@@ -86,19 +74,5 @@ LodRecord Combine(std::span<const LodRecord> i_Records);
 /// rows.
 void SummariseFew(const float* i_pRows, std::size_t i_Components, std::size_t i_RowsEach, std::size_t i_Records,
                   LodRecord* o_pRecords);
-
-/// Records of 16 rows each.
-void SummariseSixteens(const float* i_pRows, std::size_t i_Components, std::size_t i_Records, PackedRecord* o_pRecords);
-
-/// Records of two records each.
-void CombinePairs(const PackedRecord* i_pRecords, std::size_t i_Components, std::size_t i_Records,
-                  LodRecord* o_pRecords);
-
-/// Records of four records each.
-void CombineFours(const PackedRecord* i_pRecords, std::size_t i_Components, std::size_t i_Records,
-                  PackedRecord* o_pRecords);
-
-/// From the form in memory to the form for readers.
-void Unpack(const PackedRecord* i_pRecords, std::size_t i_Count, LodRecord* o_pRecords);
 
 } // namespace Channels

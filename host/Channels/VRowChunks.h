@@ -11,8 +11,9 @@ namespace Channels
 
 /// Rows of values in chunks of fixed size, addressed by row numbers that may be negative. Growing at either end never
 /// moves a value, and the memory of rows that are no longer wanted is given back by the chunk; one freed chunk is kept
-/// for the next growth. Chunks begin at multiples of TRows. Not thread-safe: the owner keeps changes of the table of
-/// chunks (Ensure, FreeBefore, Clear) apart from everything else.
+/// for the next growth. Chunks begin at multiples of TRows, and one value behind a chunk's last can be read, whatever
+/// it holds. Not thread-safe: the owner keeps changes of the table of chunks (Ensure, FreeBefore, Clear) apart from
+/// everything else.
 template <typename T, std::int64_t TRows>
 class VRowChunks
 {
@@ -77,7 +78,7 @@ private:
     {
         if (m_pSpare)
             return std::move(m_pSpare);
-        return std::make_unique_for_overwrite<T[]>(static_cast<std::size_t>(TRows) * m_Width);
+        return std::make_unique_for_overwrite<T[]>(static_cast<std::size_t>(TRows) * m_Width + 1);
     }
 
     std::size_t m_Width;

@@ -1,6 +1,7 @@
 #include "Channels/VSummaryPyramid.h"
 
 #include <algorithm>
+#include <utility>
 
 namespace Channels
 {
@@ -15,6 +16,23 @@ std::int64_t CeilShift(std::int64_t i_Value, std::uint32_t i_Shift)
 
 } // namespace
 
+VSummaryPyramid::Level::Level(std::uint32_t i_Level, std::size_t i_Components)
+    : m_Records(i_Components), m_Counts(i_Components * CountBytesOf(i_Level))
+{
+}
+
+void VSummaryPyramid::Level::Ensure(std::int64_t i_First, std::int64_t i_End)
+{
+    m_Records.Ensure(i_First, i_End);
+    m_Counts.Ensure(i_First, i_End);
+}
+
+void VSummaryPyramid::Level::FreeBefore(std::int64_t i_Bin)
+{
+    m_Records.FreeBefore(i_Bin);
+    m_Counts.FreeBefore(i_Bin);
+}
+
 VSummaryPyramid::VSummaryPyramid(std::uint32_t i_Components) : m_Components(i_Components) {}
 
 VSummaryPyramid::Bins VSummaryPyramid::CompletedBins(std::uint32_t i_Level, std::int64_t i_From, std::int64_t i_To,
@@ -26,7 +44,7 @@ VSummaryPyramid::Bins VSummaryPyramid::CompletedBins(std::uint32_t i_Level, std:
 
 bool VSummaryPyramid::Covers(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End) const
 {
-    for (std::uint32_t level = FirstLevel; level < LevelCount; level += 2)
+    for (std::uint32_t level = FirstLevel; level < LevelCount; ++level)
     {
         const Bins bins = CompletedBins(level, i_From, i_To, i_First, i_End);
         if (bins.First >= bins.End) // nor any above: a complete bin is made of complete bins
@@ -39,13 +57,13 @@ bool VSummaryPyramid::Covers(std::int64_t i_From, std::int64_t i_To, std::int64_
 
 void VSummaryPyramid::Ensure(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End)
 {
-    for (std::uint32_t level = FirstLevel; level < LevelCount; level += 2)
+    for (std::uint32_t level = FirstLevel; level < LevelCount; ++level)
     {
         const Bins bins = CompletedBins(level, i_From, i_To, i_First, i_End);
         if (bins.First >= bins.End)
             return;
         while (PlaceOf(level) >= m_Levels.size())
-            m_Levels.emplace_back(m_Components);
+            m_Levels.emplace_back(FirstLevel + static_cast<std::uint32_t>(m_Levels.size()), m_Components);
         m_Levels[PlaceOf(level)].Ensure(bins.First, bins.End);
     }
 }
@@ -53,7 +71,7 @@ void VSummaryPyramid::Ensure(std::int64_t i_From, std::int64_t i_To, std::int64_
 void VSummaryPyramid::Build(const VSampleRows& i_rRows, std::int64_t i_From, std::int64_t i_To, std::int64_t i_First,
                             std::int64_t i_End)
 {
-    for (std::uint32_t level = FirstLevel; level < LevelCount; level += 2)
+    for (std::uint32_t level = FirstLevel; level < LevelCount; ++level)
     {
         const Bins bins = CompletedBins(level, i_From, i_To, i_First, i_End);
         if (bins.First >= bins.End)
@@ -64,18 +82,18 @@ void VSummaryPyramid::Build(const VSampleRows& i_rRows, std::int64_t i_From, std
 
 void VSummaryPyramid::BuildLevel(const VSampleRows& i_rRows, std::uint32_t i_Level, Bins i_Bins)
 {
-    Chunks& rTarget = m_Levels[PlaceOf(i_Level)];
+    Level& rTarget = m_Levels[PlaceOf(i_Level)];
     while (i_Bins.First < i_Bins.End)
     {
-        std::int64_t run = std::min(Chunks::RunLength(i_Bins.First), i_Bins.End - i_Bins.First);
+        std::int64_t run = std::min(Level::RunLength(i_Bins.First), i_Bins.End - i_Bins.First);
         if (i_Level > FirstLevel)
-            run = std::min(run, Chunks::RunLength(4 * i_Bins.First) / 4);
-        const auto records = static_cast<std::size_t>(run);
-        PackedRecord* pTarget = rTarget.Row(i_Bins.First);
+            run = std::min(run, Level::RunLength(2 * i_Bins.First) / 2);
+        const auto bins = static_cast<std::size_t>(run);
         if (i_Level == FirstLevel)
-            SummariseSixteens(i_rRows.Row(16 * i_Bins.First), m_Components, records, pTarget);
+            SummariseSixteens(i_rRows.Row(16 * i_Bins.First), m_Components, bins, rTarget.Run(i_Bins.First));
         else
-            CombineFours(m_Levels[PlaceOf(i_Level) - 1].Row(4 * i_Bins.First), m_Components, records, pTarget);
+            CombinePairs(std::as_const(m_Levels[PlaceOf(i_Level) - 1]).Run(2 * i_Bins.First), i_Level, m_Components,
+                         bins, rTarget.Run(i_Bins.First));
         i_Bins.First += run;
     }
 }
@@ -83,7 +101,7 @@ void VSummaryPyramid::BuildLevel(const VSampleRows& i_rRows, std::uint32_t i_Lev
 bool VSummaryPyramid::CanFreeBefore(std::int64_t i_Row) const
 {
     for (std::size_t place = 0; place < m_Levels.size(); ++place)
-        if (m_Levels[place].CanFreeBefore(i_Row >> (FirstLevel + 1 + 2 * place)))
+        if (m_Levels[place].CanFreeBefore(i_Row >> (FirstLevel + 1 + place)))
             return true;
     return false;
 }
@@ -91,7 +109,7 @@ bool VSummaryPyramid::CanFreeBefore(std::int64_t i_Row) const
 void VSummaryPyramid::FreeBefore(std::int64_t i_Row)
 {
     for (std::size_t place = 0; place < m_Levels.size(); ++place)
-        m_Levels[place].FreeBefore(i_Row >> (FirstLevel + 1 + 2 * place));
+        m_Levels[place].FreeBefore(i_Row >> (FirstLevel + 1 + place));
 }
 
 void VSummaryPyramid::Clear()
@@ -101,28 +119,28 @@ void VSummaryPyramid::Clear()
 
 void VSummaryPyramid::Read(std::uint32_t i_Level, std::int64_t i_First, std::int64_t i_End, LodRecord* o_pRecords) const
 {
-    const std::int64_t share = (i_Level - FirstLevel) % 2 == 0 ? 1 : 2; // kept records a bin
-    const Chunks& rLevel = m_Levels[PlaceOf(i_Level)];
+    const Level& rLevel = m_Levels[PlaceOf(i_Level)];
     while (i_First < i_End)
     {
-        const std::int64_t run = std::min(Chunks::RunLength(share * i_First) / share, i_End - i_First);
+        const std::int64_t run = std::min(Level::RunLength(i_First), i_End - i_First);
         const std::size_t count = static_cast<std::size_t>(run) * m_Components;
-        const PackedRecord* pRecords = rLevel.Row(share * i_First);
-        if (share == 1)
-            Unpack(pRecords, count, o_pRecords);
-        else
-            CombinePairs(pRecords, m_Components, static_cast<std::size_t>(run), o_pRecords);
+        Unpack(rLevel.Run(i_First), i_Level, count, o_pRecords);
         o_pRecords += count;
         i_First += run;
     }
 }
 
-void VSummaryPyramid::GatherBin(std::size_t i_Place, std::int64_t i_Bin, std::size_t i_Component,
+void VSummaryPyramid::GatherBin(std::uint32_t i_Level, std::int64_t i_Bin, std::size_t i_Component,
                                 std::span<Accumulator> o_Accumulators) const
 {
-    const PackedRecord* pRecords = m_Levels[i_Place].Row(i_Bin) + i_Component;
+    const ConstPackedRun run = m_Levels[PlaceOf(i_Level)].Run(i_Bin);
     for (std::size_t c = 0; c < o_Accumulators.size(); ++c)
-        o_Accumulators[c].Add(pRecords[c]);
+    {
+        const std::size_t record = i_Component + c;
+        LodRecord unpacked;
+        Unpack({run.pRecords + record, run.pCounts + record * CountBytesOf(i_Level)}, i_Level, 1, &unpacked);
+        o_Accumulators[c].Add(unpacked);
+    }
 }
 
 void VSummaryPyramid::Gather(const VSampleRows& i_rRows, std::int64_t i_From, std::int64_t i_To,
@@ -140,21 +158,21 @@ void VSummaryPyramid::Gather(const VSampleRows& i_rRows, std::int64_t i_From, st
         return gatherRows(i_From, i_To);
     gatherRows(i_From, bins.First << (FirstLevel + 1));
     gatherRows(bins.End << (FirstLevel + 1), i_To);
-    for (std::size_t place = 0; bins.First < bins.End; ++place)
+    for (std::uint32_t level = FirstLevel; bins.First < bins.End; ++level)
     {
-        const bool bLast = place == PlaceOf(LevelCount - 1);
-        while (bins.First < bins.End && (bLast || (bins.First & 3) != 0))
-            GatherBin(place, bins.First++, i_Component, o_Accumulators);
-        while (bins.First < bins.End && (bins.End & 3) != 0)
-            GatherBin(place, --bins.End, i_Component, o_Accumulators);
-        bins = {bins.First >> 2, bins.End >> 2};
+        const bool bLast = level == LevelCount - 1;
+        while (bins.First < bins.End && (bLast || (bins.First & 1) != 0))
+            GatherBin(level, bins.First++, i_Component, o_Accumulators);
+        if (bins.First < bins.End && (bins.End & 1) != 0)
+            GatherBin(level, --bins.End, i_Component, o_Accumulators);
+        bins = {bins.First >> 1, bins.End >> 1};
     }
 }
 
 std::size_t VSummaryPyramid::ByteCount() const
 {
     std::size_t bytes = 0;
-    for (const Chunks& rLevel : m_Levels)
+    for (const Level& rLevel : m_Levels)
         bytes += rLevel.ByteCount();
     return bytes;
 }

@@ -1,8 +1,11 @@
 #include "Channels/Summary.h"
+#include "Channels/PackedRecords.h"
 #include "Reference.h"
 
 #include <algorithm>
 #include <array>
+#include <utility>
+#include <vector>
 
 namespace ChannelsTest
 {
@@ -113,12 +116,27 @@ void ExpectRecords(std::span<const LodRecord> i_Records, std::span<const float> 
     }
 }
 
-std::vector<LodRecord> UnpackAll(const std::vector<Channels::PackedRecord>& i_rRecords)
+/// The records of one level, with the value behind the last one that their readers may touch.
+struct PackedLevel
 {
-    std::vector<LodRecord> records(i_rRecords.size());
-    Channels::Unpack(i_rRecords.data(), records.size(), records.data());
-    return records;
-}
+    PackedLevel(std::uint32_t i_Level, std::size_t i_Count)
+        : Level(i_Level), Count(i_Count), Records(i_Count + 1), Counts(i_Count * Channels::CountBytesOf(i_Level))
+    {
+    }
+    Channels::PackedRun Run() { return {Records.data(), Counts.data()}; }
+    Channels::ConstPackedRun Run() const { return {Records.data(), Counts.data()}; }
+    std::vector<LodRecord> Unpacked() const
+    {
+        std::vector<LodRecord> records(Count);
+        Channels::Unpack(Run(), Level, Count, records.data());
+        return records;
+    }
+
+    std::uint32_t Level;
+    std::size_t Count;
+    std::vector<Channels::PackedRecord> Records;
+    std::vector<std::uint8_t> Counts;
+};
 
 TEST(Summary, RecordsOfFewRowsAgreeWithTheSlowWay)
 {
@@ -142,7 +160,7 @@ TEST(Summary, RecordsForEveryWidthAndOfExtremeValues)
     constexpr float huge = std::numeric_limits<float>::max();
     for (std::size_t width = 1; width <= 13; ++width)
     {
-        constexpr std::size_t count = 128; // rows
+        constexpr std::size_t count = 4096; // rows
         std::vector<float> rows = RandomSamples(count * width, static_cast<std::uint32_t>(width));
         std::fill_n(rows.begin(), 4 * width, huge);
         std::fill_n(rows.begin() + static_cast<std::ptrdiff_t>(32 * width), 20 * width, NaN);
@@ -153,26 +171,29 @@ TEST(Summary, RecordsForEveryWidthAndOfExtremeValues)
             Channels::SummariseFew(rows.data(), width, rowsEach, count / rowsEach, records.data());
             ExpectRecords(records, rows, width, rowsEach);
         }
-        std::vector<Channels::PackedRecord> sixteens(count / 16 * width);
-        Channels::SummariseSixteens(rows.data(), width, count / 16, sixteens.data());
-        ExpectRecords(UnpackAll(sixteens), rows, width, 16);
-        std::vector<LodRecord> pairs(count / 32 * width);
-        Channels::CombinePairs(sixteens.data(), width, count / 32, pairs.data());
-        ExpectRecords(pairs, rows, width, 32);
-        std::vector<Channels::PackedRecord> fours(count / 64 * width);
-        Channels::CombineFours(sixteens.data(), width, count / 64, fours.data());
-        ExpectRecords(UnpackAll(fours), rows, width, 64);
+        PackedLevel level(3, count / 16 * width);
+        Channels::SummariseSixteens(rows.data(), width, count / 16, level.Run());
+        ExpectRecords(level.Unpacked(), rows, width, 16);
+        while (level.Level < 11)
+        {
+            PackedLevel next(level.Level + 1, level.Count / 2);
+            Channels::CombinePairs(std::as_const(level).Run(), next.Level, width, next.Count / width, next.Run());
+            ExpectRecords(next.Unpacked(), rows, width, std::size_t{2} << next.Level);
+            level = std::move(next);
+        }
     }
 }
 
 TEST(Summary, CombiningWeighsByCount)
 {
-    const std::array<Channels::PackedRecord, 4> records{{{1.0f, 1.0f, 1.0f, 3}, {5.0f, 5.0f, 5.0f, 1}, {}, {}}};
-    std::array<LodRecord, 2> combined;
-    Channels::CombinePairs(records.data(), 1, 2, combined.data());
-    EXPECT_EQ(combined[0].Mean, 2.0f);
-    EXPECT_EQ(combined[0].Count, 4u);
-    EXPECT_TRUE(IsSame(combined[1], LodRecord{}));
+    PackedLevel below(3, 4);
+    below.Records = {{1.0f, 1.0f, 1.0f}, {5.0f, 5.0f, 5.0f}, {}, {}, {}};
+    below.Counts = {3, 1, 0, 0};
+    PackedLevel combined(4, 2);
+    Channels::CombinePairs(std::as_const(below).Run(), 4, 1, 2, combined.Run());
+    EXPECT_EQ(combined.Unpacked()[0].Mean, 2.0f);
+    EXPECT_EQ(combined.Unpacked()[0].Count, 4u);
+    EXPECT_TRUE(IsSame(combined.Unpacked()[1], LodRecord{}));
 }
 
 } // namespace ChannelsTest
