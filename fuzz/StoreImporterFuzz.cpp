@@ -4,6 +4,7 @@
 #include "StoreIO/VStoreExporterJson.h"
 #include "StoreIO/VStoreImporterJson.h"
 #include "StoreInterface/ScopedAccess.h"
+#include "TQL/TextStream.h"
 #include "TQL/Log.h"
 
 #include <algorithm>
@@ -18,40 +19,10 @@
 namespace
 {
 
-class TextInput : public TQL::IInputStream
-{
-public:
-    explicit TextInput(std::string_view i_Text) : m_Text(i_Text) {}
-
-    std::pair<std::size_t, TQL::IResult> Read(std::span<std::byte> o_Bytes) override
-    {
-        const std::size_t count = std::min(o_Bytes.size(), m_Text.size());
-        std::copy_n(reinterpret_cast<const std::byte*>(m_Text.data()), count, o_Bytes.data());
-        m_Text.remove_prefix(count);
-        return {count, TQL::Result::Ok};
-    }
-
-private:
-    std::string_view m_Text;
-};
-
-class TextOutput : public TQL::IOutputStream
-{
-public:
-    TQL::IResult Write(std::span<const std::byte> i_Bytes) override
-    {
-        Text.append(reinterpret_cast<const char*>(i_Bytes.data()), i_Bytes.size());
-        return TQL::Result::Ok;
-    }
-    TQL::IResult Flush() override { return TQL::Result::Ok; }
-
-    std::string Text;
-};
-
 TQL::IResult Import(TQL::IStore& i_rStore, std::string_view i_Text)
 {
     StoreIO::VStoreImporterJson importer;
-    TextInput input(i_Text);
+    TQL::VTextInput input(i_Text);
     const TQL::IResult read = importer.ReadStream(input);
     return read.IsError() ? read : importer.Import(*TQL::ScopedWrite(i_rStore));
 }
@@ -60,10 +31,10 @@ TQL::IResult Import(TQL::IStore& i_rStore, std::string_view i_Text)
 std::optional<std::string> Export(TQL::IStore& i_rStore)
 {
     StoreIO::VStoreExporterJson exporter;
-    TextOutput output;
+    TQL::VTextOutput output;
     if (exporter.Export(*TQL::ScopedRead(i_rStore)).IsError() || exporter.WriteToStream(output).IsError())
         return std::nullopt;
-    return output.Text;
+    return output.Text();
 }
 
 } // namespace

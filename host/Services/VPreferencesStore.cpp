@@ -24,6 +24,8 @@ namespace
 using Store::EntryHandle;
 namespace EntryFlag = Store::EntryFlag;
 
+constexpr int s_MostBroken = 10; ///< files put aside; one more replaces the last
+
 template <typename... Args>
 void LogError(const char* i_pFormat, const Args&... i_rArgs)
 {
@@ -106,10 +108,12 @@ TQL::IResult VPreferencesStore::Import(StoreIO::IStoreImporter& i_rImporter)
     return imported;
 }
 
-/// What the operator has must not be written over by what this program made of it.
+/// What the operator has must not be written over by what this program made of it, nor one broken file by the next.
 void VPreferencesStore::MoveAside()
 {
-    const std::string broken = m_Path + ".broken";
+    std::string broken = m_Path + ".broken";
+    for (int number = 2; QFileInfo::exists(QString::fromStdString(broken)) && number < s_MostBroken; ++number)
+        broken = m_Path + ".broken" + std::to_string(number);
     if (const TQL::IResult moved = UtilsFileSystem::ReplaceFile(m_Path, broken); moved.IsError())
     {
         m_bSaves = false;

@@ -6,10 +6,9 @@
 #include "StoreInterface/ScopedAccess.h"
 #include "Studio/StoreFileLint.h"
 #include "Studio/StoreText.h"
-#include "TQL/IStream.h"
+#include "TQL/TextStream.h"
 
 #include <algorithm>
-#include <cstring>
 #include <span>
 #include <vector>
 
@@ -20,31 +19,13 @@ namespace
 
 constexpr std::size_t s_MostLines = 100;
 
-class VTextStream : public TQL::IInputStream
-{
-public:
-    explicit VTextStream(std::string_view i_Text) : m_Rest(i_Text) {}
-
-    std::pair<std::size_t, TQL::IResult> Read(std::span<std::byte> o_Bytes) override
-    {
-        const std::size_t size = std::min(o_Bytes.size(), m_Rest.size());
-        if (size != 0)
-            std::memcpy(o_Bytes.data(), m_Rest.data(), size);
-        m_Rest.remove_prefix(size);
-        return {size, TQL::Result::Ok};
-    }
-
-private:
-    std::string_view m_Rest;
-};
-
 /// What an application would get from the file: as a tree, and the errors that it would log.
 std::string ReadAsApplication(std::string_view i_Text, std::vector<TextProblem>& o_rErrors)
 {
     const Services::VGlobalLogSink sink(s_MostLines + 1, nullptr, nullptr);
     const auto pStore = TQL::MakeShared<Store::VStore>();
     StoreIO::VStoreImporterJson importer;
-    VTextStream stream(i_Text);
+    TQL::VTextInput stream(i_Text);
     TQL::IResult result = importer.ReadStream(stream);
     if (result.IsSuccess())
     {

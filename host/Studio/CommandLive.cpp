@@ -115,24 +115,12 @@ int RunRecord(const CommandLine& i_rCommandLine, std::string& o_rError)
     return StatusOk;
 }
 
-bool NamesLiveInput(const CommandLine& i_rCommandLine)
-{
-    return i_rCommandLine.OscPort != 0 || !i_rCommandLine.ReplayPath.empty();
-}
-
-bool StartLiveInput(VStudioSession& o_rSession, const CommandLine& i_rCommandLine, std::string& o_rMessage,
+bool StartListening(VStudioSession& o_rSession, const CommandLine& i_rCommandLine, std::string& o_rMessage,
                     std::string& o_rError)
 {
-    if (i_rCommandLine.OscPort != 0)
-    {
-        if (o_rSession.StartOsc(OscOptions(i_rCommandLine), o_rError).IsError())
-            return false;
-        o_rMessage = ListeningText(i_rCommandLine.OscAddress, o_rSession.OscPort());
-    }
-    else if (std::string name;
-             o_rSession.OpenFile(PathFromText(i_rCommandLine.ReplayPath), name, o_rError).IsError() ||
-             o_rSession.StartReplay(name, i_rCommandLine.Speed, i_rCommandLine.bLoop, o_rError).IsError())
+    if (o_rSession.StartOsc(OscOptions(i_rCommandLine), o_rError).IsError())
         return false;
+    o_rMessage = ListeningText(i_rCommandLine.OscAddress, o_rSession.OscPort());
     o_rSession.ShowContext(LiveContextName);
     return true;
 }

@@ -6,6 +6,7 @@
 #include "Studio/Paths.h"
 #include "Studio/VLogModel.h"
 #include "Studio/VMainWindow.h"
+#include "Studio/VOpenFiles.h"
 #include "Studio/VStudioSession.h"
 
 #include <QtWidgets/QApplication>
@@ -15,6 +16,31 @@
 
 namespace Studio
 {
+
+namespace
+{
+
+/// The file is read in the background like any other; when it is there, it becomes the live input.
+void ReplayWhenRead(VMainWindow& i_rWindow, VStudioSession& i_rSession, const CommandLine& i_rCommandLine)
+{
+    VRecordingLoader& rLoader = i_rWindow.Files().Loader();
+    const std::filesystem::path path = PathFromText(i_rCommandLine.ReplayPath);
+    i_rWindow.OpenFile(path);
+    const int number = rLoader.LastNumber();
+    QObject::connect(&rLoader, &VRecordingLoader::Finished, &i_rWindow,
+                     [&i_rWindow, &i_rSession, number, speed = i_rCommandLine.Speed,
+                      bLoop = i_rCommandLine.bLoop](int i_Number, const QString& i_rContextName)
+                     {
+                         if (i_Number != number)
+                             return;
+                         std::string error;
+                         if (i_rSession.StartReplay(i_rContextName.toStdString(), speed, bLoop, error).IsError())
+                             return i_rWindow.ShowMessage("Not replayed: " + error);
+                         i_rSession.ShowContext(LiveContextName);
+                     });
+}
+
+} // namespace
 
 int RunWindow(const CommandLine& i_rCommandLine, std::string& o_rError)
 {
@@ -32,14 +58,15 @@ int RunWindow(const CommandLine& i_rCommandLine, std::string& o_rError)
             session.StartLive(i_rCommandLine.Subjects);
             session.ShowContext(LiveContextName);
         }
-        if (NamesLiveInput(i_rCommandLine))
+        if (i_rCommandLine.OscPort != 0)
         {
             std::string message;
-            if (!StartLiveInput(session, i_rCommandLine, message, o_rError))
+            if (!StartListening(session, i_rCommandLine, message, o_rError))
                 return StatusFailed;
-            if (!message.empty())
-                window.ShowMessage(message);
+            window.ShowMessage(message);
         }
+        if (!i_rCommandLine.ReplayPath.empty())
+            ReplayWhenRead(window, session, i_rCommandLine);
         std::vector<std::filesystem::path> files;
         for (const std::string& rFile : i_rCommandLine.Files)
             files.push_back(PathFromText(rFile));

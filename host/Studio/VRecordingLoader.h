@@ -54,6 +54,8 @@ public:
     void Cancel(int i_Number);
     void CancelAll();
 
+    int LastNumber() const { return m_LastNumber; } ///< of the file that was queued last; 0 for none
+
     bool IsIdle() const { return m_Jobs.empty(); } ///< nothing is queued or being read
 
 Q_SIGNALS:

@@ -128,17 +128,19 @@ TEST_F(PreferencesStore, AFaultyFileIsKeptAside)
         {"{ \"Version\" : \"3.1\", \"Children\" : { " + std::string(good) + " } }", 0},
         {begin + good + ", \"B\" : { \"Value\" : \"x\", \"Type\" : \"List\" } } }", 5},
     };
-    for (const auto& rRow : rows)
+    for (int number = 1; const auto& rRow : rows)
     {
+        const std::string broken = m_Broken.string() + (number == 1 ? "" : std::to_string(number));
+        ++number;
         WriteFile(rRow.Text);
         {
             const auto pPreferences = Open();
             const auto errors = TakeErrors();
             ASSERT_EQ(errors.size(), 1u) << rRow.Text;
-            EXPECT_NE(errors[0].find(m_Broken.string()), std::string::npos) << errors[0];
+            EXPECT_NE(errors[0].find(broken + "\""), std::string::npos) << errors[0];
             EXPECT_EQ(Get(*pPreferences->GetStore(), "A"), rRow.Kept) << rRow.Text;
         }
-        EXPECT_EQ(ReadFile(m_Broken), rRow.Text);
+        EXPECT_EQ(ReadFile(broken), rRow.Text);
         EXPECT_EQ(Get(*Open()->GetStore(), "A"), rRow.Kept) << "as the good part was saved: " << rRow.Text;
         EXPECT_TRUE(TakeErrors().empty()) << "told once: " << rRow.Text;
     }

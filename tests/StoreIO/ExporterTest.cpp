@@ -55,9 +55,9 @@ private:
 
 std::string TextOf(const VStoreExporterJson& i_rExporter)
 {
-    StoreIOTest::TextOutput stream;
+    TQL::VTextOutput stream;
     EXPECT_EQ(i_rExporter.WriteToStream(stream), Result::Ok);
-    return stream.Text;
+    return stream.Text();
 }
 
 struct Entry

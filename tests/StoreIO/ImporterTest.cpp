@@ -284,7 +284,7 @@ TEST(Importer, GivesTheErrorOfAStreamThatBreaks)
     const std::string file = File("");
     for (const std::size_t size : {std::size_t{5}, file.size()})
     {
-        TextInput input(std::string_view(file).substr(0, size), TQL::Result::FileIOFailure);
+        TQL::VTextInput input(std::string_view(file).substr(0, size), TQL::Result::FileIOFailure);
         EXPECT_EQ(importer.ReadStream(input), TQL::Result::FileIOFailure);
         const auto pStore = MakeStore();
         EXPECT_EQ(importer.Import(*TQL::ScopedWrite(*pStore)), TQL::Result::InvalidFormat);

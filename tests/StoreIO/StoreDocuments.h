@@ -5,6 +5,7 @@
 #include "StoreIO/VStoreExporterJson.h"
 #include "StoreIO/VStoreImporterJson.h"
 #include "StoreInterface/ScopedAccess.h"
+#include "TQL/TextStream.h"
 #include "TQL/ISchema.h"
 
 #include <algorithm>
@@ -17,41 +18,6 @@
 namespace StoreIOTest
 {
 
-/// Gives a text in small pieces, and the result that it is told to at the end.
-class TextInput : public TQL::IInputStream
-{
-public:
-    explicit TextInput(std::string_view i_Text, TQL::IResult i_AtEnd = TQL::Result::Ok)
-        : m_Text(i_Text), m_AtEnd(i_AtEnd)
-    {
-    }
-
-    std::pair<std::size_t, TQL::IResult> Read(std::span<std::byte> o_Bytes) override
-    {
-        const std::size_t count = std::min(o_Bytes.size(), m_Text.size());
-        std::memcpy(o_Bytes.data(), m_Text.data(), count);
-        m_Text.remove_prefix(count);
-        return {count, count < o_Bytes.size() ? m_AtEnd : TQL::Result::Ok};
-    }
-
-private:
-    std::string_view m_Text;
-    TQL::IResult m_AtEnd;
-};
-
-class TextOutput : public TQL::IOutputStream
-{
-public:
-    TQL::IResult Write(std::span<const std::byte> i_Bytes) override
-    {
-        Text.append(reinterpret_cast<const char*>(i_Bytes.data()), i_Bytes.size());
-        return TQL::Result::Ok;
-    }
-    TQL::IResult Flush() override { return TQL::Result::Ok; }
-
-    std::string Text;
-};
-
 inline std::shared_ptr<TQL::IStore> MakeStore()
 {
     return TQL::MakeShared<Store::VStore>();
@@ -61,7 +27,7 @@ inline std::shared_ptr<TQL::IStore> MakeStore()
 inline TQL::IResult ImportText(TQL::IStore& i_rStore, std::string_view i_Text)
 {
     StoreIO::VStoreImporterJson importer;
-    TextInput input(i_Text);
+    TQL::VTextInput input(i_Text);
     const TQL::IResult read = importer.ReadStream(input);
     return read.IsError() ? read : importer.Import(*TQL::ScopedWrite(i_rStore));
 }
@@ -70,11 +36,11 @@ inline TQL::IResult ImportText(TQL::IStore& i_rStore, std::string_view i_Text)
 inline std::string ExportText(TQL::IStore& i_rStore)
 {
     StoreIO::VStoreExporterJson exporter;
-    TextOutput output;
+    TQL::VTextOutput output;
     TQL::IResult result = exporter.Export(*TQL::ScopedRead(i_rStore));
     if (result.IsSuccess())
         result = exporter.WriteToStream(output);
-    return result.IsSuccess() ? output.Text : std::string(result.Name());
+    return result.IsSuccess() ? output.Text() : std::string(result.Name());
 }
 
 /// All entries that have a value: "A/B=Int32 1", with "?2" behind it for a proposed value that awaits verification.

@@ -103,7 +103,7 @@ struct App
     std::string OpenInto(TQL::IStore& i_rStore, const std::string& i_rFile)
     {
         VStoreImporterJson importer;
-        TextInput input(i_rFile);
+        TQL::VTextInput input(i_rFile);
         EXPECT_EQ(importer.ReadStream(input), TQL::Result::Ok);
         return Answer(IO.Import(*TQL::ScopedWrite(i_rStore), importer, 0));
     }
@@ -114,9 +114,9 @@ struct App
     {
         VStoreExporterJson exporter;
         const std::string answer = Answer(IO.Export(*TQL::ScopedRead(i_rStore), exporter));
-        TextOutput output;
+        TQL::VTextOutput output;
         EXPECT_EQ(exporter.WriteToStream(output), TQL::Result::Ok);
-        return answer == "Ok" ? output.Text : answer;
+        return answer == "Ok" ? output.Text() : answer;
     }
 
     TestSupport::LogGuard Log;
@@ -245,7 +245,7 @@ TEST(VersionedIO, OwnStoresAndNames)
 
     VStoreVersionedIO empty(MakeStore(), MakeStore());
     VStoreImporterJson importer;
-    TextInput input(file);
+    TQL::VTextInput input(file);
     EXPECT_EQ(importer.ReadStream(input), TQL::Result::Ok);
     EXPECT_EQ(app.Answer(empty.Import(*TQL::ScopedWrite(app.Data.Get()), importer, 0)),
               "SerialisationFailure" + s_NoneUsable);
