@@ -12,14 +12,17 @@
 namespace Bench
 {
 
+void RunExpression(Table& o_rTable);
 void RunNotification(Table& o_rTable);
 void RunOsc(Table& o_rTable);
 void RunOpenRecording(Table& o_rTable);
 void RunRecordings(Table& o_rTable);
 void RunRedraw(Table& o_rTable);
 void RunRefill(Table& o_rTable);
+void RunSelection(Table& o_rTable);
 void RunStore(Table& o_rTable);
 void RunStoreFile(Table& o_rTable);
+void RunSubplot(Table& o_rTable);
 void RunSummary(Table& o_rTable);
 void RunUpdateTick(Table& o_rTable);
 
@@ -35,6 +38,9 @@ struct Entry
 constexpr Entry s_Entries[] = {{"notification", RunNotification},
                                {"summary", RunSummary},
                                {"refill", RunRefill},
+                               {"selection", RunSelection},
+                               {"subplots", RunSubplot},
+                               {"expression", RunExpression},
                                {"store", RunStore},
                                {"files", RunStoreFile},
                                {"recordings", RunRecordings},

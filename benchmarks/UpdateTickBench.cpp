@@ -3,9 +3,9 @@
 #include "ChannelSystem/IChannelBlock.h"
 #include "Channels/VChannelService.h"
 #include "Channels/VLiveContext.h"
+#include "GraphPlotSystem/VBaseChannelTextProvider.h"
 #include "GraphPlotSystem/VBaseGraphPlotTime.h"
-#include "GraphPlotSystem/VPlainChannelComponentControls.h"
-#include "GraphPlotSystem/VPlainChannelTextProvider.h"
+#include "GraphPlotSystem/VChannelComponentControls.h"
 #include "GraphPlotSystem/VTraceDataProvider.h"
 #include "GraphPlotSystem/VTraceDataUpdater.h"
 #include "NotificationSystem/VDispatchCollapsers.h"
@@ -148,7 +148,7 @@ public:
         for (std::uint64_t marker = 0; marker < s_Channels; ++marker)
         {
             Channels::ChannelDefinition definition;
-            definition.TypeName = Channels::LabelPositionType;
+            definition.TypeName = Channels::LabelledReconstructionType;
             definition.First = 1;
             definition.Second = marker;
             definition.Name = std::to_string(marker);
@@ -206,12 +206,12 @@ private:
     std::shared_ptr<Channels::VChannelService> m_pService = std::make_shared<Channels::VChannelService>();
     std::shared_ptr<Channels::VLiveContext> m_pContext =
         std::make_shared<Channels::VLiveContext>("Live", m_pService->GetSubTypes(), ContextOptions());
-    std::shared_ptr<GraphPlotUI::VPlainChannelTextProvider> m_pTexts =
-        std::make_shared<GraphPlotUI::VPlainChannelTextProvider>(m_pService, nullptr);
+    std::shared_ptr<GraphPlotUI::VBaseChannelTextProvider> m_pTexts =
+        std::make_shared<GraphPlotUI::VBaseChannelTextProvider>(m_pService, nullptr);
     std::shared_ptr<PlotTime> m_pTime = std::make_shared<PlotTime>();
     std::shared_ptr<CountingProvider> m_pProvider = std::make_shared<CountingProvider>();
     std::shared_ptr<GraphPlotUI::VTraceDataUpdater> m_pUpdater = TQL::MakeShared<GraphPlotUI::VTraceDataUpdater>(
-        m_pService, m_pTexts, std::make_shared<GraphPlotUI::VPlainChannelComponentControls>(m_pTexts, nullptr), m_pTime,
+        m_pService, m_pTexts, std::make_shared<GraphPlotUI::VChannelComponentControls>(m_pTexts, nullptr), m_pTime,
         m_pProvider);
     std::vector<Channels::ChannelRows> m_Rows;
     std::vector<float> m_Values;

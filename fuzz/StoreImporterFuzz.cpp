@@ -4,8 +4,8 @@
 #include "StoreIO/VStoreExporterJson.h"
 #include "StoreIO/VStoreImporterJson.h"
 #include "StoreInterface/ScopedAccess.h"
-#include "TQL/TextStream.h"
 #include "TQL/Log.h"
+#include "TQL/TextStream.h"
 
 #include <algorithm>
 #include <cstdint>

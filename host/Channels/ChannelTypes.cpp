@@ -14,17 +14,20 @@ namespace
 using Recordings::EChannelKind;
 using TQL::ESelectionKind;
 
-constexpr std::array<ChannelType, 5> Types{{
-    {LabelPositionType, EChannelKind::Marker, ESelectionKind::Label, "Position", "Labels", "Position", "TX,TY,TZ",
-     EUnitUse::AllComponents, true, 0},
+// One type for each kind of thing that is selected: with two, what is selected would not tell which of them to plot.
+constexpr std::array<ChannelType, 6> Types{{
+    {LabelledReconstructionType, EChannelKind::Marker, ESelectionKind::Label, "Position", "Labels", "Position",
+     "TX,TY,TZ", EUnitUse::AllComponents, true, 0},
     {SegmentPoseType, EChannelKind::SegmentPose, ESelectionKind::Segment, "Pose", "Segments", "Pose",
      "RX,RY,RZ,TX,TY,TZ", EUnitUse::PositionOfPose, false, 0},
     {DeviceOutputType, EChannelKind::Analog, ESelectionKind::AnalogueDeviceOutput, "Device Output", "Devices", "", "",
      EUnitUse::AllComponents, false, 0},
-    {JointAnglesType, EChannelKind::JointAngles, ESelectionKind::ModelOutput, "Joint Angles", "Model Outputs", "Euler",
-     "", EUnitUse::AllComponents, false, 0},
-    {TableColumnType, EChannelKind::Column, ESelectionKind::ModelOutput, "Column", "Model Outputs", "", "",
+    {ModelOutputType, EChannelKind::Column, ESelectionKind::ModelOutput, "Model Output", "Model Outputs", "", "",
      EUnitUse::AllComponents, false, 0},
+    {CameraPoseType, std::nullopt, ESelectionKind::Camera, "Camera Pose", "Cameras", "Pose", "RX,RY,RZ,TX,TY,TZ",
+     EUnitUse::PositionOfPose, false, 0},
+    {SampleCountType, std::nullopt, ESelectionKind::Global, "Sample Count", "Capture", "", "", EUnitUse::AllComponents,
+     false, 0},
 }};
 
 std::vector<std::string> SplitNames(std::string_view i_Names)
@@ -61,8 +64,9 @@ const ChannelType* FindChannelType(std::string_view i_Name)
 
 const ChannelType& ChannelTypeOf(Recordings::EChannelKind i_Kind)
 {
-    const auto type = std::ranges::find(Types, i_Kind, &ChannelType::RecordedKind);
-    return type == Types.end() ? Types.back() : *type;
+    const EChannelKind kind = i_Kind == EChannelKind::JointAngles ? EChannelKind::Column : i_Kind;
+    const auto type = std::ranges::find(Types, kind, &ChannelType::RecordedKind);
+    return type == Types.end() ? Types.front() : *type; // every kind has one
 }
 
 std::vector<std::string> ComponentNamesOf(const ChannelDefinition& i_rDefinition)
@@ -87,17 +91,18 @@ TQL::ComponentDescription DescribeComponents(const ChannelDefinition& i_rDefinit
     description.Groups.assign(count, group);
     for (std::size_t i = 0; bPose && i < 3; ++i)
         description.Groups[i].Factors = {{VSubTypeTable::Radian, boost::rational<std::int8_t>(1)}};
-    if (!pType || (pType->FormatName == "Pose" && !bPose) || (pType->FormatName != "Pose" && count != 3) ||
-        (pType->FormatName == "Euler" && !IsAngle(group)))
+    if (!pType || (pType->FormatName == "Pose" && !bPose) || (pType->FormatName == "Position" && count != 3))
         return description;
     description.FormatName = pType->FormatName;
+    if (i_rDefinition.RotationOrder.size() == 3 && count == 3 && IsAngle(group))
+        description.FormatName = "Euler" + i_rDefinition.RotationOrder;
     return description;
 }
 
 std::optional<TQL::SelectionItem> SelectionOfChannel(const TQL::IChannelInstanceId& i_rId)
 {
     const ChannelType* pType = FindChannelType(i_rId.TypeName);
-    if (!pType)
+    if (!pType || pType->Kind == ESelectionKind::Global)
         return std::nullopt;
     return TQL::SelectionItem{pType->Kind, i_rId.First, i_rId.Second, i_rId.Text};
 }
@@ -106,7 +111,7 @@ std::optional<TQL::IChannelInstanceId> ChannelOfSelection(const TQL::SelectionIt
                                                           std::string_view i_Type)
 {
     const ChannelType* pType = FindChannelType(i_Type);
-    if (!pType || pType->Kind != i_rItem.Kind)
+    if (!pType || pType->Kind != i_rItem.Kind || pType->Kind == ESelectionKind::Global)
         return std::nullopt;
     return TQL::IChannelInstanceId{std::string(i_Context), std::string(i_Type), i_rItem.First, i_rItem.Second,
                                    i_rItem.Text};

@@ -18,11 +18,12 @@ namespace Channels
 class VSubTypeTable;
 
 /// Names of the channel types of this host, as they stand in channel ids.
-inline constexpr std::string_view LabelPositionType = "LabelPosition";
+inline constexpr std::string_view LabelledReconstructionType = "Labelled Reconstructions";
 inline constexpr std::string_view SegmentPoseType = "SubjectSegmentPose";
-inline constexpr std::string_view DeviceOutputType = "AnalogDeviceOutput";
-inline constexpr std::string_view JointAnglesType = "JointAngles";
-inline constexpr std::string_view TableColumnType = "TableColumn";
+inline constexpr std::string_view DeviceOutputType = "DeviceOutput";
+inline constexpr std::string_view CameraPoseType = "CalibratedCameraPose";
+inline constexpr std::string_view SampleCountType = "SampleCount";
+inline constexpr std::string_view ModelOutputType = "ModelSetSamplesOutput"; ///< joint angles and columns of tables
 
 /// How the unit of a channel falls on its components.
 enum class EUnitUse
@@ -31,12 +32,13 @@ enum class EUnitUse
     PositionOfPose ///< the first three components are angles in radians, the unit is that of the others
 };
 
-/// One type of source channels. First and Second of an id: subject and marker, subject and segment, device and output;
-/// for the types without a number of two parts the index, and the name in Text.
+/// One type of source channels. First and Second of an id: subject and marker, subject and segment, device and output,
+/// the camera and 0; for the types without a number of two parts the index, and the name in Text. A context has at most
+/// one channel of a global type.
 struct ChannelType
 {
     std::string_view Name;
-    Recordings::EChannelKind RecordedKind;
+    std::optional<Recordings::EChannelKind> RecordedKind; ///< nothing: no recording has it
     TQL::ESelectionKind Kind;
     std::string_view DisplayName;
     std::string_view Category;
@@ -62,6 +64,8 @@ struct ChannelDefinition
     std::string Name;                        ///< as shown to the operator
     std::string Units;                       ///< "mm"; empty for none
     std::vector<std::string> ComponentNames; ///< empty: those of the type
+    std::string RotationOrder = {};          ///< of joint angles, as far as it is known: "ZXY"
+    std::string TypeText = {};               ///< shown in place of the display name of the type, unless it is empty
 };
 
 /// Component names of a definition: its own, or those of its type.
@@ -69,7 +73,7 @@ std::vector<std::string> ComponentNamesOf(const ChannelDefinition& i_rDefinition
 
 TQL::ComponentDescription DescribeComponents(const ChannelDefinition& i_rDefinition, VSubTypeTable& i_rSubTypes);
 
-/// What the operator selects to see a channel; nothing for an id of a type that is not in the table.
+/// What the operator selects to see a channel; nothing for an id of a type that is not in the table or global.
 std::optional<TQL::SelectionItem> SelectionOfChannel(const TQL::IChannelInstanceId& i_rId);
 
 /// The channel of a type that belongs to a selected thing; nothing when the type is not about things of that kind.

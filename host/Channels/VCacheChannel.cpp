@@ -5,6 +5,7 @@
 
 #include <optional>
 #include <utility>
+#include <vector>
 
 namespace Channels
 {
@@ -75,10 +76,12 @@ std::shared_ptr<VChannelOutput> VCacheChannel::MakeOutputLocked() const
     if (m_bUnwrap)
         rotation = FindRotation(pInput->GetDescription());
     const auto pInputSamples = std::dynamic_pointer_cast<VSampleBlock>(pInputBlock);
-    std::shared_ptr<VCacheFeed> pFeed;
-    if (rotation || !pInputSamples || !pInputSamples->ShowsAll())
-        pFeed = std::make_shared<VCacheFeed>(pInputBlock, rotation, m_pWindow);
-    const std::shared_ptr<VSampleStore>& rpSamples = pFeed ? pFeed->GetSamples() : pInputSamples->GetSamples();
+    // What is computed from samples that grow is kept for the window only, never for all the time that they have.
+    const bool bShared =
+        !rotation && pInputSamples && pInputSamples->ShowsAll() && !(m_pWindow && pInputSamples->GetFeed());
+    const std::shared_ptr<VCacheFeed> pFeed =
+        bShared ? pInputSamples->GetFeed() : std::make_shared<VCacheFeed>(SourceOf(pInputBlock), rotation, m_pWindow);
+    const std::shared_ptr<VSampleStore>& rpSamples = bShared ? pInputSamples->GetSamples() : pFeed->GetSamples();
     if (m_bLevels)
         rpSamples->EnableSummaries();
     if (pFeed)
@@ -86,7 +89,8 @@ std::shared_ptr<VChannelOutput> VCacheChannel::MakeOutputLocked() const
     const std::uint32_t levels = m_bLevels ? VSummaryPyramid::LevelCount : 1;
     const auto pBlock = std::make_shared<VSampleBlock>(rpSamples, levels, m_pWindow, pFeed);
     const auto pSelf = std::const_pointer_cast<VCacheChannel>(shared_from_this());
-    return std::make_shared<VChannelOutput>(pSelf, pBlock, pInput->GetDescription(), pInput);
+    return std::make_shared<VChannelOutput>(pSelf, pBlock, pInput->GetDescription(),
+                                            std::vector<std::shared_ptr<TQL::IChannelOutput>>{pInput}, rpSamples);
 }
 
 } // namespace Channels

@@ -10,6 +10,8 @@
 namespace Channels
 {
 
+struct BlockWindow;
+
 /// The channel that keeps what a reader wants of its input: with summary levels ("SupportLodding"), with rotations made
 /// continuous ("EnableRotationUnwrapping"), at least the newest "CacheRangeTicks" ticks (0, or an input that does not
 /// grow: everything). Where nothing has to be altered it reads the store of its input; else it has one of its own,

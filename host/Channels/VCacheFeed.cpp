@@ -13,32 +13,29 @@ namespace
 
 constexpr std::int64_t SliceRows = 4096; ///< read from the input at a time
 
-std::int64_t FirstTickOf(const ChannelSystem::IChannelBlock& i_rBlock)
+std::int64_t FirstTickOf(const ISampleSource& i_rSource)
 {
-    TQL::TickRange range;
-    i_rBlock.GetRange(range);
-    return range.IsEmpty() ? i_rBlock.GetShape().GridOffset : range.First;
+    const TQL::TickRange range = i_rSource.GetRange();
+    return range.IsEmpty() ? i_rSource.GetGrid().Offset : range.First;
 }
 
 } // namespace
 
-VCacheFeed::VCacheFeed(std::shared_ptr<ChannelSystem::IChannelBlock> i_pInput, std::optional<RotationPart> i_Rotation,
+VCacheFeed::VCacheFeed(std::shared_ptr<const ISampleSource> i_pInput, std::optional<RotationPart> i_Rotation,
                        std::shared_ptr<const BlockWindow> i_pWindow)
     : m_pInput(std::move(i_pInput))
     , m_Rotation(std::move(i_Rotation))
     , m_pWindow(std::move(i_pWindow))
-    , m_Period(m_pInput->GetShape().SamplePeriod)
-    , m_Components(m_pInput->GetShape().pLayout->ComponentCount)
-    , m_pSamples(std::make_shared<VSampleStore>(m_Period, FirstTickOf(*m_pInput),
-                                                m_pInput->GetShape().pLayout->ComponentCount))
+    , m_Period(m_pInput->GetGrid().Period)
+    , m_Components(m_pInput->GetGrid().Components)
+    , m_pSamples(std::make_shared<VSampleStore>(m_Period, FirstTickOf(*m_pInput), m_pInput->GetGrid().Components))
 {
 }
 
 void VCacheFeed::CatchUp()
 {
     const std::lock_guard lock(m_Mutex);
-    TQL::TickRange input;
-    m_pInput->GetRange(input);
+    const TQL::TickRange input = m_pInput->GetRange();
     if (input.IsEmpty())
         return;
     std::int64_t wanted = input.First;
@@ -62,7 +59,9 @@ void VCacheFeed::CatchUp()
 
 void VCacheFeed::StartLocked(std::int64_t i_Tick)
 {
-    if (m_pSamples->GetRange() != TQL::TickRange{i_Tick, i_Tick})
+    if (!m_bStarted)
+        m_pSamples->StartAt(i_Tick);
+    else
         (void)m_pSamples->ReplaceAll(i_Tick, {}); // on the grid of the input, which is that of the store
     if (m_Rotation)
         m_Unwrapper.emplace(*m_Rotation);
@@ -73,7 +72,7 @@ void VCacheFeed::StartLocked(std::int64_t i_Tick)
 bool VCacheFeed::ReadLocked(const TQL::TickRange& i_rRange)
 {
     m_Scratch.resize(static_cast<std::size_t>((i_rRange.Last - i_rRange.First) / m_Period) * m_Components);
-    return m_pInput->ReadSamples(i_rRange, m_Scratch).IsSuccess();
+    return m_pInput->Read(i_rRange, m_Scratch).IsSuccess();
 }
 
 void VCacheFeed::AppendLocked(const TQL::TickRange& i_rRange)

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "ChannelSystem/IChannelBlock.h"
+#include "Channels/ISampleSource.h"
 #include "Channels/VRotationUnwrapper.h"
 #include "Channels/VSampleStore.h"
 
@@ -16,17 +16,21 @@ namespace Channels
 
 struct BlockWindow;
 
-/// Copies the samples of an input block into a store of its own as they come, with rotations made continuous. Keeps at
-/// least the window that it was given; when the window grows it fetches what the input still has of the time before.
-/// A channel's block asks it to catch up, on the reader's thread. Thread-safe.
+/// Keeps the samples of a source, be they another block's or computed, in a store of its own as they come, with
+/// rotations made continuous if asked to. Keeps at least the window that it was given; when the window grows it fetches
+/// what the source still has of the time before, and it forgets what a source without a window has forgotten. A
+/// channel's block asks it to catch up, on the reader's thread. Thread-safe.
 class VCacheFeed
 {
 public:
-    /// i_pWindow null: everything that the input has.
-    VCacheFeed(std::shared_ptr<ChannelSystem::IChannelBlock> i_pInput, std::optional<RotationPart> i_Rotation,
+    /// i_pWindow null: everything that the source has.
+    VCacheFeed(std::shared_ptr<const ISampleSource> i_pInput, std::optional<RotationPart> i_Rotation,
                std::shared_ptr<const BlockWindow> i_pWindow);
 
     const std::shared_ptr<VSampleStore>& GetSamples() const { return m_pSamples; }
+
+    /// The source where its samples are kept as they are; null where they are altered.
+    std::shared_ptr<const ISampleSource> GetPlainSource() const { return m_Rotation ? nullptr : m_pInput; }
 
     void CatchUp();
 
@@ -37,7 +41,7 @@ private:
     bool ReadLocked(const TQL::TickRange& i_rRange);
     VRotationUnwrapper BackwardsUnwrapperLocked() const;
 
-    const std::shared_ptr<ChannelSystem::IChannelBlock> m_pInput;
+    const std::shared_ptr<const ISampleSource> m_pInput;
     const std::optional<RotationPart> m_Rotation;
     const std::shared_ptr<const BlockWindow> m_pWindow;
     const std::int64_t m_Period;

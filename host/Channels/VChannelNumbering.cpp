@@ -21,6 +21,7 @@ ChannelDefinition VChannelNumbering::Define(const Recordings::RecordedChannel& i
     definition.Name = i_rChannel.Name;
     definition.Units = i_rChannel.Units;
     definition.ComponentNames = i_rChannel.ComponentNames;
+    definition.RotationOrder = i_rChannel.RotationOrder;
     switch (i_rChannel.Kind)
     {
     case EChannelKind::Marker:
@@ -33,8 +34,9 @@ ChannelDefinition VChannelNumbering::Define(const Recordings::RecordedChannel& i
         break;
     case EChannelKind::JointAngles:
     case EChannelKind::Column:
-        definition.First = NumberOf({i_rChannel.Kind, 0}, i_rChannel.Name);
+        definition.First = NumberOf({EChannelKind::Column, 0}, i_rChannel.Name);
         definition.Text = i_rChannel.Name;
+        definition.TypeText = i_rChannel.Kind == EChannelKind::Column ? "Column" : "Joint Angles";
         break;
     }
     return definition;

@@ -1,17 +1,22 @@
 #include "Channels/VChannelOutput.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace Channels
 {
 
-VChannelOutput::VChannelOutput(std::weak_ptr<TQL::IChannel> i_pChannel, std::shared_ptr<VSampleBlock> i_pBlock,
-                               TQL::ComponentDescription i_Description, std::shared_ptr<TQL::IChannelOutput> i_pInput)
+VChannelOutput::VChannelOutput(std::weak_ptr<TQL::IChannel> i_pChannel,
+                               std::shared_ptr<ChannelSystem::IChannelBlock> i_pBlock,
+                               TQL::ComponentDescription i_Description,
+                               std::vector<std::shared_ptr<TQL::IChannelOutput>> i_Inputs,
+                               std::shared_ptr<const VSampleStore> i_pSamples)
     : m_pChannel(std::move(i_pChannel))
     , m_pBlock(std::move(i_pBlock))
-    , m_pInput(std::move(i_pInput))
+    , m_Inputs(std::move(i_Inputs))
+    , m_pSamples(std::move(i_pSamples))
     , m_Description(std::move(i_Description))
-    , m_Token(m_pBlock->GetSamples()->GetToken())
+    , m_Token(m_pSamples ? m_pSamples->GetToken() : 0)
 {
 }
 
@@ -29,8 +34,8 @@ std::shared_ptr<TQL::IChannelOutput> VChannelOutput::HandOut(std::shared_ptr<VCh
 
 bool VChannelOutput::IsStale() const
 {
-    return m_bRetired.load(std::memory_order_acquire) || m_pBlock->GetSamples()->GetToken() != m_Token ||
-           (m_pInput && m_pInput->IsStale());
+    return m_bRetired.load(std::memory_order_acquire) || (m_pSamples && m_pSamples->GetToken() != m_Token) ||
+           std::ranges::any_of(m_Inputs, [](const auto& i_rpInput) { return i_rpInput->IsStale(); });
 }
 
 } // namespace Channels

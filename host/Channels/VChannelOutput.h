@@ -1,11 +1,12 @@
 #pragma once
 
 #include "ChannelSystem/IChannel.h"
-#include "Channels/VSampleBlock.h"
+#include "Channels/VSampleStore.h"
 
 #include <atomic>
 #include <cstdint>
 #include <memory>
+#include <vector>
 
 namespace Channels
 {
@@ -15,9 +16,11 @@ namespace Channels
 class VChannelOutput : public TQL::IChannelOutput
 {
 public:
-    /// i_pInput, the output that this one is made from, may be null.
-    VChannelOutput(std::weak_ptr<TQL::IChannel> i_pChannel, std::shared_ptr<VSampleBlock> i_pBlock,
-                   TQL::ComponentDescription i_Description, std::shared_ptr<TQL::IChannelOutput> i_pInput = nullptr);
+    /// i_Inputs are the outputs that this one is made from. New contents of i_pSamples, which may be null, make it
+    /// stale, and so does an input that is.
+    VChannelOutput(std::weak_ptr<TQL::IChannel> i_pChannel, std::shared_ptr<ChannelSystem::IChannelBlock> i_pBlock,
+                   TQL::ComponentDescription i_Description, std::vector<std::shared_ptr<TQL::IChannelOutput>> i_Inputs,
+                   std::shared_ptr<const VSampleStore> i_pSamples);
 
     /// Stale from now on.
     void Retire() { m_bRetired.store(true, std::memory_order_release); }
@@ -34,8 +37,9 @@ public:
 
 private:
     const std::weak_ptr<TQL::IChannel> m_pChannel;
-    const std::shared_ptr<VSampleBlock> m_pBlock;
-    const std::shared_ptr<TQL::IChannelOutput> m_pInput;
+    const std::shared_ptr<ChannelSystem::IChannelBlock> m_pBlock;
+    const std::vector<std::shared_ptr<TQL::IChannelOutput>> m_Inputs;
+    const std::shared_ptr<const VSampleStore> m_pSamples;
     const TQL::ComponentDescription m_Description;
     const std::uint64_t m_Token;
     std::atomic<bool> m_bRetired{false};

@@ -1,6 +1,8 @@
 #include "Channels/VChannelService.h"
 
 #include "Channels/VCacheChannel.h"
+#include "Channels/VDerivedChannel.h"
+#include "Channels/VOperationTable.h"
 #include "TQL/HashMix.h"
 
 #include <algorithm>
@@ -23,6 +25,19 @@ std::uint64_t HashId(const TQL::IChannelInstanceId& i_rId)
     return TQL::HashMix(hash, TQL::HashText(i_rId.Text));
 }
 
+/// A text of the first input, its placeholders replaced as the channel that is named will have them.
+std::string DisplayNameOf(const ChannelSystem::VDerivedChannelParameters& i_rRecord,
+                          const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs)
+{
+    TQL::ParameterValue value;
+    if (VDerivedParameters(i_rRecord, i_rInputs, [] { return std::string(); })
+            .Read("", "TypeDisplayName", value)
+            .IsError())
+        return {};
+    const std::string* pText = std::get_if<std::string>(&value);
+    return pText ? *pText : std::string();
+}
+
 /// The id of a derived channel: the same in every run for the same operation on the same inputs.
 TQL::IChannelInstanceId MakeDerivedId(std::string_view i_Operation, std::uint64_t i_RecordHash,
                                       const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs,
@@ -35,19 +50,11 @@ TQL::IChannelInstanceId MakeDerivedId(std::string_view i_Operation, std::uint64_
             std::move(i_DisplayName)};
 }
 
-std::string TypeDisplayNameOf(const TQL::IChannel& i_rChannel)
-{
-    TQL::ParameterValue value;
-    if (i_rChannel.GetParameters()->Read("", "TypeDisplayName", value).IsError())
-        return {};
-    const std::string* pText = std::get_if<std::string>(&value);
-    return pText ? *pText : std::string();
-}
-
 } // namespace
 
 VChannelService::VChannelService()
     : m_pSubTypes(std::make_shared<VSubTypeTable>())
+    , m_pOperations(std::make_shared<VOperationTable>(m_pSubTypes))
     , m_pContextListChanged(std::make_shared<NotificationSystem::VChangeSignal>())
     , m_pTypeListChanged(std::make_shared<NotificationSystem::VChangeSignal>())
 {
@@ -138,26 +145,75 @@ VChannelService::CreateDerivedChannel(std::string_view i_Operation,
                                       const ChannelSystem::VDerivedChannelParameters& i_rParameters,
                                       const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs)
 {
-    if (i_Operation != VCacheChannel::Operation || i_rInputs.size() != 1 || !i_rInputs.front())
+    if (i_rInputs.empty() || std::ranges::find(i_rInputs, nullptr) != i_rInputs.end())
         return nullptr;
-    const std::shared_ptr<TQL::IChannel>& rpInput = i_rInputs.front();
-    const auto pContext = FindContext(rpInput->GetInstanceId().DataContextName);
-    const bool bKeepAll = !pContext || pContext->GetType() != ChannelSystem::EContextType::Live;
-    auto id = MakeDerivedId(i_Operation, i_rParameters.Hash, i_rInputs, TypeDisplayNameOf(*rpInput));
-    const auto pChannel = std::make_shared<VCacheChannel>(std::move(id), rpInput, bKeepAll);
+    if (i_Operation == VCacheChannel::Operation)
+        return i_rInputs.size() == 1 ? MakeCache(i_rParameters.Hash, i_rInputs.front()) : nullptr;
+    OperationRequest request;
+    if (!ReadRequest(i_Operation, i_rParameters, request))
+        return nullptr;
+    return MakeOrFind(i_Operation, request, i_rParameters, i_rInputs);
+}
+
+std::shared_ptr<TQL::IChannel> VChannelService::MakeCache(std::uint64_t i_Hash,
+                                                          const std::shared_ptr<TQL::IChannel>& i_rpInput)
+{
+    auto id = MakeDerivedId(VCacheChannel::Operation, i_Hash, {i_rpInput}, DisplayNameOf({}, {i_rpInput}));
+    const auto pChannel = std::make_shared<VCacheChannel>(std::move(id), i_rpInput, !IsLive(*i_rpInput));
     pChannel->ConnectParameters();
-    RememberDerived(pChannel);
+    const std::unique_lock lock(m_Mutex);
+    RememberLocked(pChannel);
     return pChannel;
 }
 
-/// Makes the channel known to GetChannel while it lives.
-void VChannelService::RememberDerived(const std::shared_ptr<TQL::IChannel>& i_rpChannel)
+std::shared_ptr<TQL::IChannel>
+VChannelService::MakeOrFind(std::string_view i_Operation, const OperationRequest& i_rRequest,
+                            const ChannelSystem::VDerivedChannelParameters& i_rParameters,
+                            const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs)
 {
+    DerivedKey key{std::string(i_Operation), i_rParameters.Hash, {}};
+    for (const std::shared_ptr<TQL::IChannel>& rpInput : i_rInputs)
+        std::get<2>(key).push_back(rpInput.get());
+    const auto find = [&]
+    {
+        const auto found = m_ByKey.find(key);
+        return found == m_ByKey.end() ? nullptr : found->second.lock();
+    };
+    {
+        const std::shared_lock lock(m_Mutex);
+        if (auto pKnown = find())
+            return pKnown;
+    }
+    const bool bLive = std::ranges::any_of(i_rInputs, [this](const auto& i_rpInput) { return IsLive(*i_rpInput); });
+    auto id = MakeDerivedId(i_Operation, i_rParameters.Hash, i_rInputs, DisplayNameOf(i_rParameters, i_rInputs));
+    const auto pMade =
+        std::make_shared<VDerivedChannel>(std::move(id), i_rRequest, i_rParameters, i_rInputs, m_pOperations, bLive);
+    pMade->ConnectInputs();
     const std::unique_lock lock(m_Mutex);
+    if (auto pKnown = find()) // somebody was quicker
+        return pKnown;
+    RememberLocked(pMade);
+    m_ByKey.insert_or_assign(std::move(key), pMade);
+    return pMade;
+}
+
+/// Whether samples of the channel come and go.
+bool VChannelService::IsLive(const TQL::IChannel& i_rChannel) const
+{
+    if (const auto* pDerived = dynamic_cast<const VDerivedChannel*>(&i_rChannel))
+        return pDerived->IsLive();
+    const auto pContext = FindContext(i_rChannel.GetInstanceId().DataContextName);
+    return pContext && pContext->GetType() == ChannelSystem::EContextType::Live;
+}
+
+/// Makes the channel known to GetChannel while it lives.
+void VChannelService::RememberLocked(const std::shared_ptr<TQL::IChannel>& i_rpChannel)
+{
     m_Derived.emplace(i_rpChannel->GetInstanceId(), i_rpChannel);
     if (m_Derived.size() < m_PruneAt)
         return;
     std::erase_if(m_Derived, [](const auto& i_rEntry) { return i_rEntry.second.expired(); });
+    std::erase_if(m_ByKey, [](const auto& i_rEntry) { return i_rEntry.second.expired(); });
     m_PruneAt = std::max<std::size_t>(64, 2 * m_Derived.size());
 }
 

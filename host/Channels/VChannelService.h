@@ -10,10 +10,15 @@
 #include <shared_mutex>
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <vector>
 
 namespace Channels
 {
+
+class VDerivedChannel;
+class VOperationTable;
+struct OperationRequest;
 
 /// The host's channels: contexts by name, their source channels, and the channels derived from them while somebody
 /// holds those. Contexts come and go on the UI thread; look-ups may come from any thread.
@@ -44,7 +49,9 @@ public:
     /// An empty context name asks for the types of all contexts.
     std::vector<std::string> GetChannelTypes(std::uint64_t i_Mask, std::string_view i_Context) const override;
     std::shared_ptr<TQL::IChannelParameters> GetTypeParameters(std::string_view i_TypeName) const override;
-    /// "Cache"; null for every other operation.
+    /// "Cache", "AlgebraicExpression" and "Derivative"; null for any other operation, without inputs and for one that
+    /// is null. A derivation that makes no sense gives a channel without output whose errors say why; nothing is
+    /// logged.
     std::shared_ptr<TQL::IChannel>
     CreateDerivedChannel(std::string_view i_Operation, const ChannelSystem::VDerivedChannelParameters& i_rParameters,
                          const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs) override;
@@ -53,14 +60,24 @@ public:
     TQL::IResult GetSubTypeTable(std::uint16_t i_SubTypeId, TQL::SubTypeRecord& o_rRecord) const override;
 
 private:
-    void RememberDerived(const std::shared_ptr<TQL::IChannel>& i_rpChannel);
+    /// Operation, hash of the record, inputs.
+    using DerivedKey = std::tuple<std::string, std::uint64_t, std::vector<const TQL::IChannel*>>;
+
+    std::shared_ptr<TQL::IChannel> MakeCache(std::uint64_t i_Hash, const std::shared_ptr<TQL::IChannel>& i_rpInput);
+    std::shared_ptr<TQL::IChannel> MakeOrFind(std::string_view i_Operation, const OperationRequest& i_rRequest,
+                                              const ChannelSystem::VDerivedChannelParameters& i_rParameters,
+                                              const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs);
+    bool IsLive(const TQL::IChannel& i_rChannel) const;
+    void RememberLocked(const std::shared_ptr<TQL::IChannel>& i_rpChannel);
 
     const std::shared_ptr<VSubTypeTable> m_pSubTypes;
+    const std::shared_ptr<VOperationTable> m_pOperations;
     const std::shared_ptr<NotificationSystem::VChangeSignal> m_pContextListChanged;
     const std::shared_ptr<NotificationSystem::VChangeSignal> m_pTypeListChanged;
     mutable std::shared_mutex m_Mutex;
     std::map<std::string, std::shared_ptr<VChannelContext>, std::less<>> m_Contexts; // guarded by m_Mutex
     std::multimap<TQL::IChannelInstanceId, std::weak_ptr<TQL::IChannel>> m_Derived;  // guarded by m_Mutex
+    std::map<DerivedKey, std::weak_ptr<VDerivedChannel>> m_ByKey;                    // guarded by m_Mutex
     std::size_t m_PruneAt = 64;                                                      // guarded by m_Mutex
     std::shared_ptr<TQL::IChannelSelectionManager> m_pSelectionManager;              // guarded by m_Mutex
 };

@@ -29,6 +29,7 @@ public:
                  std::shared_ptr<const BlockWindow> i_pWindow = nullptr, std::shared_ptr<VCacheFeed> i_pFeed = nullptr);
 
     const std::shared_ptr<VSampleStore>& GetSamples() const { return m_pSamples; }
+    const std::shared_ptr<VCacheFeed>& GetFeed() const { return m_pFeed; } ///< null where the store fills itself
     bool ShowsAll() const { return m_pWindow == nullptr; }
 
     // IChannelBlock

@@ -103,6 +103,20 @@ void VSampleStore::TrimBefore(std::int64_t i_Tick)
         m_pPyramid->FreeBefore(first);
 }
 
+void VSampleStore::StartAt(std::int64_t i_Tick)
+{
+    const std::lock_guard lock(m_WriterMutex);
+    const std::unique_lock table(m_TableMutex);
+    if (m_First.load(std::memory_order_relaxed) != m_End.load(std::memory_order_relaxed))
+        return;
+    const std::int64_t row = RowAtOrAfter(i_Tick);
+    m_Rows.Clear();
+    if (m_pPyramid)
+        m_pPyramid->Clear();
+    m_First.store(row, std::memory_order_release);
+    m_End.store(row, std::memory_order_release);
+}
+
 /// Empties the store and gives it a new token. Under both mutexes.
 void VSampleStore::Reset(std::int64_t i_FirstRow)
 {

@@ -43,6 +43,8 @@ public:
     /// The same with samples that i_pOwner keeps alive and nobody changes. An append copies them first.
     TQL::IResult ReplaceShared(std::int64_t i_FirstTick, std::shared_ptr<const void> i_pOwner,
                                std::span<const float> i_Values);
+    /// A store without samples begins at another tick of its grid; the contents count as the same.
+    void StartAt(std::int64_t i_Tick);
     /// Keeps the summary levels from now on, building them for what is held.
     void EnableSummaries();
 

@@ -1,5 +1,7 @@
 #include "Channels/VSourceChannel.h"
 
+#include "Channels/VSampleBlock.h"
+
 #include <string>
 #include <utility>
 
@@ -43,6 +45,8 @@ VSourceChannel::VSourceChannel(std::string_view i_Context, const ChannelDefiniti
 {
     if (const ChannelType* pType = FindChannelType(i_rDefinition.TypeName))
         DefineTypeParameters(*pType, *m_pParameters);
+    if (!i_rDefinition.TypeText.empty())
+        m_pParameters->Define(VChannelParameters::TypeGroup, "TypeDisplayName", i_rDefinition.TypeText);
     m_pParameters->Define(VChannelParameters::TypeGroup, "ComponentDisplayNames",
                           JoinNames(ComponentNamesOf(i_rDefinition)));
     m_pParameters->Define(VChannelParameters::InstanceGroup, "InstanceDisplayName", i_rDefinition.Name);
@@ -77,7 +81,8 @@ std::shared_ptr<TQL::IChannelOutput> VSourceChannel::GetOutput() const
         m_pOutput = nullptr;
         if (!m_pSamples->IsEmpty())
             m_pOutput =
-                std::make_shared<VChannelOutput>(pSelf, std::make_shared<VSampleBlock>(m_pSamples, 1), m_Description);
+                std::make_shared<VChannelOutput>(pSelf, std::make_shared<VSampleBlock>(m_pSamples, 1), m_Description,
+                                                 std::vector<std::shared_ptr<TQL::IChannelOutput>>{}, m_pSamples);
     }
     return VChannelOutput::HandOut(m_pOutput, pSelf);
 }

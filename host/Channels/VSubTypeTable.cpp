@@ -124,6 +124,16 @@ std::string_view Trim(std::string_view i_Text)
     return i_Text.substr(first, i_Text.find_last_not_of(blanks) - first + 1);
 }
 
+bool FindNames(std::string_view i_Prefix, std::string_view i_Base, std::uint16_t& o_rId)
+{
+    const auto prefix = std::ranges::find(Prefixes, i_Prefix, &Prefix::Name);
+    const auto base = std::ranges::find(Bases, i_Base, &Base::Name);
+    if (prefix == Prefixes.end() || base == Bases.end())
+        return false;
+    o_rId = MakeId(static_cast<std::size_t>(prefix - Prefixes.begin()), static_cast<std::size_t>(base - Bases.begin()));
+    return true;
+}
+
 bool FindBySymbol(std::string_view i_Text, std::uint16_t& o_rId)
 {
     for (std::size_t p = 0; p < Prefixes.size(); ++p)
@@ -142,10 +152,9 @@ bool FindByWord(std::string_view i_Text, std::uint16_t& o_rId)
 {
     const auto alias = std::ranges::find(Aliases, i_Text, &Alias::Text);
     if (alias != Aliases.end())
-        return VSubTypeTable::FindByName(alias->Prefix, alias->Base, o_rId);
+        return FindNames(alias->Prefix, alias->Base, o_rId);
     for (const Prefix& rPrefix : Prefixes)
-        if (i_Text.starts_with(rPrefix.Name) &&
-            VSubTypeTable::FindByName(rPrefix.Name, i_Text.substr(rPrefix.Name.size()), o_rId))
+        if (i_Text.starts_with(rPrefix.Name) && FindNames(rPrefix.Name, i_Text.substr(rPrefix.Name.size()), o_rId))
             return true;
     return i_Text.size() > 3 && i_Text.ends_with('s') && FindByWord(i_Text.substr(0, i_Text.size() - 1), o_rId);
 }
@@ -179,14 +188,19 @@ TQL::IResult VSubTypeTable::Find(std::uint16_t i_Id, TQL::SubTypeRecord& o_rReco
     return TQL::Result::Ok;
 }
 
-bool VSubTypeTable::FindByName(std::string_view i_Prefix, std::string_view i_Base, std::uint16_t& o_rId)
+bool VSubTypeTable::FindByName(std::string_view i_Prefix, std::string_view i_Base, std::uint16_t& o_rId) const
 {
-    const auto prefix = std::ranges::find(Prefixes, i_Prefix, &Prefix::Name);
-    const auto base = std::ranges::find(Bases, i_Base, &Base::Name);
-    if (prefix == Prefixes.end() || base == Bases.end())
-        return false;
-    o_rId = MakeId(static_cast<std::size_t>(prefix - Prefixes.begin()), static_cast<std::size_t>(base - Bases.begin()));
-    return true;
+    return FindNames(i_Prefix, i_Base, o_rId);
+}
+
+std::optional<double> VSubTypeTable::RadiansIn(std::uint16_t i_Id)
+{
+    const std::size_t prefix = i_Id >> 8;
+    const std::size_t base = i_Id & 0xff;
+    if (prefix >= Prefixes.size() || base >= Bases.size() ||
+        Bases[base].Dimension != TQL::SubTypeRecord::DimensionAngle)
+        return std::nullopt;
+    return Prefixes[prefix].Scale * Bases[base].Scale;
 }
 
 std::uint16_t VSubTypeTable::IdOfUnit(std::string_view i_Text)

@@ -91,6 +91,17 @@ MotionHeader ReadMotionHeader(VLineScanner& io_rLines, std::vector<std::string>&
     return header;
 }
 
+/// The axes of a joint's turns in their order, "ZXY"; empty for fewer than three turns, or two in a row about one axis.
+std::string RotationOrderOf(const BvhJoint& i_rJoint)
+{
+    std::string order;
+    for (const EBvhChannel channel : i_rJoint.Channels)
+        if (IsRotation(channel))
+            order += static_cast<char>('X' + static_cast<int>(channel) - static_cast<int>(EBvhChannel::XRotation));
+    const bool bThree = order.size() == 3 && order[0] != order[1] && order[1] != order[2];
+    return bThree ? order : std::string();
+}
+
 /// Turns the numbers of frames into the samples of the channels, frame by frame.
 class FrameSink
 {
@@ -149,6 +160,8 @@ private:
             if (std::ranges::none_of(rJoint.Channels, i_pIsOfSort))
                 continue;
             RecordedChannel& rChannel = Add(i_Kind, m_Names[joint] + i_pSuffix, i_pUnits);
+            if (i_Kind == EChannelKind::JointAngles)
+                rChannel.RotationOrder = RotationOrderOf(rJoint);
             for (std::size_t i = 0; i < rJoint.Channels.size(); ++i)
                 if (i_pIsOfSort(rJoint.Channels[i]))
                 {

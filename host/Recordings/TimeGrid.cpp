@@ -225,7 +225,7 @@ std::size_t FindCoarseGrid(const UsableRows& i_rRows, std::size_t i_MostPlaces, 
 {
     double rate = (static_cast<double>(i_MostPlaces) - 1.5) / i_rRows.Span();
     rate = rate > 2.0 ? std::floor(rate) : rate;
-    o_rGrid.Period = PeriodOfRate(rate);
+    o_rGrid.Period = std::max<std::int64_t>(1, PeriodOfRate(rate)); // times may be nearer than a tick
     const std::int64_t span = TickOf(i_rRows.Times.back()) - TickOf(i_rRows.Times.front());
     if (static_cast<std::uint64_t>(span / o_rGrid.Period) + 2 > i_MostPlaces)
         ++o_rGrid.Period;

@@ -31,6 +31,7 @@ struct RecordedChannel
     std::int64_t SamplePeriod = TQL::DefaultFramePeriod; ///< ticks, nearest to the rate
     std::int64_t FirstTick = 0; ///< of the first row; row i stands at FirstTick + i x SamplePeriod
     std::vector<float> Samples;
+    std::string RotationOrder = {}; ///< of joint angles: the axes in the order of the components, "ZXY"; empty: unknown
 
     std::size_t ComponentCount() const { return ComponentNames.size(); }
     std::size_t RowCount() const { return ComponentNames.empty() ? 0 : Samples.size() / ComponentNames.size(); }

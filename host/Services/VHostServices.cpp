@@ -3,6 +3,7 @@
 #include "ChannelSystem/IChannelContext.h"
 #include "ChannelSystem/IChannelSelectionManager.h"
 #include "CoreGraphics/Resources.h"
+#include "Services/VChannelMigrationService.h"
 #include "Services/VChannelTypeRegistry.h"
 #include "Services/VCheckedChannelService.h"
 #include "Services/VCheckedPostalService.h"
@@ -110,6 +111,7 @@ struct VHostServices::Parts
     const std::shared_ptr<CoreGraphics::Resources> pResources;
     const std::shared_ptr<VQuickWidgetPersistence> pPersistence;
     std::shared_ptr<ChannelSystem::IChannelService> pChannels;
+    std::shared_ptr<VChannelMigrationService> pMigration; ///< null without channels
 
     // What plug-ins get: checked when checking.
     std::shared_ptr<TQL::IPostalService> pGivenUi = pUi;
@@ -137,10 +139,17 @@ VHostServices::~VHostServices()
 void VHostServices::SetChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService)
 {
     m_pParts->pChannels = i_pService;
+    std::shared_ptr<VCheckedChannels> pChecked;
     if (i_pService && m_Options.bChecking)
-        i_pService = std::make_shared<VCheckedChannelService>(
-            std::move(i_pService), m_pParts->pCheck,
-            std::make_shared<VCheckedChannels>(m_pParts->pUses, m_pParts->pFaults));
+    {
+        pChecked = std::make_shared<VCheckedChannels>(m_pParts->pUses, m_pParts->pFaults);
+        i_pService = std::make_shared<VCheckedChannelService>(std::move(i_pService), m_pParts->pCheck, pChecked);
+    }
+    m_pParts->pMigration =
+        m_pParts->pChannels
+            ? std::make_shared<VChannelMigrationService>(m_pParts->pChannels, std::move(pChecked), m_pParts->pCheck)
+            : nullptr;
+    m_pParts->pTypes->SetChannelService(i_pService);
     m_pParts->pGivenChannels = std::move(i_pService);
 }
 
@@ -161,8 +170,7 @@ void VHostServices::GetFourthFactoryService(std::shared_ptr<TQL::IChannelTypeReg
 
 void VHostServices::GetFifthFactoryService(std::shared_ptr<IChannelMigrationService>& o_rpService)
 {
-    CheckThread(m_pParts->pCheck, "IHostCoreServices::GetFifthFactoryService");
-    o_rpService = nullptr;
+    m_pParts->Give("IHostCoreServices::GetFifthFactoryService", m_pParts->pMigration, o_rpService);
 }
 
 void VHostServices::GetSixthFactoryService(std::shared_ptr<TQL::ISelectionSource>& o_rpService)

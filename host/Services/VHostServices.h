@@ -55,8 +55,8 @@ public:
     void GetFileLocationService(std::shared_ptr<OrvanePluginInterface::IFileLocationService>& o_rpService) override;
     void GetPreferencesStore(std::shared_ptr<TQL::IStore>& o_rpStore) override;
     void GetFourthFactoryService(std::shared_ptr<TQL::IChannelTypeRegistry>& o_rpService) override;
-    void GetFifthFactoryService(
-        std::shared_ptr<OrvanePluginInterface::IChannelMigrationService>& o_rpService) override; ///< null
+    void GetFifthFactoryService(std::shared_ptr<OrvanePluginInterface::IChannelMigrationService>& o_rpService)
+        override; ///< null before there is a channel service
     void GetSixthFactoryService(std::shared_ptr<TQL::ISelectionSource>& o_rpService) override;
     void GetUiPostalService(std::shared_ptr<TQL::IPostalService>& o_rpService) override;
     void GetWorkerPostalService(std::shared_ptr<TQL::IAsioPostalService>& o_rpService) override;

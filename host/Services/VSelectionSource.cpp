@@ -1,6 +1,10 @@
 #include "Services/VSelectionSource.h"
 
 #include <algorithm>
+#include <iterator>
+#include <set>
+#include <string_view>
+#include <tuple>
 
 namespace Services
 {
@@ -24,11 +28,21 @@ private:
     const std::vector<TQL::SelectionItem> m_Items;
 };
 
+/// Adds each item that is not there yet, in order. A selection may hold thousands of things.
 void Append(std::vector<TQL::SelectionItem>& o_rItems, const std::vector<TQL::SelectionItem>& i_rAdded)
 {
+    using Key = std::tuple<TQL::ESelectionKind, std::uint64_t, std::uint64_t, std::string_view>;
+    const auto keyOf = [](const TQL::SelectionItem& i_rItem)
+    {
+        return Key(i_rItem.Kind, i_rItem.First, i_rItem.Second, i_rItem.Text);
+    };
+    o_rItems.reserve(o_rItems.size() + i_rAdded.size()); // the keys point into the items
+    std::set<Key> present;
+    for (const TQL::SelectionItem& rItem : o_rItems)
+        present.insert(keyOf(rItem));
     for (const TQL::SelectionItem& rItem : i_rAdded)
-        if (std::ranges::find(o_rItems, rItem) == o_rItems.end())
-            o_rItems.push_back(rItem);
+        if (!present.contains(keyOf(rItem)))
+            present.insert(keyOf(o_rItems.emplace_back(rItem)));
 }
 
 } // namespace
@@ -76,7 +90,7 @@ std::uint64_t VSelectionSource::RootSegment(std::uint64_t i_Subject) const
 TQL::IResult VSelectionSource::GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const
 {
     CheckThread(m_pCheck, "ISelectionSource::GetDevices");
-    o_rItems = m_Devices;
+    o_rItems = m_Devices ? m_Devices() : std::vector<TQL::SelectionItem>{};
     return TQL::Result::Ok;
 }
 
@@ -85,9 +99,9 @@ void VSelectionSource::SetRootSegments(RootSegmentFunction i_Function)
     m_RootSegment = std::move(i_Function);
 }
 
-void VSelectionSource::SetDevices(std::vector<TQL::SelectionItem> i_Devices)
+void VSelectionSource::SetDevices(DevicesFunction i_Function)
 {
-    m_Devices = std::move(i_Devices);
+    m_Devices = std::move(i_Function);
 }
 
 void VSelectionSource::RaiseForced()

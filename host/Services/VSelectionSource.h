@@ -17,6 +17,7 @@ class VSelectionSource : public TQL::ISelectionSource
 {
 public:
     using RootSegmentFunction = std::function<std::uint64_t(std::uint64_t)>;
+    using DevicesFunction = std::function<std::vector<TQL::SelectionItem>()>;
 
     explicit VSelectionSource(ThreadCheckPointer i_pCheck = nullptr);
 
@@ -24,11 +25,11 @@ public:
     void Set(const std::vector<TQL::SelectionItem>& i_rItems) override; ///< an equal selection raises nothing
     void Add(const std::vector<TQL::SelectionItem>& i_rItems) override;
     std::shared_ptr<TQL::IMultiCallbackPostal<void(bool)>> Changed() const override;
-    std::uint64_t RootSegment(std::uint64_t i_Subject) const override; ///< 0 until SetRootSegments
-    TQL::IResult GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const override;
+    std::uint64_t RootSegment(std::uint64_t i_Subject) const override;                 ///< 0 until SetRootSegments
+    TQL::IResult GetDevices(std::vector<TQL::SelectionItem>& o_rItems) const override; ///< none until SetDevices
 
     void SetRootSegments(RootSegmentFunction i_Function);
-    void SetDevices(std::vector<TQL::SelectionItem> i_Devices);
+    void SetDevices(DevicesFunction i_Function);
     /// Asks subscribers to look again though the selection is the same.
     void RaiseForced();
 
@@ -38,8 +39,8 @@ private:
     const ThreadCheckPointer m_pCheck;
     const std::shared_ptr<NotificationSystem::VMultiCallbackPostal<void(bool)>> m_pChanged;
     std::vector<TQL::SelectionItem> m_Items;
-    std::vector<TQL::SelectionItem> m_Devices;
     RootSegmentFunction m_RootSegment;
+    DevicesFunction m_Devices;
 };
 
 } // namespace Services

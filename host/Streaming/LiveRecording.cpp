@@ -20,10 +20,17 @@ using Recordings::VRecording;
 
 constexpr std::int64_t RowsAtOnce = 16384; ///< a reader keeps the writer waiting when that needs memory
 
+/// Recordings have no place for everything that a capture shows.
+bool IsRecorded(const std::string& i_rTypeName)
+{
+    const Channels::ChannelType* pType = Channels::FindChannelType(i_rTypeName);
+    return !pType || pType->RecordedKind;
+}
+
 EChannelKind KindOf(const std::string& i_rTypeName)
 {
     const Channels::ChannelType* pType = Channels::FindChannelType(i_rTypeName);
-    return pType ? pType->RecordedKind : EChannelKind::Column;
+    return pType ? pType->RecordedKind.value_or(EChannelKind::Column) : EChannelKind::Column;
 }
 
 /// Reads what the store has of the channel's range. The channel's rows are missing before.
@@ -62,7 +69,7 @@ RecordedChannel CopyChannel(const Channels::VSourceChannel& i_rChannel, const TQ
 {
     const Channels::ChannelDefinition& rDefinition = i_rChannel.GetDefinition();
     RecordedChannel channel;
-    channel.Kind = KindOf(rDefinition.TypeName);
+    channel.Kind = rDefinition.RotationOrder.empty() ? KindOf(rDefinition.TypeName) : EChannelKind::JointAngles;
     channel.Name = rDefinition.Name;
     const std::size_t colon = channel.Name.find(':');
     if (colon != std::string::npos && channel.Kind != EChannelKind::Column)
@@ -70,6 +77,7 @@ RecordedChannel CopyChannel(const Channels::VSourceChannel& i_rChannel, const TQ
     channel.ComponentNames = channel.Kind == EChannelKind::Marker ? std::vector<std::string>{"X", "Y", "Z"}
                                                                   : Channels::ComponentNamesOf(rDefinition);
     channel.Units = rDefinition.Units;
+    channel.RotationOrder = rDefinition.RotationOrder;
     channel.SamplePeriod = i_rChannel.GetSamples()->Period();
     channel.Rate = static_cast<double>(TQL::DefaultTickRate) / static_cast<double>(channel.SamplePeriod);
     channel.FirstTick = i_rRange.First;
@@ -89,7 +97,7 @@ VRecording CopyContext(const Channels::VChannelContext& i_rContext)
     recording.Range = i_rContext.GetTickRange();
     const auto pChannels = i_rContext.GetChannels();
     for (const auto& rpChannel : *pChannels)
-        if (!rpChannel->GetSamples()->IsEmpty())
+        if (!rpChannel->GetSamples()->IsEmpty() && IsRecorded(rpChannel->GetInstanceId().TypeName))
             recording.Channels.push_back(CopyChannel(*rpChannel, recording.Range));
     const std::int64_t first =
         std::min(std::max(i_rContext.GetTickRange().First, recording.Range.First), recording.Range.Last);

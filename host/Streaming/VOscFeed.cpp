@@ -45,13 +45,13 @@ TQL::IResult VOscFeed::AddChannels(const std::vector<OscChannel>& i_rChannels)
         definition.Name = rChannel.Name.Name;
         if (rChannel.Name.bMarker)
         {
-            definition.TypeName = Channels::LabelPositionType;
+            definition.TypeName = Channels::LabelledReconstructionType;
             definition.First = m_Subjects.emplace(rChannel.Name.Subject, m_Subjects.size()).first->second;
             definition.Second = m_MarkerCounts[definition.First]++;
         }
         else
         {
-            definition.TypeName = Channels::TableColumnType;
+            definition.TypeName = Channels::ModelOutputType;
             definition.First = m_ColumnCount++;
             definition.Text = rChannel.Name.Name;
             definition.ComponentNames = ComponentNamesOfColumn(rChannel.Components);

@@ -50,11 +50,10 @@ QString BranchOf(const std::string& i_rTypeName)
     {
         std::string_view Type;
         const char* pText;
-    } rows[] = {{Channels::LabelPositionType, QT_TRANSLATE_NOOP("ChannelTree", "Markers")},
+    } rows[] = {{Channels::LabelledReconstructionType, QT_TRANSLATE_NOOP("ChannelTree", "Markers")},
                 {Channels::SegmentPoseType, QT_TRANSLATE_NOOP("ChannelTree", "Segments")},
                 {Channels::DeviceOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Analog outputs")},
-                {Channels::JointAnglesType, QT_TRANSLATE_NOOP("ChannelTree", "Joint angles")},
-                {Channels::TableColumnType, QT_TRANSLATE_NOOP("ChannelTree", "Columns")}};
+                {Channels::ModelOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Model outputs")}};
     for (const auto& rRow : rows)
         if (rRow.Type == i_rTypeName)
             return QCoreApplication::translate("ChannelTree", rRow.pText);

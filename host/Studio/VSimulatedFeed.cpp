@@ -5,6 +5,7 @@
 #include "TQL/ITick.h"
 
 #include <algorithm>
+#include <cmath>
 #include <functional>
 #include <span>
 #include <stdexcept>
@@ -22,6 +23,7 @@ struct VSimulatedFeed::Source
     std::size_t Stride = 0;              ///< values of one row of all its channels
     std::size_t ValuesPerChannel = 0;    ///< of one row
     std::vector<std::uint32_t> Channels; ///< as the context numbers them, in the order of the array
+    bool bMarkers = false;
     std::vector<float> Values;
 };
 
@@ -51,6 +53,7 @@ VSimulatedFeed::VSimulatedFeed(const VWalkSimulator::Options& i_rOptions,
     for (std::uint32_t subject = 0; subject < i_rOptions.Subjects; ++subject)
         AddSubject(subject);
     AddAnalog();
+    AddSampleCount();
 }
 
 VSimulatedFeed::~VSimulatedFeed() = default;
@@ -76,7 +79,8 @@ void VSimulatedFeed::AddSubject(std::uint32_t i_Subject)
         return source;
     };
 
-    Source markers = add(Channels::LabelPositionType, VWalkSimulator::MarkerNames(), 3);
+    Source markers = add(Channels::LabelledReconstructionType, VWalkSimulator::MarkerNames(), 3);
+    markers.bMarkers = true;
     markers.Read = [this, i_Subject](std::int64_t i_Frame, std::span<float> o_Values)
     {
         m_Simulator.ReadMarkers(i_Frame, i_Subject, o_Values);
@@ -115,6 +119,38 @@ void VSimulatedFeed::AddAnalog()
     m_Sources.push_back(std::move(analog));
 }
 
+/// Behind the markers, for it counts what they are in the same batch.
+void VSimulatedFeed::AddSampleCount()
+{
+    Source count;
+    count.ValuesPerChannel = count.Stride = count.ValuesPerFrame = 1;
+    Channels::ChannelDefinition definition;
+    definition.TypeName = Channels::SampleCountType;
+    definition.ComponentNames = {""};
+    count.Channels.push_back(AddTo(*m_pContext, definition, 0));
+    count.Read = [this](std::int64_t i_Frame, std::span<float> o_Values)
+    {
+        o_Values.front() = CountSamples(static_cast<std::size_t>(i_Frame - m_BatchFirst));
+    };
+    m_Sources.push_back(std::move(count));
+}
+
+/// The markers that are there in one row of the batch.
+float VSimulatedFeed::CountSamples(std::size_t i_Row) const
+{
+    std::size_t count = 0;
+    for (const Source& rSource : m_Sources)
+    {
+        if (!rSource.bMarkers)
+            continue;
+        const auto row =
+            std::span<const float>(rSource.Values).subspan(i_Row * rSource.ValuesPerFrame, rSource.ValuesPerFrame);
+        for (std::size_t i = 0; i < row.size(); i += rSource.ValuesPerChannel)
+            count += std::isnan(row[i]) ? 0 : 1;
+    }
+    return static_cast<float>(count);
+}
+
 TQL::IResult VSimulatedFeed::Produce(std::int64_t i_FirstFrame, std::int64_t i_FrameCount)
 {
     const std::int64_t end = i_FirstFrame + i_FrameCount;
@@ -127,6 +163,7 @@ TQL::IResult VSimulatedFeed::Produce(std::int64_t i_FirstFrame, std::int64_t i_F
 TQL::IResult VSimulatedFeed::ProduceBatch(std::int64_t i_FirstFrame, std::int64_t i_FrameCount)
 {
     m_Rows.clear();
+    m_BatchFirst = i_FirstFrame;
     for (Source& rSource : m_Sources)
     {
         rSource.Values.resize(rSource.ValuesPerFrame * static_cast<std::size_t>(i_FrameCount));

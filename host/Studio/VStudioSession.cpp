@@ -2,6 +2,7 @@
 
 #include "ChannelSystemSelection/VChannelSelectionManager.h"
 #include "Channels/ChannelTypes.h"
+#include "Channels/ContextThings.h"
 #include "Channels/VChannelService.h"
 #include "Channels/VRecordedContext.h"
 #include "OrvanePluginInterface/ITimeController.h"
@@ -71,7 +72,25 @@ VStudioSession::VStudioSession(const Options& i_rOptions) : m_SettingsFolder(Fin
     m_pChannels = std::make_shared<Channels::VChannelService>();
     m_pChannels->SetSelectionManager(MakeSelectionManager(*m_pHost));
     m_pHost->SetChannelService(m_pChannels);
+    TellSelection();
     m_pPlugin = std::make_unique<Services::VPluginHost>(*m_pHost);
+}
+
+/// What the selection has to know of the context that is shown.
+void VStudioSession::TellSelection()
+{
+    m_pHost->Selection()->SetRootSegments(
+        [this](std::uint64_t i_Subject)
+        {
+            const auto pContext = CurrentContext();
+            return pContext ? Channels::RootSegmentOf(*pContext, i_Subject) : 0;
+        });
+    m_pHost->Selection()->SetDevices(
+        [this]
+        {
+            const auto pContext = CurrentContext();
+            return pContext ? Channels::DevicesOf(*pContext) : std::vector<TQL::SelectionItem>();
+        });
 }
 
 VStudioSession::~VStudioSession()

@@ -118,6 +118,7 @@ public:
     std::vector<std::string> Faults() const { return m_pHost->Faults(); }
 
 private:
+    void TellSelection();
     void AddContext(const std::shared_ptr<Channels::VChannelContext>& i_rpContext, int i_TimeMode);
 
     std::filesystem::path m_SettingsFolder;

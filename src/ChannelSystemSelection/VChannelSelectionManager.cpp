@@ -4,6 +4,7 @@
 #include "NotificationSystem/WeakCallback.h"
 
 #include <algorithm>
+#include <unordered_set>
 
 namespace ChannelSystemSelection
 {
@@ -136,11 +137,16 @@ void VChannelSelectionManager::GetSelectedTypeCounts(std::uint64_t i_Mask,
 {
     o_rCounts.clear();
     const auto pSelection = m_pSource->GetSelection();
+    std::map<ESelectionKind, std::size_t> counts;
     for (const auto& [rType, rRecord] : GetTypes(i_Mask))
     {
-        const std::size_t count = ThingsOf(*m_pSource, *pSelection, rRecord.Kind).size();
-        if (count != 0)
-            o_rCounts[rType] += count;
+        if (rRecord.Kind == ESelectionKind::None)
+            continue;
+        const auto [found, bNew] = counts.try_emplace(rRecord.Kind, 0);
+        if (bNew)
+            found->second = ThingsOf(*m_pSource, *pSelection, rRecord.Kind).size();
+        if (found->second != 0)
+            o_rCounts[rType] = found->second;
     }
 }
 
@@ -149,8 +155,22 @@ void VChannelSelectionManager::GetSelectedChannelTypes(std::uint64_t i_Mask, std
     std::map<std::string, std::uint64_t> counts;
     GetSelectedTypeCounts(i_Mask, counts);
     o_rTypes.clear();
+    bool bSubject = false;
     for (const auto& [rType, count] : counts)
+    {
+        auto kind = ESelectionKind::None;
+        bSubject = bSubject || (GetSelectionKind(rType, kind).IsSuccess() && kind == ESelectionKind::Subject);
         o_rTypes.insert(rType);
+    }
+    if (!bSubject)
+        return;
+    const TypeTable offered = GetTypes(i_Mask);
+    for (const char* pType : {"SubjectSegmentPose", "SubjectSegmentPoseSolve", "SubjectSegmentPoseRetarget"})
+    {
+        auto kind = ESelectionKind::None;
+        if (offered.contains(pType) || GetSelectionKind(pType, kind).IsError()) // not one that the mask leaves out
+            o_rTypes.insert(pType);
+    }
 }
 
 void VChannelSelectionManager::GetGlobalChannelTypes(std::uint64_t i_Mask, std::set<std::string>& o_rTypes) const
@@ -175,11 +195,12 @@ void VChannelSelectionManager::SelectThingsOf(const std::shared_ptr<TQL::IChanne
 {
     std::vector<SelectionItem> items;
     std::vector<std::shared_ptr<TQL::IChannel>> open{i_rpChannel};
+    std::unordered_set<const TQL::IChannel*> seen; // channels may share what they are made from
     while (!open.empty())
     {
         const auto pChannel = open.back();
         open.pop_back();
-        if (!pChannel)
+        if (!pChannel || !seen.insert(pChannel.get()).second)
             continue;
         auto kind = ESelectionKind::None;
         const TQL::IChannelInstanceId& rId = pChannel->GetInstanceId();
@@ -189,7 +210,7 @@ void VChannelSelectionManager::SelectThingsOf(const std::shared_ptr<TQL::IChanne
             items.push_back(item);
         std::vector<std::shared_ptr<TQL::IChannel>> dependents;
         pChannel->GetDependentChannels(dependents);
-        open.insert(open.end(), dependents.begin(), dependents.end());
+        open.insert(open.end(), dependents.rbegin(), dependents.rend());
     }
     if (items.empty())
         return;

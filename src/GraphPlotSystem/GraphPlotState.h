@@ -1,33 +1,27 @@
 #pragma once
 
-#include "TQL/NearlyEqual.h"
+#include "GraphPlotSystem/ActiveChannelState.h"
+#include "GraphPlotSystem/SubplotState.h"
+#include "GraphPlotSystem/TraceState.h"
 
-#include <limits>
-#include <string>
+#include <memory>
+#include <vector>
+
+namespace TQL
+{
+class IChannel;
+}
 
 namespace GraphPlotUI
 {
 
-/// The time axis and the gaps of one window, as they are saved and restored. Plain data; a value that was not saved has
-/// the default of a new window. A time range with an infinite or extreme end stands for "the default range".
-struct TraceState
-{
-    std::string LiveTimePreset; ///< the text of a preset; empty for the standard one
-    bool bRelativeTimeDisplay = true;
-    bool bLockTimeRange = false;
-    bool bFitTimeRange = false;
-    TQL::FrameRange TimeRange{std::numeric_limits<double>::lowest(), std::numeric_limits<double>::max()}; ///< frames
-    double GapOpacity = 0.5;
-
-    friend bool operator==(const TraceState&, const TraceState&) = default;
-};
-
 /// The whole state of one view of a window, as it is saved and restored.
 struct GraphPlotState
 {
-    std::string SelectedChannelType = "Auto";
-    std::string GlobalChannelType = "None";
+    ActiveChannelState ActiveChannels;
+    SubplotState Subplots;
     TraceState Trace;
+    std::vector<std::shared_ptr<TQL::IChannel>> PinnedChannels; ///< none is null
 
     friend bool operator==(const GraphPlotState&, const GraphPlotState&) = default;
 };

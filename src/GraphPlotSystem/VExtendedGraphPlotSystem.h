@@ -1,29 +1,58 @@
 #pragma once
 
 #include "GraphPlotSystem/VGraphPlotSystem.h"
-#include "GraphPlotSystem/VPlainSubplotModel.h"
-#include "GraphPlotSystem/VSelectedChannels.h"
 #include "TQL/VShared.h"
 
 #include <QtCore/QPointer>
 
+namespace TQL
+{
+class IChannelComponentControls;
+class IPostalService;
+} // namespace TQL
+
 namespace GraphPlotUI
 {
 
-/// The whole of one graph window: what VGraphPlotSystem holds, the channels to plot and the subplots that show them.
-/// Every change of the channels goes to the trace manager from here. Made by TQL::MakeShared, owned by the window's
-/// content. The models are children of the context and die with it. UI thread.
+class VActiveChannelManager;
+class VActiveChannelModel;
+class VChannelComponentModel;
+class VKeyModel;
+class VSubplotManager;
+
+/// What belongs to the channels and subplots of one window.
+struct GraphPlotModels
+{
+    std::shared_ptr<VActiveChannelManager> pActiveChannelManager;
+    std::shared_ptr<VSubplotManager> pSubplotManager;
+    std::shared_ptr<TQL::IChannelComponentControls> pComponentControls;
+    // Children of the graph plot context, with which they die.
+    QPointer<VActiveChannelModel> pActiveChannelModel;
+    QPointer<VChannelComponentModel> pComponentModel;
+    QPointer<VKeyModel> pKeyModel;
+};
+
+/// The whole of one graph window: what VGraphPlotSystem holds, and all managers and models of channels and subplots.
+/// Every change of the channels goes to the trace manager and the list of components from here. Made by
+/// TQL::MakeShared, owned by the window's content. UI thread.
 class VExtendedGraphPlotSystem : public VGraphPlotSystem, public TQL::VShared
 {
 public:
     VExtendedGraphPlotSystem(std::shared_ptr<VGraphPlotContext> i_pContext,
                              std::shared_ptr<VTraceManager> i_pTraceManager,
-                             std::shared_ptr<VBaseGraphPlotTime> i_pPlotTime, VSelectedChannels* i_pSelectedChannels,
-                             VPlainSubplotModel* i_pSubplotModel,
+                             std::shared_ptr<VBaseGraphPlotTime> i_pPlotTime, GraphPlotModels i_Models,
                              std::shared_ptr<TQL::IPostalService> i_pUiPostalService);
+    ~VExtendedGraphPlotSystem() override;
 
-    VSelectedChannels* GetSelectedChannels() const { return m_pSelectedChannels; }
-    VPlainSubplotModel* GetSubplotModel() const { return m_pSubplotModel; }
+    std::shared_ptr<VActiveChannelManager> GetActiveChannelManager() const { return m_Models.pActiveChannelManager; }
+    std::shared_ptr<VSubplotManager> GetSubplotManager() const { return m_Models.pSubplotManager; }
+    VActiveChannelModel* GetActiveChannelModel() const;
+    VChannelComponentModel* GetChannelComponentModel() const;
+    VKeyModel* GetKeyModel() const;
+
+    void BuildState(GraphPlotState& o_rState) override;
+    /// All parts are applied, whatever the others give: see CombineStateResults.
+    void ApplyState(TQL::IResult& o_rResult, const GraphPlotState& i_rState) override;
 
     void SetContext(const std::string& i_rName) override;
     void Reset() override;
@@ -34,8 +63,7 @@ protected:
 private:
     void OnChannelsChanged();
 
-    const QPointer<VSelectedChannels> m_pSelectedChannels;
-    const QPointer<VPlainSubplotModel> m_pSubplotModel;
+    const GraphPlotModels m_Models;
     const std::shared_ptr<TQL::IPostalService> m_pUiPostalService;
 };
 

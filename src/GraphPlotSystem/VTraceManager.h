@@ -1,8 +1,8 @@
 #pragma once
 
 #include "GraphPlotSystem/ESubplotLayoutModes.h"
-#include "GraphPlotSystem/GraphPlotState.h"
 #include "GraphPlotSystem/IGraphPlotPreferences.h"
+#include "GraphPlotSystem/TraceState.h"
 #include "GraphPlotSystem/VTraceDataUpdater.h"
 #include "NotificationSystem/IAsioPostalService.h"
 #include "NotificationSystem/VSubscriptions.h"

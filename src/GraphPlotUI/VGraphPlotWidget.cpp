@@ -1,6 +1,11 @@
 #include "GraphPlotUI/VGraphPlotWidget.h"
 
+#include "GraphPlotSystem/VActiveChannelManager.h"
+#include "GraphPlotSystem/VActiveChannelModel.h"
+#include "GraphPlotSystem/VChannelComponentModel.h"
 #include "GraphPlotSystem/VExtendedGraphPlotSystem.h"
+#include "GraphPlotSystem/VKeyModel.h"
+#include "GraphPlotSystem/VSubplotManager.h"
 
 namespace GraphPlotUI
 {
@@ -24,9 +29,12 @@ void VGraphPlotWidget::SetContextProperties(bool i_bDeveloper)
     const std::pair<const char*, QObject*> objects[] = {
         {"contextWidget", this},
         {"contextGraphPlot", m_pSystem->GetContext().get()},
-        {"contextActiveChannelModel", m_pSystem->GetSelectedChannels()},
+        {"contextActiveChannelModel", m_pSystem->GetActiveChannelModel()},
+        {"contextKeyModel", m_pSystem->GetKeyModel()},
+        {"contextChannelComponentModel", m_pSystem->GetChannelComponentModel()},
+        {"contextActiveChannelManager", m_pSystem->GetActiveChannelManager().get()},
         {"contextTraceManager", m_pSystem->GetTraceManager().get()},
-        {"contextSubplotManager", m_pSystem->GetSubplotModel()},
+        {"contextSubplotManager", m_pSystem->GetSubplotManager().get()},
         {"contextGraphPlotTime", m_pSystem->GetPlotTime().get()},
     };
     for (const auto& [pName, pObject] : objects)

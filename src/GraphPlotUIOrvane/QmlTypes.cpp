@@ -1,13 +1,27 @@
 #include "GraphPlotUIOrvane/QmlTypes.h"
 
+#include "GraphPlotSystem/ChannelOptionEnums.h"
+#include "GraphPlotSystem/EActiveChannelModelRoles.h"
+#include "GraphPlotSystem/EChannelTypeModelRoles.h"
+#include "GraphPlotSystem/ESubplotLayoutModes.h"
+#include "GraphPlotSystem/ESubplotPinState.h"
+#include "GraphPlotSystem/VKeyModel.h"
+#include "GraphPlotSystem/VSubplotModel.h"
+#include "GraphPlotSystem/VTraceModel.h"
 #include "GraphPlotUI/RegisterResources.h"
 #include "GraphPlotUI/VGraphPlotFBO.h"
 #include "GraphPlotUI/VSubplotRenderType.h"
 #include "GraphPlotUI/VTimeAxisRenderType.h"
 #include "GraphPlotUI/VValueAxisRenderType.h"
+#include "GraphPlotUIOrvane/VGraphPlotStorePreferences.h"
+#include "IOInterfaceQt/RegisterTypes.h"
+#include "TQL/SchemaIntern.h"
 
+#include <QtCore/QMetaEnum>
 #include <QtQml/QQmlEngine>
 #include <QtQml/qqml.h>
+
+#include <utility>
 
 namespace GraphPlotUI
 {
@@ -29,6 +43,22 @@ void RegisterGraphPlotTypes()
     qmlRegisterType<VSubplotRenderType>(pModule, 1, 0, "SubplotRenderType");
     qmlRegisterType<VTimeAxisRenderType>(pModule, 1, 0, "TimeAxisRenderType");
     qmlRegisterType<VValueAxisRenderType>(pModule, 1, 0, "ValueAxisRenderType");
+    TQL::IO::RegisterQmlTypes();
+    const std::pair<const char*, QMetaEnum> maps[] = {
+        {"ChannelTypeModelRoles", QMetaEnum::fromType<TQL::ChannelTypeModelRoles::EChannelTypeModelRoles>()},
+        {"ActiveChannelModelRoles", QMetaEnum::fromType<TQL::ActiveChannelModelRoles::EActiveChannelModelRoles>()},
+        {"KeyModelRoles", QMetaEnum::fromType<TQL::KeyModelRoles::EKeyModelRoles>()},
+        {"SubplotModelRoles", QMetaEnum::fromType<TQL::SubplotModelRoles::ESubplotModelRoles>()},
+        {"SubplotLayoutModes", QMetaEnum::fromType<TQL::SubplotLayoutModes::ESubplotLayoutModes>()},
+        {"SubplotPinStates", QMetaEnum::fromType<TQL::SubplotPinStates::ESubplotPinState>()},
+        {"TraceModelRoles", QMetaEnum::fromType<TQL::TraceModelRoles::ETraceModelRoles>()},
+    };
+    for (const auto& [pName, map] : maps)
+        TQL::IO::RegisterEnumMap(pModule, pName, map);
+    TQL::IO::RegisterEnumMap(pModule, "TraceColourSets",
+                             TQL::IO::GetUniqueSchema(DescribeSchema(std::type_identity<ETraceColourSet>())));
+    TQL::IO::RegisterEnumMap(pModule, "RotationUnits", RotationUnitsSchema());
+    TQL::IO::RegisterEnumMap(pModule, "LengthUnits", LengthUnitsSchema());
 }
 
 void AddResourceImportPath(QQmlEngine& i_rEngine)

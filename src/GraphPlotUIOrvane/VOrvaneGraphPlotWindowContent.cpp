@@ -2,6 +2,7 @@
 
 #include "ChannelSystem/IChannelContext.h"
 #include "ChannelSystem/IChannelService.h"
+#include "GraphPlotSystem/VActiveChannelModel.h"
 #include "GraphPlotSystem/VExtendedGraphPlotSystem.h"
 #include "GraphPlotSystem/WeakObjectCallback.h"
 #include "GraphPlotUI/VGraphPlotWidget.h"
@@ -75,10 +76,11 @@ void VOrvaneGraphPlotWindowContent::OnViewChanged()
     // A notice that changes neither view nor context must not throw away what the operator has set up since.
     if (view != m_View)
         ApplyStateOf(view);
+    // What could not follow is gone from the list and told in the log.
+    (void)m_pSystem->GetActiveChannelModel()->SwitchContext(view.ContextName,
+                                                            m_pWindowContext->GetSourceMap()->GetNames());
     if (view.ContextName != s_pGlobalContext)
         m_pSystem->SetContext(view.ContextName);
-    else
-        m_pSystem->GetSelectedChannels()->SetContext(view.ContextName);
     m_View = std::move(view);
 }
 

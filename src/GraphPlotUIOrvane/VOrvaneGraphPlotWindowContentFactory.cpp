@@ -1,10 +1,15 @@
 #include "GraphPlotUIOrvane/VOrvaneGraphPlotWindowContentFactory.h"
 
 #include "GraphPlotSystem/SharedObject.h"
+#include "GraphPlotSystem/VActiveChannelManager.h"
+#include "GraphPlotSystem/VActiveChannelModel.h"
+#include "GraphPlotSystem/VBaseChannelTextProvider.h"
+#include "GraphPlotSystem/VChannelComponentControls.h"
+#include "GraphPlotSystem/VChannelComponentModel.h"
 #include "GraphPlotSystem/VExtendedGraphPlotSystem.h"
+#include "GraphPlotSystem/VKeyModel.h"
 #include "GraphPlotSystem/VOrvaneGraphPlotTime.h"
-#include "GraphPlotSystem/VPlainChannelComponentControls.h"
-#include "GraphPlotSystem/VPlainChannelTextProvider.h"
+#include "GraphPlotSystem/VSubplotManager.h"
 #include "GraphPlotSystem/VTraceDataProvider.h"
 #include "GraphPlotUIOrvane/VGraphPlotStorePreferences.h"
 #include "GraphPlotUIOrvane/VOrvaneGraphPlotWindowContent.h"
@@ -41,20 +46,40 @@ std::shared_ptr<VExtendedGraphPlotSystem> VOrvaneGraphPlotWindowContentFactory::
     std::shared_ptr<VGraphPlotContext> i_pContext,
     std::shared_ptr<OrvanePluginInterface::ITimeController> i_pWindowContext) const
 {
+    const GraphPlotServices& r = m_Services;
     const auto pStorage = std::dynamic_pointer_cast<TQL::ITraceDataStorage>(i_pContext->GetTraceDataProvider());
-    const auto pTextProvider =
-        std::make_shared<VPlainChannelTextProvider>(m_Services.pChannelService, m_Services.pUiPostalService);
-    const auto pControls = std::make_shared<VPlainChannelComponentControls>(pTextProvider, m_Services.pUiPostalService);
-    const auto pPlotTime =
-        MakeSharedObject<VOrvaneGraphPlotTime>(m_Services.pUiPostalService, std::move(i_pWindowContext));
-    auto* pChannels = new VSelectedChannels(m_Services.pUiPostalService, m_Services.pChannelService, i_pContext.get());
-    const auto pTraceManager = MakeSharedObject<VTraceManager>(
-        m_Services.pUiPostalService, m_Services.pWorkerPostalService, m_Services.pChannelService, m_pPreferences,
-        pTextProvider, pControls, pPlotTime, pStorage, true, false);
-    auto* pSubplots =
-        new VPlainSubplotModel(m_Services.pUiPostalService, pStorage, pTextProvider, m_pPreferences, i_pContext.get());
-    return TQL::MakeShared<VExtendedGraphPlotSystem>(std::move(i_pContext), pTraceManager, pPlotTime, pChannels,
-                                                     pSubplots, m_Services.pUiPostalService);
+    const auto pTextProvider = std::make_shared<VBaseChannelTextProvider>(r.pChannelService, r.pUiPostalService);
+    const auto pPlotTime = MakeSharedObject<VOrvaneGraphPlotTime>(r.pUiPostalService, std::move(i_pWindowContext));
+    GraphPlotModels models = BuildModels(pStorage, pTextProvider, i_pContext.get());
+    const auto pTraceManager =
+        MakeSharedObject<VTraceManager>(r.pUiPostalService, r.pWorkerPostalService, r.pChannelService, m_pPreferences,
+                                        pTextProvider, models.pComponentControls, pPlotTime, pStorage, true, false);
+    models.pSubplotManager = MakeSharedObject<VSubplotManager>(r.pUiPostalService, models.pActiveChannelModel.data(),
+                                                               pTextProvider, models.pComponentControls, pTraceManager,
+                                                               pStorage, m_pPreferences, r.bChannelBrowser);
+    return TQL::MakeShared<VExtendedGraphPlotSystem>(std::move(i_pContext), pTraceManager, pPlotTime, std::move(models),
+                                                     r.pUiPostalService);
+}
+
+/// All but the subplot manager, which needs the trace manager.
+GraphPlotModels
+VOrvaneGraphPlotWindowContentFactory::BuildModels(const std::shared_ptr<TQL::ITraceDataStorage>& i_rpStorage,
+                                                  const std::shared_ptr<TQL::IChannelTextProvider>& i_rpTextProvider,
+                                                  VGraphPlotContext* i_pContext) const
+{
+    const GraphPlotServices& r = m_Services;
+    GraphPlotModels models;
+    models.pComponentControls = std::make_shared<VChannelComponentControls>(i_rpTextProvider, r.pUiPostalService);
+    models.pActiveChannelModel =
+        new VActiveChannelModel(r.pUiPostalService, i_rpTextProvider, r.pMigrationService, i_pContext);
+    models.pKeyModel = new VKeyModel(r.pUiPostalService, i_rpTextProvider, models.pComponentControls, i_rpStorage,
+                                     models.pActiveChannelModel, i_pContext);
+    models.pComponentModel =
+        new VChannelComponentModel(r.pUiPostalService, i_rpTextProvider, models.pComponentControls, i_pContext);
+    models.pActiveChannelManager =
+        MakeSharedObject<VActiveChannelManager>(r.pUiPostalService, r.pChannelService, r.pTypeRegistry,
+                                                models.pActiveChannelModel.data(), r.bObjectWord, r.bChannelBrowser);
+    return models;
 }
 
 } // namespace GraphPlotUI

@@ -36,6 +36,15 @@ std::shared_ptr<T> Fetch(TServices& i_rServices, void (TServices::*i_pGetter)(st
     return pService;
 }
 
+/// Whether the host's profile is one whose operators know objects, not subjects with segments.
+bool SaysObject(const std::shared_ptr<OrvanePluginInterface::IHostProfile>& i_rpProfile)
+{
+    constexpr std::uint64_t wordBit = 1;
+    constexpr std::uint64_t otherBits = 1u << 1 | 1u << 2 | 1u << 3 | 1u << 4 | 1u << 5 | 1u << 14;
+    const std::uint64_t word = i_rpProfile ? i_rpProfile->GetProfileWord() : 0;
+    return (word & (wordBit | otherBits)) == wordBit;
+}
+
 } // namespace
 
 using OrvanePluginInterface::IHostCoreServices;
@@ -75,6 +84,9 @@ bool VOrvanePluginGraphPlot::Initialise(IHostCoreServices& i_rCore, IHostUiServi
     services.pUiPostalService = Fetch(i_rCore, &IHostCoreServices::GetUiPostalService);
     services.pWorkerPostalService = Fetch(i_rCore, &IHostCoreServices::GetWorkerPostalService);
     services.pChannelService = Fetch(i_rCore, &IHostCoreServices::GetChannelService);
+    services.pTypeRegistry = Fetch(i_rCore, &IHostCoreServices::GetFourthFactoryService);
+    services.pMigrationService = Fetch(i_rCore, &IHostCoreServices::GetFifthFactoryService);
+    services.bObjectWord = SaysObject(Fetch(i_rCore, &IHostCoreServices::GetHostProfile));
     services.pPreferencesStore = Fetch(i_rCore, &IHostCoreServices::GetPreferencesStore);
     if (!services.pPreferencesStore) // then they last as long as the module
         services.pPreferencesStore = TQL::MakeShared<Store::VStore>();

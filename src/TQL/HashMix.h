@@ -28,13 +28,14 @@ constexpr std::uint64_t HashMix(std::uint64_t i_Hash, std::uint64_t i_Value) noe
     return HashFold(i_Hash, HashSpread(i_Value));
 }
 
-/// The word that stands for a text in HashMix: its UTF-8 bytes folded one by one from 0; 0 for the empty text.
+/// The word that stands for a text in HashMix: its UTF-8 bytes as signed numbers, folded one by one from 0; 0 for the
+/// empty text.
 /// The value is written to files, so it never changes.
 constexpr std::uint64_t HashText(std::string_view i_Text) noexcept
 {
     std::uint64_t hash = 0;
     for (const char c : i_Text)
-        hash = HashMix(hash, static_cast<unsigned char>(c));
+        hash = HashMix(hash, static_cast<std::uint64_t>(std::int64_t{static_cast<signed char>(c)}));
     return hash;
 }
 

@@ -25,19 +25,22 @@ const std::map<std::string, Rooms> s_Below = {
     {"StoreIO", {"Store", "UtilsFileSystem"}},
     {"ChannelSystem", {"TQL"}},
     {"OrvanePluginInterface", {"TQL"}},
+    {"ChannelSystemUtils", {"ChannelSystem"}},
+    {"Expressions", {"ChannelSystem"}},
     {"ChannelSystemSelection", {"NotificationSystem", "ChannelSystem"}},
     {"CoreGraphics", {"TQL"}},
     {"IOInterfaceQt", {"TQL"}},
     {"ZarvoQtQuick", {"IOInterfaceQt", "OrvanePluginInterface"}},
     {"GraphPlotSystem",
-     {"NotificationSystem", "ChannelSystem", "OrvanePluginInterface", "CoreGraphics", "IOInterfaceQt"}},
+     {"NotificationSystem", "ChannelSystemUtils", "OrvanePluginInterface", "CoreGraphics", "IOInterfaceQt"}},
     {"GraphPlotUI", {"GraphPlotSystem", "ZarvoQtQuick"}},
     {"GraphPlotUIOrvane", {"GraphPlotUI", "StoreIO"}},
     {"Recordings", {"UtilsFileSystem"}},
     {"Simulation", {"Recordings"}},
-    {"Channels", {"Recordings", "NotificationSystem", "ChannelSystem"}},
+    {"Channels", {"Recordings", "NotificationSystem", "Expressions"}},
     {"Streaming", {"Channels"}},
-    {"Services", {"Channels", "OrvanePluginInterface", "CoreGraphics", "ChannelSystemSelection", "StoreIO"}},
+    {"Services",
+     {"Channels", "OrvanePluginInterface", "CoreGraphics", "ChannelSystemSelection", "ChannelSystemUtils", "StoreIO"}},
     {"Studio", {"Services", "Simulation", "Streaming"}},
 };
 
@@ -50,10 +53,21 @@ Rooms Reachable(const std::string& i_rRoom)
 }
 
 /// Those that build without Qt.
-const Rooms s_WithoutQt = {
-    "StoreInterface",     "Store",         "StoreParameters",        "StoreIO",    "UtilsFileSystem", "TQL",
-    "NotificationSystem", "ChannelSystem", "ChannelSystemSelection", "Recordings", "Simulation",      "Channels",
-    "Streaming"};
+const Rooms s_WithoutQt = {"StoreInterface",
+                           "Store",
+                           "StoreParameters",
+                           "StoreIO",
+                           "UtilsFileSystem",
+                           "TQL",
+                           "NotificationSystem",
+                           "ChannelSystem",
+                           "ChannelSystemSelection",
+                           "ChannelSystemUtils",
+                           "Expressions",
+                           "Recordings",
+                           "Simulation",
+                           "Channels",
+                           "Streaming"};
 
 /// What stands between the delimiters of an include line, with its opening delimiter; empty for any other line.
 std::string_view IncludeOf(std::string_view i_Line)

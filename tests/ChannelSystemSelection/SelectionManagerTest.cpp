@@ -104,18 +104,27 @@ TEST(SelectionManager, CountsAndMasksTypes)
     const Fixture fixture;
     fixture.pManager->RegisterChannelType("SubjectSegmentPose", ESelectionKind::Segment, 0);
     fixture.pManager->RegisterChannelType("Internal", ESelectionKind::Label, 2);
-    fixture.pManager->RegisterChannelType("LabelPosition", ESelectionKind::Label, 0);
+    fixture.pManager->RegisterChannelType("Labelled Reconstructions", ESelectionKind::Label, 0);
     fixture.pManager->RegisterChannelType("Clock", ESelectionKind::Global, 4);
     fixture.pSource->m_Items = {
         {ESelectionKind::Label, 0, 1, {}}, {ESelectionKind::Label, 0, 2, {}}, {ESelectionKind::Subject, 0, 0, {}}};
 
     std::map<std::string, std::uint64_t> counts;
     fixture.pManager->GetSelectedTypeCounts(2, counts);
-    EXPECT_EQ(counts, (std::map<std::string, std::uint64_t>{{"LabelPosition", 2}, {"SubjectSegmentPose", 1}}));
+    EXPECT_EQ(counts,
+              (std::map<std::string, std::uint64_t>{{"Labelled Reconstructions", 2}, {"SubjectSegmentPose", 1}}));
 
     std::set<std::string> types;
     fixture.pManager->GetSelectedChannelTypes(0, types);
-    EXPECT_EQ(types, (std::set<std::string>{"Internal", "LabelPosition", "SubjectSegmentPose"}));
+    EXPECT_EQ(types, (std::set<std::string>{"Internal", "Labelled Reconstructions", "SubjectSegmentPose"}));
+
+    // With a type of subjects a selected one brings the poses of its root segment, but for those under the mask.
+    fixture.pManager->RegisterChannelType("Subject", ESelectionKind::Subject, 0);
+    fixture.pManager->RegisterChannelType("SubjectSegmentPoseSolve", ESelectionKind::Segment, 2);
+    fixture.pManager->GetSelectedChannelTypes(2, types);
+    EXPECT_EQ(types, (std::set<std::string>{"Labelled Reconstructions", "Subject", "SubjectSegmentPose",
+                                            "SubjectSegmentPoseRetarget"}));
+
     fixture.pManager->GetGlobalChannelTypes(0, types);
     EXPECT_EQ(types, std::set<std::string>{"Clock"});
     fixture.pManager->GetGlobalChannelTypes(4, types);

@@ -25,7 +25,8 @@ protected:
     CacheChannel() : m_pLive(std::make_shared<VLiveContext>("Live", m_Service.GetSubTypes(), VLiveContext::Options{}))
     {
         m_Service.AddContext(m_pLive);
-        EXPECT_TRUE(m_pLive->AddChannel({"LabelPosition", 0, 0, "", "Head", "mm", {}}, 0, m_Marker).IsSuccess());
+        EXPECT_TRUE(
+            m_pLive->AddChannel({"Labelled Reconstructions", 0, 0, "", "Head", "mm", {}}, 0, m_Marker).IsSuccess());
         EXPECT_TRUE(
             m_pLive->AddChannel({"SubjectSegmentPose", 0, 0, "", "Pelvis", "mm", {}}, 0, m_Segment).IsSuccess());
     }
@@ -157,13 +158,13 @@ TEST_F(CacheChannel, SharesTheStoreOfItsInputWhereNothingIsAltered)
     {
         return i_rChannel.GetOutput()->GetBlock()->GetStore();
     };
-    const auto pMarker = m_Service.GetChannel({"Live", "LabelPosition", 0, 0, ""});
+    const auto pMarker = m_Service.GetChannel({"Live", "Labelled Reconstructions", 0, 0, ""});
     const auto pPose = m_Service.GetChannel({"Live", "SubjectSegmentPose", 0, 0, ""});
-    EXPECT_EQ(storeOf(*MakeCache("LabelPosition", true, 5)), storeOf(*pMarker));
+    EXPECT_EQ(storeOf(*MakeCache("Labelled Reconstructions", true, 5)), storeOf(*pMarker));
     EXPECT_EQ(storeOf(*MakeCache("SubjectSegmentPose", false, 5)), storeOf(*pPose));
     EXPECT_NE(storeOf(*MakeCache("SubjectSegmentPose", true, 5)), storeOf(*pPose));
     // A cache of a cache shows the window of the first.
-    const auto pInner = MakeCache("LabelPosition", false, 5);
+    const auto pInner = MakeCache("Labelled Reconstructions", false, 5);
     const auto pOuter = m_Service.CreateDerivedChannel("Cache", {}, {pInner});
     EXPECT_EQ(RangeInFrames(*pOuter), (TickRange{5, 10}));
     EXPECT_EQ(pOuter->GetOutput()->GetBlock()->GetShape().SummaryPeriods.size(), 1u) << "without SupportLodding";
@@ -241,12 +242,12 @@ TEST_F(CacheChannel, KeepsAllOfARecordingWhateverTheRange)
 TEST_F(CacheChannel, ParametersAreCheckedAndInherited)
 {
     AddFrames(1);
-    const auto pCache = MakeCache("LabelPosition", false, 5);
+    const auto pCache = MakeCache("Labelled Reconstructions", false, 5);
     const auto pParameters = pCache->GetParameters();
     EXPECT_EQ(pParameters->SetParameter("CacheRangeTicks", std::int32_t{5}), TQL::Result::InvalidType);
     EXPECT_EQ(pParameters->SetParameter("InstanceDisplayName", std::string("x")), TQL::Result::NotFound);
     EXPECT_EQ(pParameters->SetParameter("SupportLodding", true), TQL::Result::OkButNoEffect);
-    const auto pInputParameters = m_Service.GetChannel({"Live", "LabelPosition", 0, 0, ""})->GetParameters();
+    const auto pInputParameters = m_Service.GetChannel({"Live", "Labelled Reconstructions", 0, 0, ""})->GetParameters();
     EXPECT_EQ(pInputParameters->SetParameter("InstanceDisplayName", std::string("x")), TQL::Result::NotPermitted);
     TQL::ParameterValue value;
     ASSERT_TRUE(pParameters->Read("", "InstanceDisplayName", value).IsSuccess());
@@ -260,7 +261,7 @@ TEST_F(CacheChannel, ParametersAreCheckedAndInherited)
 TEST_F(CacheChannel, OutputAloneKeepsTheChannel)
 {
     AddFrames(1);
-    auto pCache = MakeCache("LabelPosition", false, 5);
+    auto pCache = MakeCache("Labelled Reconstructions", false, 5);
     const std::weak_ptr<TQL::IChannel> pWatch = pCache;
     auto pOutput = pCache->GetOutput();
     pCache = nullptr;

@@ -39,6 +39,7 @@ std::shared_ptr<Recordings::VRecording> MakeRecording()
     add(EChannelKind::Analog, "Fx", "", "N", {""});
     add(EChannelKind::Analog, "EMG", "", "arb. units", {""});
     add(EChannelKind::JointAngles, "Hip", "", "deg", {"X", "Y", "Z"});
+    pRecording->Channels.back().RotationOrder = "ZXY";
     add(EChannelKind::Column, "ankle", "", "", {""});
     return pRecording;
 }
@@ -68,23 +69,38 @@ TEST(ChannelService, RecordedChannelsAreFoundByTheirExactId)
     };
     using enum TQL::ESelectionKind;
     const std::vector<Case> cases{
-        {{"Walk", "LabelPosition", 0, 1, ""}, "Ann:RFHD", "TX,TY,TZ", "Position", "mm mm mm ", {Label, 0, 1, ""}},
-        {{"Walk", "LabelPosition", 1, 0, ""}, "Bob:LFHD", "TX,TY,TZ", "Position", "mm mm mm ", {Label, 1, 0, ""}},
+        {{"Walk", "Labelled Reconstructions", 0, 1, ""},
+         "Ann:RFHD",
+         "TX,TY,TZ",
+         "Position",
+         "mm mm mm ",
+         {Label, 0, 1, ""}},
+        {{"Walk", "Labelled Reconstructions", 1, 0, ""},
+         "Bob:LFHD",
+         "TX,TY,TZ",
+         "Position",
+         "mm mm mm ",
+         {Label, 1, 0, ""}},
         {{"Walk", "SubjectSegmentPose", 1, 0, ""},
          "Bob:Pelvis",
          "RX,RY,RZ,TX,TY,TZ",
          "Pose",
          "rad rad rad m m m ",
          {Segment, 1, 0, ""}},
-        {{"Walk", "AnalogDeviceOutput", 0, 0, ""}, "Fx", "", "", "N ", {AnalogueDeviceOutput, 0, 0, ""}},
-        {{"Walk", "AnalogDeviceOutput", 0, 1, ""}, "EMG", "", "", "arb. units ", {AnalogueDeviceOutput, 0, 1, ""}},
-        {{"Walk", "JointAngles", 0, 0, "Hip"}, "Hip", "X,Y,Z", "Euler", "° ° ° ", {ModelOutput, 0, 0, "Hip"}},
-        {{"Walk", "TableColumn", 0, 0, "ankle"}, "ankle", "", "", " ", {ModelOutput, 0, 0, "ankle"}},
-        {{"Other", "LabelPosition", 0, 1, ""}, nullptr, "", "", "", {}},
-        {{"", "LabelPosition", 0, 1, ""}, nullptr, "", "", "", {}},
-        {{"Walk", "LabelPosition", 0, 2, ""}, nullptr, "", "", "", {}},
-        {{"Walk", "LabelPosition", 0, 1, "x"}, nullptr, "", "", "", {}},
-        {{"Walk", "TableColumn", 0, 0, ""}, nullptr, "", "", "", {}},
+        {{"Walk", "DeviceOutput", 0, 0, ""}, "Fx", "", "", "N ", {AnalogueDeviceOutput, 0, 0, ""}},
+        {{"Walk", "DeviceOutput", 0, 1, ""}, "EMG", "", "", "arb. units ", {AnalogueDeviceOutput, 0, 1, ""}},
+        {{"Walk", "ModelSetSamplesOutput", 0, 0, "Hip"},
+         "Hip",
+         "X,Y,Z",
+         "EulerZXY",
+         "° ° ° ",
+         {ModelOutput, 0, 0, "Hip"}},
+        {{"Walk", "ModelSetSamplesOutput", 1, 0, "ankle"}, "ankle", "", "", " ", {ModelOutput, 1, 0, "ankle"}},
+        {{"Other", "Labelled Reconstructions", 0, 1, ""}, nullptr, "", "", "", {}},
+        {{"", "Labelled Reconstructions", 0, 1, ""}, nullptr, "", "", "", {}},
+        {{"Walk", "Labelled Reconstructions", 0, 2, ""}, nullptr, "", "", "", {}},
+        {{"Walk", "Labelled Reconstructions", 0, 1, "x"}, nullptr, "", "", "", {}},
+        {{"Walk", "ModelSetSamplesOutput", 0, 0, ""}, nullptr, "", "", "", {}},
     };
     for (const Case& rCase : cases)
     {
@@ -139,7 +155,7 @@ TEST(ChannelService, ContextsComeGoAndAreReplaced)
     EXPECT_EQ(pFirst->GetTickRange(), (TQL::TickRange{0, 10 * TQL::DefaultFramePeriod}));
     EXPECT_EQ(pFirst->GetType(), ChannelSystem::EContextType::Recorded);
 
-    const IChannelInstanceId id{"Walk", "LabelPosition", 0, 0, ""};
+    const IChannelInstanceId id{"Walk", "Labelled Reconstructions", 0, 0, ""};
     const auto pOldChannel = service.GetChannel(id);
     const auto pOldOutput = pOldChannel->GetOutput();
     service.AddContext(make());
@@ -165,8 +181,8 @@ TEST(ChannelService, ListsTheTypesThatAContextHas)
     service.AddContext(pLive);
     std::uint32_t channel = 0;
     EXPECT_TRUE(pLive->AddChannel({"SubjectSegmentPose", 0, 0, "", "", "", {}}, 0, channel).IsSuccess());
-    const std::vector<std::string> all{"LabelPosition", "SubjectSegmentPose", "AnalogDeviceOutput", "JointAngles",
-                                       "TableColumn"};
+    const std::vector<std::string> all{"Labelled Reconstructions", "SubjectSegmentPose", "DeviceOutput",
+                                       "ModelSetSamplesOutput"};
     EXPECT_EQ(service.GetChannelTypes(0, "Walk"), all);
     EXPECT_EQ(service.GetChannelTypes(~0ull, ""), all);
     EXPECT_EQ(service.GetChannelTypes(0, "Live"), std::vector<std::string>{"SubjectSegmentPose"});
@@ -186,7 +202,7 @@ TEST(ChannelService, EveryCacheIsNewAndKnownWhileItLives)
 {
     VChannelService service;
     service.AddContext(std::make_shared<Channels::VRecordedContext>("Walk", service.GetSubTypes(), MakeRecording()));
-    const auto pInput = service.GetChannel({"Walk", "LabelPosition", 0, 0, ""});
+    const auto pInput = service.GetChannel({"Walk", "Labelled Reconstructions", 0, 0, ""});
     auto pFirst = service.CreateDerivedChannel("Cache", {}, {pInput});
     auto pSecond = service.CreateDerivedChannel("Cache", {}, {pInput});
     ASSERT_NE(pFirst, nullptr);
@@ -207,7 +223,7 @@ TEST(ChannelService, EveryCacheIsNewAndKnownWhileItLives)
     EXPECT_EQ(service.CreateDerivedChannel("Cache", {}, {}), nullptr);
     EXPECT_EQ(service.CreateDerivedChannel("Cache", {}, {nullptr}), nullptr);
     EXPECT_EQ(service.CreateDerivedChannel("Cache", {}, {pInput, pInput}), nullptr);
-    EXPECT_EQ(service.CreateDerivedChannel("Derivative", {}, {pInput}), nullptr);
+    EXPECT_EQ(service.CreateDerivedChannel("NoSuchOperation", {}, {pInput}), nullptr);
     for (int i = 0; i < 1000; ++i)
         EXPECT_NE(service.CreateDerivedChannel("Cache", {}, {pInput}), nullptr);
 }
@@ -262,9 +278,9 @@ TEST(ChannelService, UnitsOfRecordingsFindTheirSubtype)
     for (const std::uint16_t id : {0x00ff, 0x7f00, 0x8001})
         EXPECT_EQ(table.Find(id, record), TQL::Result::InvalidId) << id;
     std::uint16_t id = 0;
-    EXPECT_TRUE(Channels::VSubTypeTable::FindByName("centi", "meter", id));
+    EXPECT_TRUE(table.FindByName("centi", "meter", id));
     EXPECT_EQ(id, table.IdOfUnit("cm"));
-    EXPECT_FALSE(Channels::VSubTypeTable::FindByName("centi", "yard", id));
+    EXPECT_FALSE(table.FindByName("centi", "yard", id));
 }
 
 TEST(ChannelService, RecordedChannelThatMakesNoSenseIsLeftOutWithAWord)
@@ -278,7 +294,7 @@ TEST(ChannelService, RecordedChannelThatMakesNoSenseIsLeftOutWithAWord)
         std::make_shared<Channels::VRecordedContext>("Walk", std::make_shared<Channels::VSubTypeTable>(), pRecording);
     EXPECT_EQ(pContext->GetChannels()->size(), pRecording->Channels.size() - 2);
     EXPECT_EQ(log.Take().size(), 2u);
-    const auto pShort = pContext->FindChannel({"Walk", "LabelPosition", 1, 0, ""});
+    const auto pShort = pContext->FindChannel({"Walk", "Labelled Reconstructions", 1, 0, ""});
     ASSERT_NE(pShort, nullptr);
     EXPECT_EQ(pShort->GetSamples()->GetRange().Last, 9 * TQL::DefaultFramePeriod);
 }

@@ -27,12 +27,13 @@ protected:
     {
         m_pContext = std::make_shared<VLiveContext>("Live", std::make_shared<Channels::VSubTypeTable>(), i_rOptions);
         m_pContext->RangeChanged()->AddDirect([this] { ++m_RangeChanges; });
-        EXPECT_TRUE(m_pContext->AddChannel({"LabelPosition", 0, 0, "", "Head", "mm", {}}, 0, m_Marker).IsSuccess());
+        EXPECT_TRUE(
+            m_pContext->AddChannel({"Labelled Reconstructions", 0, 0, "", "Head", "mm", {}}, 0, m_Marker).IsSuccess());
         for (std::uint32_t output = 0; output < 2; ++output)
-            EXPECT_TRUE(m_pContext
-                            ->AddChannel({"AnalogDeviceOutput", 0, output, "", "Force", "N", {}}, Period / 10,
-                                         m_Outputs[output])
-                            .IsSuccess());
+            EXPECT_TRUE(
+                m_pContext
+                    ->AddChannel({"DeviceOutput", 0, output, "", "Force", "N", {}}, Period / 10, m_Outputs[output])
+                    .IsSuccess());
     }
 
     TQL::IResult Append(std::int64_t i_Frame, std::int64_t i_Count = 1)
@@ -96,7 +97,7 @@ TEST_F(LiveContext, LostFramesAndSilentChannelsAreMissingSamples)
     EXPECT_TRUE(m_pContext->AppendFrames(4, 1, rows).IsSuccess());
     EXPECT_TRUE(std::isnan(Read(m_Outputs[0], 4, 5).back()));
     std::uint32_t added = 0;
-    EXPECT_TRUE(m_pContext->AddChannel({"LabelPosition", 0, 1, "", "Knee", "mm", {}}, 0, added).IsSuccess());
+    EXPECT_TRUE(m_pContext->AddChannel({"Labelled Reconstructions", 0, 1, "", "Knee", "mm", {}}, 0, added).IsSuccess());
     EXPECT_TRUE(m_pContext->AppendFrames(5, 1, {}).IsSuccess());
     EXPECT_EQ((*m_pContext->GetChannels())[added]->GetSamples()->GetRange(), (TickRange{5 * Period, 6 * Period}));
 }
@@ -130,8 +131,9 @@ TEST_F(LiveContext, BadBatchesAppendNothing)
         EXPECT_EQ(m_pContext->GetTickRange().Last, 2 * Period) << rCase.pName;
     }
     std::uint32_t channel = 0;
-    EXPECT_EQ(m_pContext->AddChannel({"LabelPosition", 0, 0, "", "", "", {}}, 0, channel), TQL::Result::AlreadyPresent);
-    EXPECT_EQ(m_pContext->AddChannel({"LabelPosition", 0, 5, "", "", "", {}}, 7, channel),
+    EXPECT_EQ(m_pContext->AddChannel({"Labelled Reconstructions", 0, 0, "", "", "", {}}, 0, channel),
+              TQL::Result::AlreadyPresent);
+    EXPECT_EQ(m_pContext->AddChannel({"Labelled Reconstructions", 0, 5, "", "", "", {}}, 7, channel),
               TQL::Result::InvalidArgument);
     EXPECT_EQ(m_pContext->AddChannel({"NoSuchType", 0, 5, "", "", "", {}}, 0, channel), TQL::Result::InvalidType);
 }
@@ -210,7 +212,7 @@ TEST_F(LiveContext, PlotsReadWhileTheProducerAppends)
             std::vector<float> values;
             do
             {
-                const auto pInput = service.GetChannel({"Live", "LabelPosition", 0, 0, ""});
+                const auto pInput = service.GetChannel({"Live", "Labelled Reconstructions", 0, 0, ""});
                 if (!pCache || reads % 64 == 0)
                     pCache = service.CreateDerivedChannel("Cache", {}, {pInput});
                 (void)pCache->GetParameters()->SetParameter("SupportLodding", true);

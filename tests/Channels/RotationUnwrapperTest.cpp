@@ -1,10 +1,12 @@
-#include "Channels/ChannelTypes.h"
 #include "Channels/VRotationUnwrapper.h"
 #include "Channels/VSubTypeTable.h"
 #include "Reference.h"
 
 #include <array>
+#include <cstdio>
+#include <functional>
 #include <numbers>
+#include <sstream>
 
 namespace ChannelsTest
 {
@@ -136,38 +138,114 @@ TEST(RotationUnwrapper, EulerAnglesAreEachContinuousAndOtherComponentsStay)
     }
 }
 
-TEST(RotationUnwrapper, DescriptionSaysWhatIsARotation)
+TEST(RotationUnwrapper, EveryFormFollowsASpinAboutAnAxis)
 {
     struct Case
     {
-        std::string_view Type;
-        std::string Units;
-        std::vector<std::string> Components;
-        bool bRotation;
         ERotationForm Form;
         double Turn;
+        std::function<std::vector<double>(double)> Wrapped; ///< of the angle in radians, as a computation gives it
+        std::function<std::vector<double>(double)> Expected;
     };
+    const auto wrap = [](double i_Angle, double i_Turn)
+    {
+        return i_Angle - i_Turn * std::round(i_Angle / i_Turn);
+    };
+    const double degrees = 180.0 / Pi;
     const std::vector<Case> cases{
-        {Channels::SegmentPoseType, "mm", {}, true, ERotationForm::AngleAxis, 2.0 * Pi},
-        {Channels::LabelPositionType, "mm", {}, false, {}, 0.0},
-        {Channels::DeviceOutputType, "V", {}, false, {}, 0.0},
-        {Channels::JointAnglesType, "deg", {"X", "Y", "Z"}, true, ERotationForm::Euler, 360.0},
-        {Channels::JointAnglesType, "rad", {"X", "Y", "Z"}, true, ERotationForm::Euler, 2.0 * Pi},
-        {Channels::JointAnglesType, "deg", {"X"}, false, {}, 0.0},
-        {Channels::JointAnglesType, "", {"X", "Y", "Z"}, false, {}, 0.0},
+        {ERotationForm::Quaternion, 0.0,
+         [&](double i_A)
+         {
+             const double half = wrap(i_A, 2.0 * Pi) / 2.0; // so that the last is never below 0
+             return std::vector<double>{0.0, std::sin(half), 0.0, std::cos(half)};
+         },
+         [](double i_A)
+         {
+             return std::vector<double>{0.0, std::sin(i_A / 2.0), 0.0, std::cos(i_A / 2.0)};
+         }},
+        {ERotationForm::AxisAndAngle, 360.0,
+         [&](double i_A)
+         {
+             const double angle = wrap(i_A, 2.0 * Pi);
+             if (std::abs(angle) < 1e-5)
+                 return std::vector<double>{1.0, 0.0, 0.0, 0.0};
+             return std::vector<double>{0.0, 0.0, angle < 0.0 ? -1.0 : 1.0, std::abs(angle) * degrees};
+         },
+         [&](double i_A)
+         {
+             return std::vector<double>{0.0, 0.0, 1.0, i_A * degrees};
+         }},
+        {ERotationForm::Angle, 2.0 * Pi, [&](double i_A) { return std::vector<double>{wrap(i_A, 2.0 * Pi)}; },
+         [](double i_A)
+         {
+             return std::vector<double>{i_A};
+         }},
     };
-    Channels::VSubTypeTable subTypes;
     for (const Case& rCase : cases)
     {
-        const Channels::ChannelDefinition definition{std::string(rCase.Type), 0, 0, "", "", rCase.Units,
-                                                     rCase.Components};
-        const auto rotation = Channels::FindRotation(Channels::DescribeComponents(definition, subTypes));
-        ASSERT_EQ(rotation.has_value(), rCase.bRotation) << rCase.Type << " " << rCase.Units;
-        if (rotation)
+        SCOPED_TRACE(static_cast<int>(rCase.Form));
+        const std::size_t count = rCase.Expected(0.0).size();
+        std::vector<float> rows;
+        std::vector<double> expected;
+        for (int i = 0; i < 400; ++i)
         {
-            EXPECT_EQ(rotation->Form, rCase.Form) << rCase.Type;
-            EXPECT_DOUBLE_EQ(rotation->Turn, rCase.Turn) << rCase.Type;
+            const double angle = 0.05 * Pi * i + 0.05; // meets whole turns nearly
+            for (const double value : rCase.Wrapped(i == 39 ? 2.0 * Pi : angle))
+                rows.push_back(i % 50 == 7 ? NaN : static_cast<float>(value));
+            rows.push_back(42.0f);
+            std::ranges::copy(rCase.Expected(i == 39 ? 2.0 * Pi : angle), std::back_inserter(expected));
         }
+        VRotationUnwrapper unwrapper({rCase.Form, rCase.Turn});
+        unwrapper.Forwards(rows, count + 1);
+        for (std::size_t i = 0; i < 400; ++i)
+        {
+            EXPECT_EQ(rows[i * (count + 1) + count], 42.0f);
+            for (std::size_t c = 0; c < count && i % 50 != 7; ++c)
+                ASSERT_NEAR(rows[i * (count + 1) + c], expected[i * count + c], 2e-3) << "row " << i << ", " << c;
+        }
+    }
+}
+
+TEST(RotationUnwrapper, DescriptionSaysWhatIsARotation)
+{
+    Channels::VSubTypeTable subTypes;
+    // Format and units of the components -> form and turn.
+    const std::vector<std::array<std::string, 3>> cases{
+        {"Pose", "rad rad rad mm mm mm", "0 of 6.283"},
+        {"Pose", "deg deg deg mm mm mm", "0 of 360.000"},
+        {"Pose", "- - - deg mm mm mm", "2 of 360.000"},
+        {"Pose", "- - - - mm mm mm", "3 of 0.000"},
+        {"Pose", "- - - - - - - - - mm mm mm", "none"},
+        {"AngleAxis", "rad rad rad", "0 of 6.283"},
+        {"EulerXYX", "deg deg deg", "1 of 360.000"},
+        {"EulerZXY", "rad rad rad", "1 of 6.283"},
+        {"EulerZXY", "rad", "none"},
+        {"EulerZXY", "- - -", "none"},
+        {"AxisAndAngle", "- - - rad", "2 of 6.283"},
+        {"Quaternion", "- - - -", "3 of 0.000"},
+        {"Quaternion", "- - -", "none"},
+        {"Angle", "deg", "4 of 360.000"},
+        {"Angle", "mm", "none"},
+        {"SOMatrix", "- - - - - - - - -", "none"},
+        {"Position", "mm mm mm", "none"},
+        {"", "rad rad rad", "none"},
+    };
+    for (const auto& [format, units, expected] : cases)
+    {
+        TQL::ComponentDescription description;
+        description.FormatName = format;
+        std::istringstream words(units);
+        for (std::string word; words >> word;)
+        {
+            description.Groups.emplace_back();
+            if (word != "-")
+                description.Groups.back().Factors.push_back({subTypes.IdOfUnit(word)});
+        }
+        const auto rotation = Channels::FindRotation(description);
+        char text[64] = "none";
+        if (rotation)
+            std::snprintf(text, sizeof(text), "%d of %.3f", static_cast<int>(rotation->Form), rotation->Turn);
+        EXPECT_EQ(text, expected) << format << " " << units;
     }
 }
 

@@ -1,12 +1,8 @@
-#include "GraphPlotSystem/FakePreferences.h"
-#include "GraphPlotSystem/FakeTraceWindow.h"
-#include "GraphPlotSystem/MemoryBlock.h"
 #include "GraphPlotSystem/TracePalette.h"
-#include "GraphPlotSystem/VPlainSubplotModel.h"
-#include "GraphPlotSystem/VTraceDataProvider.h"
-#include "support/ManualPostalService.h"
 
 #include <gtest/gtest.h>
+
+#include <set>
 
 using namespace GraphPlotUI;
 
@@ -27,39 +23,6 @@ TEST(ColourSets, HaveDistinctOpaqueColours)
             EXPECT_FLOAT_EQ(colours.back()[channel] * 255.0f, lasts[set][channel]) << set;
     }
     EXPECT_EQ(GetTracePalette(3).data(), GetTracePalette(0).data());
-}
-
-TEST(ColourSets, TracesFollowThePreference)
-{
-    const auto pUi = std::make_shared<TestSupport::ManualPostalService>();
-    const auto pJournal = std::make_shared<FakeHost::Journal>();
-    const auto pTexts =
-        std::make_shared<FakeTraceWindow::TextProvider>(std::make_shared<FakeHost::Service>(pJournal), pUi);
-    const auto pProvider = std::make_shared<VTraceDataProvider>(pUi);
-    const auto pPreferences = std::make_shared<FakePreferences>();
-    ASSERT_TRUE(pPreferences->SetValue(IGraphPlotPreferences::TraceColourSet, 1).IsSuccess());
-
-    TestSupport::MemoryBlock block(1);
-    block.Append({1, 2, 3});
-    TQL::IChannelInstanceId id;
-    id.First = 1;
-    pProvider->UpdateTrace(id, block, {0, 3 * TQL::DefaultFramePeriod}, {0, 3 * TQL::DefaultFramePeriod}, 0);
-    {
-        VPlainSubplotModel model(pUi, pProvider, pTexts, pPreferences, nullptr);
-        pUi->RunAll();
-        const auto colour = [&]
-        {
-            Colour4f found{};
-            pProvider->GetTraceColour(found, TQL::ITraceId(id, 0));
-            return found;
-        };
-        EXPECT_EQ(colour(), GetTracePalette(1)[0]);
-        ASSERT_TRUE(pPreferences->SetValue(IGraphPlotPreferences::TraceColourSet, 2).IsSuccess());
-        pUi->RunAll();
-        EXPECT_EQ(colour(), GetTracePalette(2)[0]);
-        ASSERT_TRUE(pPreferences->SetValue(IGraphPlotPreferences::TraceColourSet, 0).IsSuccess());
-    }
-    pUi->RunAll(); // a notice for a model that is gone
 }
 
 } // namespace

@@ -2,8 +2,8 @@
 
 #include "GraphPlotSystem/FakeHost.h"
 #include "GraphPlotSystem/ITraceDataStorage.h"
+#include "GraphPlotSystem/VBaseChannelTextProvider.h"
 #include "GraphPlotSystem/VBaseGraphPlotTime.h"
-#include "GraphPlotSystem/VPlainChannelTextProvider.h"
 
 /// What stands around the updater and the manager inside one window: storage, plot time and texts.
 namespace FakeTraceWindow
@@ -121,14 +121,15 @@ public:
 };
 
 /// Reads texts as told by the channels, or refuses to.
-class TextProvider : public GraphPlotUI::VPlainChannelTextProvider
+class TextProvider : public GraphPlotUI::VBaseChannelTextProvider
 {
 public:
-    using VPlainChannelTextProvider::VPlainChannelTextProvider;
+    using VBaseChannelTextProvider::Update;
+    using VBaseChannelTextProvider::VBaseChannelTextProvider;
 
     TQL::IResult Update(const std::shared_ptr<TQL::IChannel>& i_rpChannel) override
     {
-        return bRefuse ? TQL::Result::NotAvailable : VPlainChannelTextProvider::Update(i_rpChannel);
+        return bRefuse ? TQL::Result::NotAvailable : VBaseChannelTextProvider::Update(i_rpChannel);
     }
 
     std::atomic<bool> bRefuse{false};

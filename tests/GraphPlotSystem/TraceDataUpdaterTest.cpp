@@ -1,5 +1,5 @@
 #include "GraphPlotSystem/FakeTraceWindow.h"
-#include "GraphPlotSystem/VPlainChannelComponentControls.h"
+#include "GraphPlotSystem/VChannelComponentControls.h"
 #include "GraphPlotSystem/VTraceDataUpdater.h"
 #include "support/LogGuard.h"
 
@@ -57,8 +57,7 @@ protected:
     std::shared_ptr<FakeHost::Service> pService = std::make_shared<FakeHost::Service>(pJournal);
     std::shared_ptr<FakeTraceWindow::TextProvider> pTexts =
         std::make_shared<FakeTraceWindow::TextProvider>(pService, nullptr);
-    std::shared_ptr<VPlainChannelComponentControls> pControls =
-        std::make_shared<VPlainChannelComponentControls>(pTexts, nullptr);
+    std::shared_ptr<VChannelComponentControls> pControls = std::make_shared<VChannelComponentControls>(pTexts, nullptr);
     std::shared_ptr<FakeTraceWindow::PlotTime> pTime = []
     {
         auto pPlotTime = std::make_shared<FakeTraceWindow::PlotTime>(nullptr);
@@ -313,7 +312,7 @@ TEST_F(TraceDataUpdater, ExportsTheEnabledComponentsOfCachedChannels)
     Tick();
     const VTraceDataUpdater::ExportMap both{{IdOf("A.cache"), {"TX", "TY"}}};
     EXPECT_EQ(pUpdater->GetExportData().value<VTraceDataUpdater::ExportMap>(), both);
-    pControls->SetComponentEnabled(pTexts->GetSubTypeId(pChannel->Id), 0, false);
+    (void)pControls->SetComponentEnabled(pTexts->GetSubTypeId(pChannel->Id), 0, false);
     const VTraceDataUpdater::ExportMap one{{IdOf("A.cache"), {"TY"}}};
     EXPECT_EQ(pUpdater->GetExportData().value<VTraceDataUpdater::ExportMap>(), one);
 }

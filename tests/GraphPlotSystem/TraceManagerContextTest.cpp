@@ -238,7 +238,7 @@ TEST_F(TraceManager, TheGraphPlotSystemIsTheDoorToAll)
     graphPlotSystem.SetContext("Take");
     EXPECT_TRUE(pTime->bActive);
     GraphPlotState state;
-    state.SelectedChannelType = "left from before";
+    state.ActiveChannels.SelectedChannelType = "left from before";
     graphPlotSystem.BuildState(state);
     GraphPlotState expected;
     expected.Trace.LiveTimePreset = "10s";

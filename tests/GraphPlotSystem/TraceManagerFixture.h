@@ -3,7 +3,7 @@
 #include "GraphPlotSystem/FakePreferences.h"
 #include "GraphPlotSystem/FakeTraceWindow.h"
 #include "GraphPlotSystem/SharedObject.h"
-#include "GraphPlotSystem/VPlainChannelComponentControls.h"
+#include "GraphPlotSystem/VChannelComponentControls.h"
 #include "GraphPlotSystem/VTraceManager.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
@@ -89,8 +89,8 @@ protected:
     std::shared_ptr<FakePreferences> pPreferences = std::make_shared<FakePreferences>();
     std::shared_ptr<FakeTraceWindow::TextProvider> pTexts =
         std::make_shared<FakeTraceWindow::TextProvider>(pService, pUi);
-    std::shared_ptr<GraphPlotUI::VPlainChannelComponentControls> pControls =
-        std::make_shared<GraphPlotUI::VPlainChannelComponentControls>(pTexts, pUi);
+    std::shared_ptr<GraphPlotUI::VChannelComponentControls> pControls =
+        std::make_shared<GraphPlotUI::VChannelComponentControls>(pTexts, pUi);
     std::shared_ptr<FakeTraceWindow::PlotTime> pTime = std::make_shared<FakeTraceWindow::PlotTime>(pUi);
     std::shared_ptr<FakeTraceWindow::Storage> pStorage = std::make_shared<FakeTraceWindow::Storage>(pJournal);
     std::weak_ptr<GraphPlotUI::VTraceManager> pNewest;

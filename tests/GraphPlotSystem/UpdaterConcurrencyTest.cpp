@@ -1,5 +1,5 @@
 #include "GraphPlotSystem/FakeTraceWindow.h"
-#include "GraphPlotSystem/VPlainChannelComponentControls.h"
+#include "GraphPlotSystem/VChannelComponentControls.h"
 #include "GraphPlotSystem/VTraceDataUpdater.h"
 #include "support/LogGuard.h"
 
@@ -40,7 +40,7 @@ TEST(UpdaterConcurrency, TheUserInterfaceWorksOnRecordsDuringUpdates)
     const auto pJournal = std::make_shared<FakeHost::Journal>();
     const auto pService = std::make_shared<FakeHost::Service>(pJournal);
     const auto pTexts = std::make_shared<FakeTraceWindow::TextProvider>(pService, nullptr);
-    const auto pControls = std::make_shared<VPlainChannelComponentControls>(pTexts, nullptr);
+    const auto pControls = std::make_shared<VChannelComponentControls>(pTexts, nullptr);
     const auto pTime = std::make_shared<FakeTraceWindow::PlotTime>(nullptr);
     const auto pStorage = std::make_shared<CountingStorage>(pJournal);
     const auto pUpdater = TQL::MakeShared<VTraceDataUpdater>(pService, pTexts, pControls, pTime, pStorage);

@@ -2,6 +2,7 @@
 #include "StoreIO/StoreDocuments.h"
 #include "StoreIO/VStoreVersionedIO.h"
 #include "StoreInterface/TypedValue.h"
+#include "TQL/TextStream.h"
 #include "support/LogGuard.h"
 
 #include <gtest/gtest.h>
@@ -69,7 +70,7 @@ protected:
     TQL::IResult Open(const std::string& i_rFile)
     {
         StoreIO::VStoreImporterJson importer;
-        TextInput input(i_rFile);
+        TQL::VTextInput input(i_rFile);
         EXPECT_EQ(importer.ReadStream(input), TQL::Result::Ok);
         return m_IO.Import(*TQL::ScopedWrite(*m_pStore), importer, 0);
     }
@@ -77,10 +78,10 @@ protected:
     std::string Save()
     {
         StoreIO::VStoreExporterJson exporter;
-        TextOutput output;
+        TQL::VTextOutput output;
         EXPECT_EQ(m_IO.Export(*TQL::ScopedRead(*m_pStore), exporter), TQL::Result::Ok);
         EXPECT_EQ(exporter.WriteToStream(output), TQL::Result::Ok);
-        return output.Text;
+        return output.Text();
     }
 
     std::string Logged()

@@ -163,6 +163,7 @@ TEST(TimeGrid, BoundedWhateverTheTimes)
     EXPECT_EQ(Find(Exactly(times)).substr(0, 32), "100 Hz, 0 by 1350000, 101 places");
     EXPECT_NE(Find(Exactly({-1e10, 0, 1e-9, 1e10}), 4096), "");
     EXPECT_NE(Find(Exactly({0, 1e-12, 2e-12})), "");
+    EXPECT_NE(Find(Exactly({0, 1.7e-318})), "");
 }
 
 TEST(TimeGrid, ResamplingOnRequest)

@@ -149,7 +149,7 @@ TEST(Checking, ACheckedChannelIsTheHostsChannelToThePlugin)
     Host host;
     std::shared_ptr<ChannelSystem::IChannelService> pService;
     host.Services.GetChannelService(pService);
-    const TQL::IChannelInstanceId id{"walk", "TableColumn", 0, 0, "sine"};
+    const TQL::IChannelInstanceId id{"walk", "ModelSetSamplesOutput", 0, 0, "sine"};
     const auto pChannel = pService->GetChannel(id);
     ASSERT_TRUE(pChannel);
     EXPECT_EQ(pService->GetChannel(id), pChannel) << "the same one while it is held";

@@ -66,7 +66,7 @@ TEST_F(HostServicesTest, GivesTheSameServicesEveryTime)
     EXPECT_EQ(Get(rCore, &IHostCoreServices::GetHostProfile)->GetProfileWord(), 5u);
     EXPECT_NE(Get(rCore, &IHostCoreServices::GetPreferencesStore), nullptr);
     EXPECT_EQ(Get(rCore, &IHostCoreServices::GetPreferencesStore), Get(rCore, &IHostCoreServices::GetPreferencesStore));
-    EXPECT_EQ(Get(rCore, &IHostCoreServices::GetFifthFactoryService), nullptr);
+    EXPECT_NE(Get(rCore, &IHostCoreServices::GetFifthFactoryService), nullptr);
 
     std::shared_ptr<ITimeController> pController;
     Get(rCore, &IHostCoreServices::GetTimeControllerRegistry)->GetTimeController("default", pController);

@@ -2,6 +2,7 @@
 #include "ChannelSystem/IChannelTypeRegistry.h"
 #include "ChannelSystemSelection/VChannelSelectionManager.h"
 #include "FakeChannels.h"
+#include "OrvanePluginInterface/IChannelMigrationService.h"
 #include "OrvanePluginInterface/ITimeController.h"
 #include "Services/HostOperations.h"
 #include "Services/VContentRegistry.h"
@@ -165,6 +166,9 @@ protected:
             [=]() mutable { (void)pTypes->CreateGlobalChannels("", "", made); });
         Add("IChannelTypeRegistry::CanComputeMagnitude", [=] { pTypes->CanComputeMagnitude("", ""); });
         Add("IChannelTypeRegistry::TypeListChanged", [=] { pTypes->TypeListChanged(); });
+        const auto pMigration = Get<IHostCoreServices>(m_Services, &IHostCoreServices::GetFifthFactoryService);
+        Add("IChannelMigrationService::Migrate",
+            [=]() mutable { (void)pMigration->Migrate(nullptr, "Live", made, made); });
     }
 
     void AddSelection()

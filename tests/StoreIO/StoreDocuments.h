@@ -5,8 +5,8 @@
 #include "StoreIO/VStoreExporterJson.h"
 #include "StoreIO/VStoreImporterJson.h"
 #include "StoreInterface/ScopedAccess.h"
-#include "TQL/TextStream.h"
 #include "TQL/ISchema.h"
+#include "TQL/TextStream.h"
 
 #include <algorithm>
 #include <cstring>

@@ -59,11 +59,11 @@ protected:
 
 TEST_F(LiveData, SavedAsC3dReadBackEqualWithGaps)
 {
-    const auto marker = Add({"LabelPosition", 0, 0, "", "W:LFHD", "mm", {}});
+    const auto marker = Add({"Labelled Reconstructions", 0, 0, "", "W:LFHD", "mm", {}});
     const auto pose = Add({"SubjectSegmentPose", 0, 0, "", "W:Head", "mm", {}});
-    const auto odd = Add({"LabelPosition", 0, 1, "", "W:RFHD", "m", {}});
-    const auto force = Add({"AnalogDeviceOutput", 0, 0, "", "Fz", "N", {""}}, Period / 2);
-    const auto column = Add({"TableColumn", 0, 0, "emg", "emg", "mV", {"1", "2"}});
+    const auto odd = Add({"Labelled Reconstructions", 0, 1, "", "W:RFHD", "m", {}});
+    const auto force = Add({"DeviceOutput", 0, 0, "", "Fz", "N", {""}}, Period / 2);
+    const auto column = Add({"ModelSetSamplesOutput", 0, 0, "emg", "emg", "mV", {"1", "2"}});
     const std::vector<float> positions{1, 2, 3, Gap, Gap, Gap, 7, 8, 9};
     const std::vector<float> poses(18, 1.0f);
     const std::vector<float> forces{1, 2, 3, Gap, 5, 6};
@@ -71,7 +71,7 @@ TEST_F(LiveData, SavedAsC3dReadBackEqualWithGaps)
     const ChannelRows rows[] = {
         {marker, positions, 0}, {pose, poses, 0}, {odd, positions, 0}, {force, forces, 0}, {column, columns, 0}};
     ASSERT_TRUE(m_pContext->AppendFrames(0, 3, rows).IsSuccess());
-    const auto late = Add({"TableColumn", 1, 0, "late", "late", "", {""}});
+    const auto late = Add({"ModelSetSamplesOutput", 1, 0, "late", "late", "", {""}});
     const std::vector<float> one{77};
     const ChannelRows last[] = {{late, one, 0}};
     ASSERT_TRUE(m_pContext->AppendFrames(4, 1, last).IsSuccess());
@@ -114,7 +114,7 @@ TEST_F(LiveData, WhatCannotBeSavedLeavesTheOldFile)
     ASSERT_TRUE(m_pContext->AppendFrames(0, 1, rows).IsSuccess());
     EXPECT_TRUE(Streaming::SaveAsC3d(*m_pContext, path, remarks, error).IsError()) << "nothing is left of it";
     EXPECT_EQ(contents(), "old");
-    const auto column = Add({"TableColumn", 0, 0, "a", "a", "", {""}});
+    const auto column = Add({"ModelSetSamplesOutput", 0, 0, "a", "a", "", {""}});
     const std::vector<float> one{1};
     const ChannelRows more[] = {{column, one, 0}};
     ASSERT_TRUE(m_pContext->AppendFrames(1, 1, more).IsSuccess());
@@ -132,7 +132,8 @@ TEST_F(LiveData, CopiesAreWholeWhileFramesComeAndGo)
     const auto pContext = std::make_shared<VLiveContext>("Live", std::make_shared<Channels::VSubTypeTable>(), options);
     std::uint32_t channels[4] = {};
     for (std::uint32_t i = 0; i < 4; ++i)
-        ASSERT_TRUE(pContext->AddChannel({"TableColumn", i, 0, "c", "c", "", {""}}, 0, channels[i]).IsSuccess());
+        ASSERT_TRUE(
+            pContext->AddChannel({"ModelSetSamplesOutput", i, 0, "c", "c", "", {""}}, 0, channels[i]).IsSuccess());
     std::atomic<bool> bStop{false};
     std::thread producer(
         [&]

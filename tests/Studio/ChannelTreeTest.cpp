@@ -131,10 +131,10 @@ TEST(ChannelTree, ASelectionFromOutsideIsTakenOverWithoutAnEcho)
 TEST(ChannelLeaves, NamesMakeTheBranchesAndPatternsFindThem)
 {
     const std::vector<Studio::SelectableChannel> channels{
-        {"Walker1:LFHD", "LabelPosition", Marker(0, 0)},
+        {"Walker1:LFHD", "Labelled Reconstructions", Marker(0, 0)},
         {"Walker1:Pelvis", "SubjectSegmentPose", {ESelectionKind::Segment, 0, 0, ""}},
-        {"RSHO", "LabelPosition", Marker(1, 0)},
-        {"Fz1", "AnalogDeviceOutput", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}}};
+        {"RSHO", "Labelled Reconstructions", Marker(1, 0)},
+        {"Fz1", "DeviceOutput", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}}};
     std::string text;
     for (const ChannelTreeLeaf& rLeaf : Studio::MakeLeaves(channels))
         text += rLeaf.Branches.join("/").toStdString() + "=" + rLeaf.Text.toStdString() + "; ";

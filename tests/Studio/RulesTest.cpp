@@ -98,7 +98,7 @@ TEST(SimulatedFeed, TheLiveContextHoldsWhatTheSimulatorGives)
     ASSERT_TRUE(feed.Produce(250, 3).IsSuccess());
     EXPECT_TRUE(feed.Produce(100, 1).IsError()) << "frames that are there already";
     EXPECT_EQ(pContext->GetTickRange(), (TQL::TickRange{0, 253 * TQL::DefaultFramePeriod}));
-    EXPECT_EQ(pContext->GetChannels()->size(), 2u * (53 + 20) + 16);
+    EXPECT_EQ(pContext->GetChannels()->size(), 2u * (53 + 20) + 16 + 1);
 
     // The recording of the same frames has the same samples under the same names.
     const Simulation::VWalkSimulator simulator({2, 4});
@@ -126,6 +126,16 @@ TEST(SimulatedFeed, TheLiveContextHoldsWhatTheSimulatorGives)
         ++compared;
     }
     EXPECT_EQ(compared, recording.Channels.size());
+
+    std::vector<float> seen(253, 0.0f);
+    for (const auto& rChannel : recording.Channels)
+        for (std::size_t row = 0; row < 253 && rChannel.Kind == Recordings::EChannelKind::Marker; ++row)
+            seen[row] += std::isnan(rChannel.Samples[3 * row]) ? 0.0f : 1.0f;
+    std::vector<float> counted(253);
+    const auto pCount = pContext->FindChannel({"Live", "SampleCount", 0, 0, ""});
+    ASSERT_NE(pCount, nullptr);
+    ASSERT_TRUE(pCount->GetOutput()->GetBlock()->ReadSamples(pContext->GetTickRange(), counted).IsSuccess());
+    EXPECT_EQ(counted, seen);
 }
 
 TEST(TimeText, TicksBecomeAClock)

@@ -91,7 +91,7 @@ TEST(Tick, NearlyEqualIsRelativeUnlessOneIsZero)
 
 TEST(TraceId, EqualityOrderAndHashAgree)
 {
-    const TQL::IChannelInstanceId live{"Live", "LabelPosition", 1, 2, "t"};
+    const TQL::IChannelInstanceId live{"Live", "Labelled Reconstructions", 1, 2, "t"};
     TQL::IChannelInstanceId recorded = live;
     recorded.DataContextName = "walk";
     EXPECT_TRUE(live == recorded) << "the same thing in another context";

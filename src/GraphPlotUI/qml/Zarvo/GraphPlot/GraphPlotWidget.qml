@@ -1,21 +1,36 @@
 import QtQuick
 import Zarvo.GraphPlot 1.0
 
-// The scene of one graph window: all drawing goes through one framebuffer item, redrawn by its own clock.
+// The scene of one graph window: the channel bar above, the key at the right, and between them one framebuffer item in
+// which all drawing is done, redrawn by its own clock.
 Item {
     id: root
 
     property alias valueRangeOverride: column.valueRangeOverride
 
+    Rectangle {
+        anchors.fill: parent
+        color: "#202020"
+    }
+
+    ChannelBar {
+        id: bar
+        width: parent.width
+        manager: contextActiveChannelManager
+        subplotManager: contextSubplotManager
+        channelModel: contextActiveChannelModel
+        keyModel: contextKeyModel
+    }
+
     GraphPlotFBO {
         id: graphPlotFbo
-        anchors.fill: parent
+        anchors { top: bar.bottom; bottom: parent.bottom; left: parent.left; right: keyList.left }
         graphPlotContext: contextGraphPlot
 
         SubplotColumn {
             id: column
             anchors.fill: parent
-            subplotModel: contextSubplotManager
+            subplotModel: contextSubplotManager.subplotModel
             traceManager: contextTraceManager
         }
 
@@ -25,11 +40,17 @@ Item {
             horizontalAlignment: Text.AlignHCenter
             wrapMode: Text.WordWrap
             visible: column.count === 0
-            text: contextActiveChannelModel.count === 0 ? qsTr("No active channels - tick a channel to plot.")
-                                                        : qsTr("No channel data available")
+            text: contextActiveChannelModel.haveActiveChannels ? qsTr("No channel data available") : bar.helpText
             color: "#d0d0d0"
             font.pixelSize: 14
         }
+    }
+
+    KeyList {
+        id: keyList
+        anchors { top: bar.bottom; bottom: parent.bottom; right: parent.right }
+        width: contextKeyModel.showKey && count > 0 ? Math.min(220, root.width / 3) : 0
+        keyModel: contextKeyModel
     }
 
     Binding {

@@ -2,7 +2,7 @@ import QtQuick
 import QtQuick.Window
 import Zarvo.GraphPlot 1.0
 
-// One subplot with its value axis and the names of its traces. screenOrigin is where it stands in the framebuffer item.
+// One subplot with its value axis. screenOrigin is where it stands in the framebuffer item.
 Item {
     id: root
 
@@ -13,8 +13,8 @@ Item {
     property var traceIds
     property string label
     property string units
+    property string toolTip
     property point valueRange
-    property var legend: []
 
     ValueAxis {
         width: root.axisWidth
@@ -23,6 +23,7 @@ Item {
         valueRange: root.valueRange
         label: root.label
         units: root.units
+        toolTip: root.toolTip
     }
 
     Item {
@@ -49,29 +50,6 @@ Item {
         TimeRangeMouseArea {
             anchors.fill: parent
             traceManager: root.traceManager
-        }
-
-        Column {
-            anchors { top: parent.top; right: parent.right; margins: 6 }
-            Repeater {
-                model: root.legend.slice(0, 6)
-                delegate: Text {
-                    required property var modelData
-                    anchors.right: parent.right
-                    text: modelData.name
-                    color: modelData.colour
-                    font.pixelSize: 11
-                    style: Text.Outline
-                    styleColor: "black"
-                }
-            }
-            Text {
-                anchors.right: parent.right
-                visible: root.legend.length > 6
-                text: qsTr("and %1 more").arg(root.legend.length - 6)
-                color: "#a0a0a0"
-                font.pixelSize: 11
-            }
         }
     }
 }

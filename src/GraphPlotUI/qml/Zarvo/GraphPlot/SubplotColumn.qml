@@ -23,11 +23,11 @@ Item {
 
         delegate: Subplot {
             required property int index
-            required property var subplotTraceIds
-            required property string subplotLabel
-            required property string subplotUnits
+            required property var subplotTraces
+            required property string subplotYAxisLabel
+            required property string subplotYAxisUnits
+            required property string subplotYAxisToolTip
             required property var subplotYAxisRange
-            required property var subplotLegend
 
             y: index * (root._subplotHeight + root.spacing) + root.spacing
             width: root.axisWidth + root.subplotWidth
@@ -35,11 +35,11 @@ Item {
             axisWidth: root.axisWidth
             screenOrigin: Qt.point(0, y)
             traceManager: root.traceManager
-            traceIds: subplotTraceIds
-            label: subplotLabel
-            units: subplotUnits
+            traceIds: subplotTraces
+            label: subplotYAxisLabel
+            units: subplotYAxisUnits
+            toolTip: subplotYAxisToolTip
             valueRange: root._overridden ? root.valueRangeOverride : subplotYAxisRange
-            legend: subplotLegend
         }
     }
 

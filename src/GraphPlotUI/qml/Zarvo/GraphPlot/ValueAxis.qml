@@ -1,4 +1,5 @@
 import QtQuick
+import QtQuick.Controls.Basic
 import QtQuick.Window
 import Zarvo.GraphPlot 1.0
 
@@ -9,7 +10,8 @@ Item {
     property rect screenRect
     property point valueRange
     property string label
-    property string units
+    property string units // rich text in brackets, or empty
+    property string toolTip
 
     ValueAxisRenderType {
         id: axis
@@ -35,8 +37,14 @@ Item {
         transformOrigin: Item.TopLeft
         width: Math.min(implicitWidth, root.height)
         elide: Text.ElideRight
-        text: root.units === "" ? root.label : `${root.label} (${root.units})`
+        textFormat: Text.StyledText
+        text: root.units === "" ? root.label : `${root.label} ${root.units}`
         color: "#d0d0d0"
         font.pixelSize: 12
     }
+
+    HoverHandler { id: hover }
+    ToolTip.visible: hover.hovered && toolTip !== ""
+    ToolTip.delay: 600
+    ToolTip.text: toolTip
 }
