@@ -1,11 +1,21 @@
 #include "Bench.h"
+#include "ChannelSystem/IChannel.h"
+#include "ChannelSystem/IChannelBlock.h"
 #include "ChannelSystemSelection/VChannelSelectionManager.h"
 #include "Channels/ChannelTypes.h"
 #include "Channels/VChannelService.h"
 #include "Channels/VRecordedContext.h"
+#include "GraphPlotSystem/SharedObject.h"
 #include "GraphPlotSystem/VActiveChannelBuilder.h"
 #include "GraphPlotSystem/VActiveChannelModel.h"
 #include "GraphPlotSystem/VBaseChannelTextProvider.h"
+#include "GraphPlotSystem/VChannelComponentControls.h"
+#include "GraphPlotSystem/VKeyModel.h"
+#include "GraphPlotSystem/VSubplotManager.h"
+#include "GraphPlotSystem/VSubplotModel.h"
+#include "GraphPlotSystem/VTraceDataProvider.h"
+#include "GraphPlotSystem/VTraceManager.h"
+#include "GraphPlotSystem/VTraceModel.h"
 #include "NotificationSystem/VDispatchCollapsers.h"
 #include "NotificationSystem/VSubscriptions.h"
 #include "Services/VSelectionSource.h"
@@ -66,79 +76,178 @@ std::shared_ptr<Recordings::VRecording> MakeMarkers()
     return pRecording;
 }
 
-/// A recording in the host and a plot that follows what is selected of it.
+/// Has none.
+class WithoutPreferences : public GraphPlotUI::IGraphPlotPreferences
+{
+public:
+    TQL::IResult GetValue(int, Value&) const override { return TQL::Result::NotAvailable; }
+    TQL::IResult SetValue(int, const Value&) override { return TQL::Result::NotAvailable; }
+    TQL::IResult AddCallback(Token&, int, std::function<void()>, std::shared_ptr<TQL::IPostalService>) override
+    {
+        return TQL::Result::NotAvailable;
+    }
+    TQL::IResult RemoveCallback(int, Token) override { return TQL::Result::NotAvailable; }
+};
+
+/// A recording in the host, and what is selected of it.
+struct Host
+{
+    Host()
+    {
+        const auto pContext =
+            std::make_shared<Channels::VRecordedContext>("Take", pService->GetSubTypes(), MakeMarkers());
+        pService->AddContext(pContext);
+        for (const Channels::ChannelType& rType : Channels::GetChannelTypeTable())
+            pManager->RegisterChannelType(rType.Name, rType.Kind, static_cast<std::uint32_t>(rType.Flags));
+        pService->SetSelectionManager(pManager);
+        for (const auto& rpChannel : *pContext->GetChannels())
+            Items.push_back(*Channels::SelectionOfChannel(rpChannel->GetInstanceId()));
+    }
+
+    void Select(std::size_t i_Count)
+    {
+        pSource->Set({Items.begin(), Items.begin() + static_cast<std::ptrdiff_t>(i_Count)});
+    }
+
+    const std::shared_ptr<Channels::VChannelService> pService = std::make_shared<Channels::VChannelService>();
+    const std::shared_ptr<Services::VSelectionSource> pSource = std::make_shared<Services::VSelectionSource>();
+    const std::shared_ptr<ChannelSystemSelection::VChannelSelectionManager> pManager =
+        TQL::MakeShared<ChannelSystemSelection::VChannelSelectionManager>(pSource);
+    std::vector<TQL::SelectionItem> Items;
+};
+
+/// A plot that follows the selection down to subplots and key.
 class SelectedPlot
 {
 public:
-    SelectedPlot()
+    explicit SelectedPlot(Host& i_rHost) : m_rHost(i_rHost)
     {
-        const auto pContext =
-            std::make_shared<Channels::VRecordedContext>("Take", m_pService->GetSubTypes(), MakeMarkers());
-        m_pService->AddContext(pContext);
-        for (const Channels::ChannelType& rType : Channels::GetChannelTypeTable())
-            m_pManager->RegisterChannelType(rType.Name, rType.Kind, static_cast<std::uint32_t>(rType.Flags));
-        m_pService->SetSelectionManager(m_pManager);
-        for (const auto& rpChannel : *pContext->GetChannels())
-            m_Items.push_back(*Channels::SelectionOfChannel(rpChannel->GetInstanceId()));
         m_pBuilder->SetContextName("Take");
         m_pBuilder->SetSelectedChannelType(std::string(Channels::LabelledReconstructionType));
         m_Subscriptions.Subscribe<void(bool)>(
-            m_pManager->SelectionChanged(), [this](bool i_bForce) { m_pBuilder->Refresh(i_bForce); },
+            i_rHost.pManager->SelectionChanged(), [this](bool i_bForce) { m_pBuilder->Refresh(i_bForce); },
             NotificationSystem::MakeCollapserDontPost(m_pQueue));
-    }
-
-    /// Selects the first so many markers, until the last notice has been worked off.
-    void Select(std::size_t i_Count)
-    {
-        m_pSource->Set({m_Items.begin(), m_Items.begin() + static_cast<std::ptrdiff_t>(i_Count)});
         m_pQueue->RunAll();
-        if (m_Model.rowCount() != static_cast<int>(i_Count))
-            throw std::runtime_error("selection bench: not every selected marker has become a row");
+        m_pQueue->Longest = 0.0;
     }
 
-    /// Seconds from the host's selection of so many markers to the rows, after none was selected.
-    double MeasureSelect(std::size_t i_Count)
+    /// Seconds until the last notice of the selection has been worked off.
+    double MeasureRows(std::size_t i_Count)
     {
-        Select(0);
-        m_pQueue->Longest = 0.0;
-        return BestSeconds(1, [&] { Select(i_Count); });
+        const double seconds = BestSeconds(1,
+                                           [&]
+                                           {
+                                               m_rHost.Select(i_Count);
+                                               m_pQueue->RunAll();
+                                           });
+        Require(m_Model.rowCount() == static_cast<int>(i_Count), "not every selected marker has become a row");
+        return seconds;
+    }
+
+    /// Seconds that the update loop's first tick takes.
+    double MeasureTraces()
+    {
+        return BestSeconds(1,
+                           [&]
+                           {
+                               for (const auto& rpChannel : m_Model.GetChannels())
+                               {
+                                   const auto pBlock = rpChannel->GetOutput()->GetBlock();
+                                   TQL::TickRange range;
+                                   pBlock->GetRange(range);
+                                   m_pStorage->UpdateTrace(rpChannel->GetInstanceId(), *pBlock, range, range, 0);
+                               }
+                           });
+    }
+
+    /// Seconds in which the user interface takes the new traces.
+    double MeasureSubplots(std::size_t i_Count)
+    {
+        const double seconds = BestSeconds(1, [&] { m_pQueue->RunAll(); });
+        const GraphPlotUI::VSubplotModel& rSubplots = *m_pManager->GetSubplotModel();
+        Require(rSubplots.rowCount() == 3, "the three components have not three subplots");
+        const auto* const pTraces = static_cast<GraphPlotUI::VTraceModel*>(
+            rSubplots.index(0).data(TQL::SubplotModelRoles::SubplotTraceModel).value<QObject*>());
+        Require(pTraces->rowCount() == static_cast<int>(i_Count), "not every selected marker has a trace");
+        Require(m_Key.rowCount() == 3 * static_cast<int>(i_Count), "not every trace is in the key");
+        return seconds;
     }
 
     double LongestJob() const { return m_pQueue->Longest; }
 
 private:
-    std::shared_ptr<TimedQueue> m_pQueue = std::make_shared<TimedQueue>();
-    std::shared_ptr<Channels::VChannelService> m_pService = std::make_shared<Channels::VChannelService>();
-    std::shared_ptr<Services::VSelectionSource> m_pSource = std::make_shared<Services::VSelectionSource>();
-    std::shared_ptr<ChannelSystemSelection::VChannelSelectionManager> m_pManager =
-        TQL::MakeShared<ChannelSystemSelection::VChannelSelectionManager>(m_pSource);
-    std::shared_ptr<GraphPlotUI::VBaseChannelTextProvider> m_pTexts =
-        std::make_shared<GraphPlotUI::VBaseChannelTextProvider>(m_pService, nullptr);
+    static void Require(bool i_bHolds, const char* i_pWhatElse)
+    {
+        if (!i_bHolds)
+            throw std::runtime_error(std::string("selection bench: ") + i_pWhatElse);
+    }
+
+    Host& m_rHost;
+    const std::shared_ptr<TimedQueue> m_pQueue = std::make_shared<TimedQueue>();
+    const std::shared_ptr<GraphPlotUI::VBaseChannelTextProvider> m_pTexts =
+        std::make_shared<GraphPlotUI::VBaseChannelTextProvider>(m_rHost.pService, m_pQueue);
+    const std::shared_ptr<GraphPlotUI::VChannelComponentControls> m_pControls =
+        std::make_shared<GraphPlotUI::VChannelComponentControls>(m_pTexts, m_pQueue);
+    const std::shared_ptr<GraphPlotUI::VTraceDataProvider> m_pStorage =
+        std::make_shared<GraphPlotUI::VTraceDataProvider>(m_pQueue);
     GraphPlotUI::VActiveChannelModel m_Model{m_pQueue, m_pTexts, nullptr, nullptr};
-    std::shared_ptr<GraphPlotUI::VActiveChannelBuilder> m_pBuilder =
-        TQL::MakeShared<GraphPlotUI::VActiveChannelBuilder>(m_pQueue, m_pService, nullptr, &m_Model);
+    GraphPlotUI::VKeyModel m_Key{m_pQueue, m_pTexts, m_pControls, m_pStorage, &m_Model, nullptr};
+    const std::shared_ptr<GraphPlotUI::VSubplotManager> m_pManager =
+        GraphPlotUI::MakeSharedObject<GraphPlotUI::VSubplotManager>(m_pQueue, &m_Model, m_pTexts, m_pControls, nullptr,
+                                                                    m_pStorage, std::make_shared<WithoutPreferences>(),
+                                                                    false);
+    const std::shared_ptr<GraphPlotUI::VActiveChannelBuilder> m_pBuilder =
+        TQL::MakeShared<GraphPlotUI::VActiveChannelBuilder>(m_pQueue, m_rHost.pService, nullptr, &m_Model);
     NotificationSystem::VSubscriptions m_Subscriptions;
-    std::vector<TQL::SelectionItem> m_Items;
 };
+
+/// Seconds of the parts of one selection, the shortest of several.
+struct SelectionTimes
+{
+    void Measure(Host& i_rHost, std::size_t i_Count)
+    {
+        i_rHost.Select(0);
+        SelectedPlot plot(i_rHost);
+        const double rows = plot.MeasureRows(i_Count);
+        const double traces = plot.MeasureTraces();
+        const double subplots = plot.MeasureSubplots(i_Count);
+        Rows = std::min(Rows, rows);
+        All = std::min(All, rows + traces + subplots);
+        LongestJob = std::max(LongestJob, plot.LongestJob());
+    }
+
+    double Rows = 1e300;     ///< from the selection to rows of channels
+    double All = 1e300;      ///< and on to traces, subplots and key
+    double LongestJob = 0.0; ///< in the user interface, of all repeats
+};
+
+double EachIn(double i_Seconds, std::size_t i_Count)
+{
+    return i_Seconds * 1e6 / static_cast<double>(i_Count);
+}
 
 } // namespace
 
 void RunSelection(Table& o_rTable)
 {
-    SelectedPlot plot;
-    double few = 1e300;
-    double many = 1e300;
-    double longest = 0.0;
+    Host host;
+    SelectionTimes few;
+    SelectionTimes many;
     for (int i = 0; i < s_Repeats; ++i)
     {
-        few = std::min(few, plot.MeasureSelect(s_Few));
-        many = std::min(many, plot.MeasureSelect(s_Many));
-        longest = std::max(longest, plot.LongestJob());
+        few.Measure(host, s_Few);
+        many.Measure(host, s_Many);
     }
-    const double costOfFew = few * 1e6 / static_cast<double>(s_Few);
-    const double costOfMany = many * 1e6 / static_cast<double>(s_Many);
-    o_rTable.push_back({"500 markers from the host's selection to active channel rows, each", costOfMany, "us",
-                        "each of 100 markers", costOfFew, costOfMany / costOfFew, EGoal::AtMost, 1.5});
+    const auto compare = [&](const char* i_pName, double SelectionTimes::*i_pPart)
+    {
+        const double costOfMany = EachIn(many.*i_pPart, s_Many);
+        const double costOfFew = EachIn(few.*i_pPart, s_Few);
+        o_rTable.push_back(
+            {i_pName, costOfMany, "us", "each of 100 markers", costOfFew, costOfMany / costOfFew, EGoal::AtMost, 1.5});
+    };
+    compare("500 markers from the host's selection to active channel rows, each", &SelectionTimes::Rows);
+    compare("and on to traces, subplot rows and key rows, each", &SelectionTimes::All);
+    const double longest = many.LongestJob;
     o_rTable.push_back({"longest job in the user interface while 500 markers are selected", longest * 1e3, "ms",
                         "a stall that an operator notices", 100.0, longest * 1e3 / 100.0, EGoal::AtMost, 1.0});
 }

@@ -15,7 +15,7 @@ using Recordings::EChannelKind;
 using TQL::ESelectionKind;
 
 // One type for each kind of thing that is selected: with two, what is selected would not tell which of them to plot.
-constexpr std::array<ChannelType, 6> Types{{
+constexpr std::array<ChannelType, 7> Types{{
     {LabelledReconstructionType, EChannelKind::Marker, ESelectionKind::Label, "Position", "Labels", "Position",
      "TX,TY,TZ", EUnitUse::AllComponents, true, 0},
     {SegmentPoseType, EChannelKind::SegmentPose, ESelectionKind::Segment, "Pose", "Segments", "Pose",
@@ -26,6 +26,8 @@ constexpr std::array<ChannelType, 6> Types{{
      EUnitUse::AllComponents, false, 0},
     {CameraPoseType, std::nullopt, ESelectionKind::Camera, "Camera Pose", "Cameras", "Pose", "RX,RY,RZ,TX,TY,TZ",
      EUnitUse::PositionOfPose, false, 0},
+    {MonitorType, std::nullopt, ESelectionKind::Monitor, "Monitor", "Monitors", "", "", EUnitUse::AllComponents, false,
+     0},
     {SampleCountType, std::nullopt, ESelectionKind::Global, "Sample Count", "Capture", "", "", EUnitUse::AllComponents,
      false, 0},
 }};
@@ -113,7 +115,8 @@ std::optional<TQL::IChannelInstanceId> ChannelOfSelection(const TQL::SelectionIt
     const ChannelType* pType = FindChannelType(i_Type);
     if (!pType || pType->Kind != i_rItem.Kind || pType->Kind == ESelectionKind::Global)
         return std::nullopt;
-    return TQL::IChannelInstanceId{std::string(i_Context), std::string(i_Type), i_rItem.First, i_rItem.Second,
+    const std::string_view context = pType->Kind == ESelectionKind::Monitor ? GlobalContextName : i_Context;
+    return TQL::IChannelInstanceId{std::string(context), std::string(i_Type), i_rItem.First, i_rItem.Second,
                                    i_rItem.Text};
 }
 

@@ -24,6 +24,11 @@ inline constexpr std::string_view DeviceOutputType = "DeviceOutput";
 inline constexpr std::string_view CameraPoseType = "CalibratedCameraPose";
 inline constexpr std::string_view SampleCountType = "SampleCount";
 inline constexpr std::string_view ModelOutputType = "ModelSetSamplesOutput"; ///< joint angles and columns of tables
+inline constexpr std::string_view MonitorType = "Monitor";                   ///< from 0 to 1, and so plotted
+
+/// The context that the ids of global channels bear: what belongs to no single capture or recording. It is none that
+/// can be shown.
+inline constexpr std::string_view GlobalContextName = "GlobalItems";
 
 /// How the unit of a channel falls on its components.
 enum class EUnitUse
@@ -33,8 +38,8 @@ enum class EUnitUse
 };
 
 /// One type of source channels. First and Second of an id: subject and marker, subject and segment, device and output,
-/// the camera and 0; for the types without a number of two parts the index, and the name in Text. A context has at most
-/// one channel of a global type.
+/// the camera and 0, the monitor and 0; for the types without a number of two parts the index, and the name in Text. A
+/// context has at most one channel of a global type.
 struct ChannelType
 {
     std::string_view Name;
@@ -76,7 +81,8 @@ TQL::ComponentDescription DescribeComponents(const ChannelDefinition& i_rDefinit
 /// What the operator selects to see a channel; nothing for an id of a type that is not in the table or global.
 std::optional<TQL::SelectionItem> SelectionOfChannel(const TQL::IChannelInstanceId& i_rId);
 
-/// The channel of a type that belongs to a selected thing; nothing when the type is not about things of that kind.
+/// The channel of a type that belongs to a selected thing; nothing when the type is not about things of that kind. That
+/// of a monitor is global, whatever the context.
 std::optional<TQL::IChannelInstanceId> ChannelOfSelection(const TQL::SelectionItem& i_rItem, std::string_view i_Context,
                                                           std::string_view i_Type);
 

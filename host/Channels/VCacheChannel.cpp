@@ -76,18 +76,23 @@ std::shared_ptr<VChannelOutput> VCacheChannel::MakeOutputLocked() const
     if (m_bUnwrap)
         rotation = FindRotation(pInput->GetDescription());
     const auto pInputSamples = std::dynamic_pointer_cast<VSampleBlock>(pInputBlock);
+    const bool bAll = pInputSamples && pInputSamples->ShowsAll();
     // What is computed from samples that grow is kept for the window only, never for all the time that they have.
-    const bool bShared =
-        !rotation && pInputSamples && pInputSamples->ShowsAll() && !(m_pWindow && pInputSamples->GetFeed());
-    const std::shared_ptr<VCacheFeed> pFeed =
-        bShared ? pInputSamples->GetFeed() : std::make_shared<VCacheFeed>(SourceOf(pInputBlock), rotation, m_pWindow);
+    const bool bShared = !rotation && bAll && !(m_pWindow && pInputSamples->GetFeed());
+    const auto makeFeed = [&]
+    {
+        return rotation && bAll && !m_pWindow
+                   ? pInputSamples->GetContinuous(*rotation)
+                   : std::make_shared<VCacheFeed>(SourceOf(pInputBlock), rotation, m_pWindow);
+    };
+    const std::shared_ptr<VCacheFeed> pFeed = bShared ? pInputSamples->GetFeed() : makeFeed();
     const std::shared_ptr<VSampleStore>& rpSamples = bShared ? pInputSamples->GetSamples() : pFeed->GetSamples();
     if (m_bLevels)
         rpSamples->EnableSummaries();
     if (pFeed)
-        pFeed->CatchUp(); // before the output notes what contents it stands for
+        pFeed->CatchUpByStep(); // before the output notes what contents it stands for
     const std::uint32_t levels = m_bLevels ? VSummaryPyramid::LevelCount : 1;
-    const auto pBlock = std::make_shared<VSampleBlock>(rpSamples, levels, m_pWindow, pFeed);
+    const auto pBlock = std::make_shared<VSampleBlock>(rpSamples, levels, m_pWindow, pFeed, EFollow::ByStep);
     const auto pSelf = std::const_pointer_cast<VCacheChannel>(shared_from_this());
     return std::make_shared<VChannelOutput>(pSelf, pBlock, pInput->GetDescription(),
                                             std::vector<std::shared_ptr<TQL::IChannelOutput>>{pInput}, rpSamples);

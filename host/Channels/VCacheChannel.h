@@ -15,7 +15,8 @@ struct BlockWindow;
 /// The channel that keeps what a reader wants of its input: with summary levels ("SupportLodding"), with rotations made
 /// continuous ("EnableRotationUnwrapping"), at least the newest "CacheRangeTicks" ticks (0, or an input that does not
 /// grow: everything). Where nothing has to be altered it reads the store of its input; else it has one of its own,
-/// which follows the input whenever it is asked for its range. Each reader makes one of its own. Any thread.
+/// which follows the input by steps, one whenever it is asked for its range, so that no reader waits for a long series.
+/// Each reader makes one of its own. Any thread.
 class VCacheChannel : public TQL::IChannel, public std::enable_shared_from_this<VCacheChannel>
 {
 public:

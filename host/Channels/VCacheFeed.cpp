@@ -3,6 +3,7 @@
 #include "Channels/VSampleBlock.h"
 
 #include <algorithm>
+#include <limits>
 #include <utility>
 
 namespace Channels
@@ -34,6 +35,16 @@ VCacheFeed::VCacheFeed(std::shared_ptr<const ISampleSource> i_pInput, std::optio
 
 void VCacheFeed::CatchUp()
 {
+    CatchUp(std::numeric_limits<std::int64_t>::max());
+}
+
+void VCacheFeed::CatchUpByStep()
+{
+    CatchUp(2 * SliceRows * m_Period);
+}
+
+void VCacheFeed::CatchUp(std::int64_t i_MostTicks)
+{
     const std::lock_guard lock(m_Mutex);
     const TQL::TickRange input = m_pInput->GetRange();
     if (input.IsEmpty())
@@ -49,9 +60,9 @@ void VCacheFeed::CatchUp()
         held = m_pSamples->GetRange();
     }
     if (held.Last < input.Last)
-        AppendLocked({held.Last, input.Last});
+        AppendLocked({held.Last, held.Last + std::min(i_MostTicks, input.Last - held.Last)});
     if (wanted < held.First)
-        PrependLocked({wanted, held.First});
+        PrependLocked({held.First - std::min(i_MostTicks, held.First - wanted), held.First});
     constexpr std::int64_t slack = VSampleRows::Chunks::ChunkRows;
     if (wanted - held.First > slack * m_Period)
         m_pSamples->TrimBefore(wanted);
@@ -113,15 +124,22 @@ void VCacheFeed::PrependLocked(const TQL::TickRange& i_rRange)
     }
 }
 
-/// Goes on from the oldest rotation that is held.
-VRotationUnwrapper VCacheFeed::BackwardsUnwrapperLocked() const
+/// Goes on from the oldest rotation that is held; where none is, from the one that the next to come will follow.
+VRotationUnwrapper VCacheFeed::BackwardsUnwrapperLocked()
 {
-    VRotationUnwrapper backwards(*m_Rotation);
+    VRotationUnwrapper backwards(*m_Unwrapper);
     const TQL::TickRange held = m_pSamples->GetRange();
-    std::vector<float> row(m_Components);
-    for (std::int64_t tick = held.First; tick < held.Last; tick += m_Period)
-        if (m_pSamples->ReadSamples({tick, tick + m_Period}, row).IsSuccess() && backwards.Follow(row))
-            break;
+    for (std::int64_t first = held.First; first < held.Last && backwards.HasPrevious();)
+    {
+        const std::int64_t last = std::min(first + SliceRows * m_Period, held.Last);
+        m_Scratch.resize(static_cast<std::size_t>((last - first) / m_Period) * m_Components);
+        if (m_pSamples->ReadSamples({first, last}, m_Scratch).IsError())
+            break; // cannot be: nobody else forgets what is held
+        for (std::size_t row = 0; row < m_Scratch.size(); row += m_Components)
+            if (backwards.Follow(std::span<const float>(m_Scratch).subspan(row, m_Components)))
+                return backwards;
+        first = last;
+    }
     return backwards;
 }
 

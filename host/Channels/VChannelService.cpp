@@ -91,6 +91,33 @@ TQL::IResult VChannelService::RemoveContext(std::string_view i_Name)
     return TQL::Result::Ok;
 }
 
+void VChannelService::SetGlobalChannels(std::shared_ptr<VChannelContext> i_pContext)
+{
+    std::shared_ptr<VChannelContext> pOld;
+    {
+        const std::unique_lock lock(m_Mutex);
+        pOld = std::exchange(m_pGlobal, i_pContext);
+    }
+    if (pOld == i_pContext)
+        return;
+    if (pOld)
+        pOld->Retire();
+    m_pContextListChanged->Invoke();
+    m_pTypeListChanged->Invoke();
+}
+
+std::shared_ptr<VChannelContext> VChannelService::GetGlobalChannels() const
+{
+    const std::shared_lock lock(m_Mutex);
+    return m_pGlobal;
+}
+
+/// Where the channels are that bear a context's name in their ids.
+std::shared_ptr<VChannelContext> VChannelService::HomeOf(std::string_view i_ContextName) const
+{
+    return i_ContextName == GlobalContextName ? GetGlobalChannels() : FindContext(i_ContextName);
+}
+
 std::vector<std::shared_ptr<VChannelContext>> VChannelService::GetContexts() const
 {
     const std::shared_lock lock(m_Mutex);
@@ -114,11 +141,14 @@ std::shared_ptr<ChannelSystem::IChannelContext> VChannelService::GetContextByNam
 
 std::vector<std::string> VChannelService::GetChannelTypes(std::uint64_t i_Mask, std::string_view i_Context) const
 {
+    std::vector<std::shared_ptr<VChannelContext>> contexts = GetContexts();
+    if (!i_Context.empty())
+        std::erase_if(contexts, [&](const auto& i_rpContext) { return i_rpContext->GetName() != i_Context; });
+    if (auto pGlobal = GetGlobalChannels())
+        contexts.push_back(std::move(pGlobal));
     std::set<std::string, std::less<>> present;
-    for (const std::shared_ptr<VChannelContext>& rpContext : GetContexts())
+    for (const std::shared_ptr<VChannelContext>& rpContext : contexts)
     {
-        if (!i_Context.empty() && rpContext->GetName() != i_Context)
-            continue;
         const std::shared_ptr<const VChannelContext::ChannelList> pChannels = rpContext->GetChannels();
         for (const std::shared_ptr<VSourceChannel>& rpChannel : *pChannels)
             present.insert(rpChannel->GetInstanceId().TypeName);
@@ -202,7 +232,7 @@ bool VChannelService::IsLive(const TQL::IChannel& i_rChannel) const
 {
     if (const auto* pDerived = dynamic_cast<const VDerivedChannel*>(&i_rChannel))
         return pDerived->IsLive();
-    const auto pContext = FindContext(i_rChannel.GetInstanceId().DataContextName);
+    const auto pContext = HomeOf(i_rChannel.GetInstanceId().DataContextName);
     return pContext && pContext->GetType() == ChannelSystem::EContextType::Live;
 }
 
@@ -220,12 +250,17 @@ void VChannelService::RememberLocked(const std::shared_ptr<TQL::IChannel>& i_rpC
 std::shared_ptr<TQL::IChannel> VChannelService::GetChannel(const TQL::IChannelInstanceId& i_rId) const
 {
     const std::shared_lock lock(m_Mutex);
+    if (m_pGlobal && (i_rId.DataContextName.empty() || i_rId.DataContextName == GlobalContextName))
+        if (auto pChannel = m_pGlobal->FindChannel(
+                {std::string(GlobalContextName), i_rId.TypeName, i_rId.First, i_rId.Second, i_rId.Text}))
+            return pChannel;
     if (const auto context = m_Contexts.find(i_rId.DataContextName); context != m_Contexts.end())
         if (auto pChannel = context->second->FindChannel(i_rId))
             return pChannel;
+    // The newest first: an older one of the same id may be what is left of data that were replaced.
     const auto [first, end] = m_Derived.equal_range(i_rId);
-    for (auto entry = first; entry != end; ++entry)
-        if (auto pChannel = entry->second.lock())
+    for (auto entry = end; entry != first;)
+        if (auto pChannel = (--entry)->second.lock())
             return pChannel;
     return nullptr;
 }

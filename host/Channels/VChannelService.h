@@ -37,6 +37,11 @@ public:
     std::vector<std::shared_ptr<VChannelContext>> GetContexts() const; ///< in the order of their names
     std::shared_ptr<VChannelContext> FindContext(std::string_view i_Name) const;
 
+    /// The global channels, whose context is called GlobalContextName: found by ids with that context or none, and
+    /// listed in every context. Replaces, and retires, those before; null for none.
+    void SetGlobalChannels(std::shared_ptr<VChannelContext> i_pContext);
+    std::shared_ptr<VChannelContext> GetGlobalChannels() const; ///< null when there are none
+
     void SetSelectionManager(std::shared_ptr<TQL::IChannelSelectionManager> i_pSelectionManager);
 
     /// Channels of another type came into a context that is listed already.
@@ -63,6 +68,7 @@ private:
     /// Operation, hash of the record, inputs.
     using DerivedKey = std::tuple<std::string, std::uint64_t, std::vector<const TQL::IChannel*>>;
 
+    std::shared_ptr<VChannelContext> HomeOf(std::string_view i_ContextName) const;
     std::shared_ptr<TQL::IChannel> MakeCache(std::uint64_t i_Hash, const std::shared_ptr<TQL::IChannel>& i_rpInput);
     std::shared_ptr<TQL::IChannel> MakeOrFind(std::string_view i_Operation, const OperationRequest& i_rRequest,
                                               const ChannelSystem::VDerivedChannelParameters& i_rParameters,
@@ -76,6 +82,7 @@ private:
     const std::shared_ptr<NotificationSystem::VChangeSignal> m_pTypeListChanged;
     mutable std::shared_mutex m_Mutex;
     std::map<std::string, std::shared_ptr<VChannelContext>, std::less<>> m_Contexts; // guarded by m_Mutex
+    std::shared_ptr<VChannelContext> m_pGlobal;                                      // guarded by m_Mutex
     std::multimap<TQL::IChannelInstanceId, std::weak_ptr<TQL::IChannel>> m_Derived;  // guarded by m_Mutex
     std::map<DerivedKey, std::weak_ptr<VDerivedChannel>> m_ByKey;                    // guarded by m_Mutex
     std::size_t m_PruneAt = 64;                                                      // guarded by m_Mutex

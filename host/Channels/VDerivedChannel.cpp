@@ -95,12 +95,16 @@ VDerivedChannel::VDerivedChannel(TQL::IChannelInstanceId i_Id, const OperationRe
 
 void VDerivedChannel::ConnectInputs()
 {
-    m_pParameters = std::make_shared<VDerivedParameters>(m_Record, m_Inputs,
-                                                         [pWeak = weak_from_this()]
-                                                         {
-                                                             const auto pSelf = pWeak.lock();
-                                                             return pSelf ? pSelf->GetError() : std::string();
-                                                         });
+    const auto ask = [this](std::string (VDerivedChannel::*i_pText)() const)
+    {
+        return [pWeak = weak_from_this(), i_pText]
+        {
+            const auto pSelf = pWeak.lock();
+            return pSelf ? (*pSelf.*i_pText)() : std::string();
+        };
+    };
+    m_pParameters = std::make_shared<VDerivedParameters>(m_Record, m_Inputs, ask(&VDerivedChannel::GetError),
+                                                         ask(&VDerivedChannel::GetComponentNames));
     const auto forward = NotificationSystem::MakeWeakFunction(weak_from_this(), [](const VDerivedChannel& i_rSelf)
                                                               { i_rSelf.m_pParameters->Notifier().Notify(); });
     for (const std::shared_ptr<TQL::IChannel>& rpInput : m_Inputs)
@@ -141,6 +145,16 @@ std::string VDerivedChannel::GetError() const
     const std::lock_guard lock(m_Mutex);
     RefreshLocked();
     return m_Error;
+}
+
+/// A derivative of angles about axes in some order, for example, has components about X, Y and Z.
+std::string VDerivedChannel::GetComponentNames() const
+{
+    if (!m_Request.bDerivative)
+        return {};
+    const std::lock_guard lock(m_Mutex);
+    RefreshLocked();
+    return m_Operation.pOperation ? m_pTable->NameDerivative(m_Descriptions.front()) : std::string();
 }
 
 /// Brings output, operation and error in line with the inputs.

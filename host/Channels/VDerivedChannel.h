@@ -53,6 +53,7 @@ private:
     bool CollectLocked(Outputs& o_rOutputs, Blocks& o_rBlocks) const;
     bool MakeOperationLocked(std::vector<TQL::ComponentDescription> i_Descriptions, double i_SecondsPerRow) const;
     std::string GetError() const;
+    std::string GetComponentNames() const;
 
     const TQL::IChannelInstanceId m_Id;
     const OperationRequest m_Request;

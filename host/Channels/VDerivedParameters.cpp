@@ -12,6 +12,7 @@ namespace
 {
 
 constexpr std::string_view ErrorParameter = "ErrorData";
+constexpr std::string_view ComponentNamesParameter = "ComponentDisplayNames";
 
 /// Reads "%12%" at the beginning of a text; 0 when there is none, else the number, and the length of it all.
 std::size_t ReadPlaceholder(std::string_view i_Text, std::size_t& o_rLength)
@@ -52,8 +53,10 @@ std::string ReplacePlaceholders(std::string_view i_Text,
 
 VDerivedParameters::VDerivedParameters(const ChannelSystem::VDerivedChannelParameters& i_rRecord,
                                        const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs,
-                                       ErrorFunction i_OwnError)
-    : m_OwnError(std::move(i_OwnError)), m_pNotifier(std::make_shared<VChangeNotifier>())
+                                       TextFunction i_OwnError, TextFunction i_ComponentNames)
+    : m_OwnError(std::move(i_OwnError))
+    , m_ComponentNames(std::move(i_ComponentNames))
+    , m_pNotifier(std::make_shared<VChangeNotifier>())
 {
     for (const auto& [rName, rValue] : i_rRecord.TypeParameters)
         m_Entries.insert_or_assign(rName, Entry{VChannelParameters::TypeGroup, rValue});
@@ -70,6 +73,13 @@ TQL::IResult VDerivedParameters::Read(std::string_view i_Group, std::string_view
                                       TQL::ParameterValue& o_rValue) const
 {
     const auto entry = m_Entries.find(i_Name);
+    if (entry == m_Entries.end() && i_Name == ComponentNamesParameter && m_ComponentNames &&
+        (i_Group.empty() || i_Group == VChannelParameters::TypeGroup))
+        if (std::string names = m_ComponentNames(); !names.empty())
+        {
+            o_rValue = std::move(names);
+            return TQL::Result::Ok;
+        }
     if (entry == m_Entries.end() || (!i_Group.empty() && i_Group != entry->second.Group))
         return m_Inputs.front()->Read(i_Group, i_Name, o_rValue);
     const std::string* pText = std::get_if<std::string>(&entry->second.Value);

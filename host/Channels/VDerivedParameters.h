@@ -21,11 +21,14 @@ namespace Channels
 class VDerivedParameters : public TQL::IChannelParameters
 {
 public:
-    using ErrorFunction = std::function<std::string()>;
+    using TextFunction = std::function<std::string()>;
 
-    /// i_OwnError gives the error of the channel itself, empty for none; called with no lock held.
+    /// Both functions are called with no lock held. i_OwnError gives the error of the channel itself, empty for none;
+    /// i_ComponentNames, which may be left out, the component names where they are neither told by the record nor those
+    /// of the first input, empty otherwise.
     VDerivedParameters(const ChannelSystem::VDerivedChannelParameters& i_rRecord,
-                       const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs, ErrorFunction i_OwnError);
+                       const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs, TextFunction i_OwnError,
+                       TextFunction i_ComponentNames = {});
 
     VChangeNotifier& Notifier() { return *m_pNotifier; }
 
@@ -48,7 +51,8 @@ private:
 
     std::map<std::string, Entry, std::less<>> m_Entries; // fixed once made
     std::vector<std::shared_ptr<TQL::IChannelParameters>> m_Inputs;
-    const ErrorFunction m_OwnError;
+    const TextFunction m_OwnError;
+    const TextFunction m_ComponentNames; ///< may be empty
     const std::shared_ptr<VChangeNotifier> m_pNotifier;
 };
 

@@ -1,7 +1,10 @@
 #include "Channels/VLiveContext.h"
 
 #include <algorithm>
+#include <cmath>
+#include <limits>
 #include <utility>
+#include <vector>
 
 namespace Channels
 {
@@ -14,6 +17,16 @@ constexpr std::int64_t BytesPerValue = 6;
 
 /// Trimming gives memory back by the chunk, so it is not tried more often than every so many frames.
 constexpr std::int64_t TrimStep = 256;
+
+/// Adds 1 to each frame in whose first row there is a sample.
+void CountSamples(const ChannelRows& i_rRows, std::size_t i_Components, std::int64_t i_RowsPerFrame,
+                  std::span<float> io_Counts)
+{
+    const std::size_t stride = i_rRows.Stride == 0 ? i_Components : i_rRows.Stride;
+    const std::size_t step = stride * static_cast<std::size_t>(i_RowsPerFrame);
+    for (std::size_t frame = 0; frame < io_Counts.size(); ++frame)
+        io_Counts[frame] += std::isnan(i_rRows.Values[frame * step]) ? 0.0f : 1.0f;
+}
 
 } // namespace
 
@@ -42,7 +55,8 @@ TQL::IResult VLiveContext::AddChannel(const ChannelDefinition& i_rDefinition, st
     const auto components = static_cast<std::uint32_t>(ComponentNamesOf(i_rDefinition).size());
     const std::lock_guard lock(m_ProducerMutex);
     auto pSamples = std::make_shared<VSampleStore>(period, m_EndFrame * framePeriod, components);
-    Inlet inlet{nullptr, framePeriod / period, m_EndFrame, false};
+    const bool bMeasured = FindChannelType(i_rDefinition.TypeName)->RecordedKind.has_value();
+    Inlet inlet{nullptr, framePeriod / period, m_EndFrame, false, bMeasured};
     const TQL::IResult result = VChannelContext::AddChannel(i_rDefinition, std::move(pSamples), inlet.pChannel);
     if (result.IsError())
         return result;
@@ -77,34 +91,53 @@ TQL::IResult VLiveContext::CheckLocked(std::int64_t i_FirstFrame, std::int64_t i
 TQL::IResult VLiveContext::AppendFrames(std::int64_t i_FirstFrame, std::int64_t i_FrameCount,
                                         std::span<const ChannelRows> i_Rows)
 {
+    std::shared_ptr<IFrameMeter> pMeter;
+    std::vector<float> shares;
     {
         const std::lock_guard lock(m_ProducerMutex);
         if (const TQL::IResult result = CheckLocked(i_FirstFrame, i_FrameCount, i_Rows); result.IsError())
             return result;
         if (i_FirstFrame - m_EndFrame > GetHistoryFrames())
             RestartLocked(i_FirstFrame);
-        for (const ChannelRows& rRows : i_Rows)
-        {
-            Inlet& rInlet = m_Inlets[rRows.Channel];
-            if (rInlet.EndFrame > i_FirstFrame) // named twice: the first one counts
-                continue;
-            FillUpLocked(rInlet, i_FirstFrame);
-            rInlet.pChannel->GetSamples()->Append(rRows.Values, rRows.Stride);
-            rInlet.EndFrame = i_FirstFrame + i_FrameCount;
-        }
-        m_EndFrame = i_FirstFrame + i_FrameCount;
-        for (Inlet& rInlet : m_Inlets)
-        {
-            FillUpLocked(rInlet, m_EndFrame);
-            if (!std::exchange(rInlet.bHasData, true))
-                m_Appeared.push_back(rInlet.pChannel);
-        }
+        pMeter = m_pMeter;
+        if (pMeter)
+            shares.assign(static_cast<std::size_t>(i_FrameCount), 0.0f);
+        AppendLocked(i_FirstFrame, i_FrameCount, i_Rows, shares);
         TrimLocked();
         SetRangeLocked();
     }
     NotifyAppeared();
     InvokeRangeChanged();
+    if (pMeter)
+        pMeter->OnFrames(i_FirstFrame, shares);
     return TQL::Result::Ok;
+}
+
+/// The shares are empty, or begin at 0 and there is one for each frame.
+void VLiveContext::AppendLocked(std::int64_t i_FirstFrame, std::int64_t i_FrameCount,
+                                std::span<const ChannelRows> i_Rows, std::span<float> io_Shares)
+{
+    for (const ChannelRows& rRows : i_Rows)
+    {
+        Inlet& rInlet = m_Inlets[rRows.Channel];
+        if (rInlet.EndFrame > i_FirstFrame) // named twice: the first one counts
+            continue;
+        FillUpLocked(rInlet, i_FirstFrame);
+        rInlet.pChannel->GetSamples()->Append(rRows.Values, rRows.Stride);
+        rInlet.EndFrame = i_FirstFrame + i_FrameCount;
+        if (rInlet.bMeasured)
+            CountSamples(rRows, rInlet.pChannel->GetSamples()->Components(), rInlet.RowsPerFrame, io_Shares);
+    }
+    m_EndFrame = i_FirstFrame + i_FrameCount;
+    for (Inlet& rInlet : m_Inlets)
+    {
+        FillUpLocked(rInlet, m_EndFrame);
+        if (!std::exchange(rInlet.bHasData, true))
+            m_Appeared.push_back(rInlet.pChannel);
+    }
+    const auto measured = static_cast<float>(std::ranges::count(m_Inlets, true, &Inlet::bMeasured));
+    for (float& rShare : io_Shares)
+        rShare = measured == 0.0f ? std::numeric_limits<float>::quiet_NaN() : rShare / measured;
 }
 
 /// Missing samples up to a frame.
@@ -153,6 +186,12 @@ void VLiveContext::UpdateHistoryLocked()
     const std::int64_t affordable = static_cast<std::int64_t>(m_Options.MemoryLimitBytes) / bytesPerFrame;
     const std::int64_t wanted = m_Options.HistoryTicks / m_Options.FramePeriod;
     m_HistoryFrames.store(std::max(std::min(wanted, affordable), std::int64_t{1}), std::memory_order_relaxed);
+}
+
+void VLiveContext::SetMeter(std::shared_ptr<IFrameMeter> i_pMeter)
+{
+    const std::lock_guard lock(m_ProducerMutex);
+    m_pMeter = std::move(i_pMeter);
 }
 
 void VLiveContext::Restart(std::int64_t i_FirstFrame)

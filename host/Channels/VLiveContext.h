@@ -19,6 +19,17 @@ struct ChannelRows
     std::size_t Stride = 0;
 };
 
+/// Looks on while frames come in. Called on the thread of the producer, with no lock of the context held.
+class IFrameMeter
+{
+public:
+    virtual ~IFrameMeter() = default;
+
+    /// Frames from i_FirstFrame on were appended. For each the share of the measured channels that have a sample in it,
+    /// from 0 to 1; NaN while there are none. Cameras and the like are not measured.
+    virtual void OnFrames(std::int64_t i_FirstFrame, std::span<const float> i_Shares) = 0;
+};
+
 /// A live capture. One producer at a time appends frames, on any thread; everybody may read meanwhile. Keeps the newest
 /// history and forgets what is older. Channels may be added while frames come in; they begin with the next frame.
 class VLiveContext : public VChannelContext
@@ -49,6 +60,9 @@ public:
     /// Drops all samples; the next frame is i_FirstFrame. Every output that was handed out is stale.
     void Restart(std::int64_t i_FirstFrame);
 
+    /// From the next frame on; null for none.
+    void SetMeter(std::shared_ptr<IFrameMeter> i_pMeter);
+
     /// Frames that are kept with the channels as they are.
     std::int64_t GetHistoryFrames() const { return m_HistoryFrames.load(std::memory_order_relaxed); }
 
@@ -61,10 +75,13 @@ private:
         std::int64_t RowsPerFrame = 1;
         std::int64_t EndFrame = 0; ///< the frame that its next row belongs to
         bool bHasData = false;     ///< since the last restart
+        bool bMeasured = true;     ///< it can have no sample
     };
 
     TQL::IResult CheckLocked(std::int64_t i_FirstFrame, std::int64_t i_FrameCount,
                              std::span<const ChannelRows> i_Rows) const;
+    void AppendLocked(std::int64_t i_FirstFrame, std::int64_t i_FrameCount, std::span<const ChannelRows> i_Rows,
+                      std::span<float> io_Shares);
     void RestartLocked(std::int64_t i_FirstFrame);
     void FillUpLocked(Inlet& io_rInlet, std::int64_t i_EndFrame);
     void TrimLocked();
@@ -76,6 +93,7 @@ private:
     std::mutex m_ProducerMutex;                              // held while frames or channels are added
     std::vector<Inlet> m_Inlets;                             // guarded by m_ProducerMutex
     std::vector<std::shared_ptr<VSourceChannel>> m_Appeared; // guarded by m_ProducerMutex: had their first samples now
+    std::shared_ptr<IFrameMeter> m_pMeter;                   // guarded by m_ProducerMutex; may be null
     std::int64_t m_StartFrame;                               // guarded by m_ProducerMutex: oldest frame that is kept
     std::int64_t m_EndFrame;                                 // guarded by m_ProducerMutex
     std::int64_t m_TrimFrame;                                // guarded by m_ProducerMutex: no trimming before it

@@ -3,6 +3,7 @@
 #include "Channels/VSubTypeTable.h"
 #include "Expressions/CompileExpression.h"
 #include "Expressions/MakeDerivative.h"
+#include "Expressions/Shape.h"
 
 #include <algorithm>
 #include <utility>
@@ -80,6 +81,14 @@ Expressions::OperationOrError VOperationTable::Make(const OperationRequest& i_rR
     }
     m_Entries[text].push_back(std::move(entry));
     return made;
+}
+
+std::string VOperationTable::NameDerivative(const TQL::ComponentDescription& i_rInput) const
+{
+    const Expressions::Shape shape = Expressions::FindShape(i_rInput, *m_pSubTypes);
+    if (shape.Kind == Expressions::EShape::Numbers || shape.Form.Form == Expressions::ERotation::AngleAxis)
+        return {};
+    return shape.Kind == Expressions::EShape::Pose ? "RX,RY,RZ,TX,TY,TZ" : "RX,RY,RZ";
 }
 
 Expressions::OperationOrError VOperationTable::MakeNew(const OperationRequest& i_rRequest,

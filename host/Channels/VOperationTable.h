@@ -45,6 +45,9 @@ public:
     Expressions::OperationOrError Make(const OperationRequest& i_rRequest,
                                        std::span<const TQL::ComponentDescription> i_Inputs, double i_SecondsPerRow);
 
+    /// The component names of the derivative of an input, separated by commas; empty where they are those of the input.
+    std::string NameDerivative(const TQL::ComponentDescription& i_rInput) const;
+
 private:
     struct Entry
     {

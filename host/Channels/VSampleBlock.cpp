@@ -18,11 +18,13 @@ constexpr std::int64_t NoTick = std::numeric_limits<std::int64_t>::min();
 } // namespace
 
 VSampleBlock::VSampleBlock(std::shared_ptr<VSampleStore> i_pSamples, std::uint32_t i_Levels,
-                           std::shared_ptr<const BlockWindow> i_pWindow, std::shared_ptr<VCacheFeed> i_pFeed)
+                           std::shared_ptr<const BlockWindow> i_pWindow, std::shared_ptr<VCacheFeed> i_pFeed,
+                           EFollow i_Follow)
     : m_pSamples(std::move(i_pSamples))
     , m_pStore(m_pSamples)
     , m_pWindow(std::move(i_pWindow))
     , m_pFeed(std::move(i_pFeed))
+    , m_Follow(i_Follow)
     , m_ReportedFirst(NoTick)
 {
     m_Shape.FormatTag = FloatSamples;
@@ -35,10 +37,27 @@ VSampleBlock::VSampleBlock(std::shared_ptr<VSampleStore> i_pSamples, std::uint32
         m_Shape.SummaryPeriods.push_back(m_Shape.SamplePeriod << (k + 1));
 }
 
+std::shared_ptr<VCacheFeed> VSampleBlock::GetContinuous(const RotationPart& i_rRotation)
+{
+    const std::lock_guard lock(m_Mutex);
+    std::shared_ptr<VCacheFeed> pFeed = m_pContinuous.lock();
+    if (!pFeed)
+        pFeed = std::make_shared<VCacheFeed>(SourceOf(shared_from_this()), i_rRotation, nullptr);
+    m_pContinuous = pFeed;
+    return pFeed;
+}
+
+void VSampleBlock::Follow() const
+{
+    if (m_pFeed && m_Follow == EFollow::Everything)
+        m_pFeed->CatchUp();
+    else if (m_pFeed)
+        m_pFeed->CatchUpByStep();
+}
+
 void VSampleBlock::GetRange(TQL::TickRange& o_rRange) const
 {
-    if (m_pFeed)
-        m_pFeed->CatchUp();
+    Follow();
     o_rRange = m_pSamples->GetRange();
     if (!m_pWindow)
         return;

@@ -47,6 +47,17 @@ TQL::ComponentDescription DescribeSteps(const TQL::ComponentDescription& i_rInpu
     return steps;
 }
 
+/// What is left of it as a power of time alone is told in hertz, if there is such a unit: a text of units needs one to
+/// stand above the line.
+bool DivideByTime(Unit& io_rUnit, int i_Order, std::uint16_t i_Second, const std::optional<std::uint16_t>& i_rHertz)
+{
+    if (!MultiplyUnit(io_rUnit, i_Second, -i_Order))
+        return false;
+    if (i_rHertz && io_rUnit.size() == 1 && io_rUnit[0].SubTypeId == i_Second && io_rUnit[0].Exponent < 0)
+        io_rUnit[0] = {*i_rHertz, -io_rUnit[0].Exponent};
+    return true;
+}
+
 } // namespace
 
 OperationOrError MakeDerivative(int i_Order, bool i_bPerFrame, double i_SecondsPerRow,
@@ -73,7 +84,7 @@ OperationOrError MakeDerivative(int i_Order, bool i_bPerFrame, double i_SecondsP
         plan.Radians =
             *FindRadians(plan.Is.Form.Form, std::span(i_rInput.Groups).first(plan.Is.RotationWidth()), i_rUnits);
     for (TQL::ComponentGroup& rGroup : plan.Description.Groups)
-        if (!i_bPerFrame && !MultiplyUnit(rGroup.Factors, *second, -i_Order))
+        if (!i_bPerFrame && !DivideByTime(rGroup.Factors, i_Order, *second, FindUnit("hertz", i_rUnits)))
             return Refuse("The unit of the derivative has too high a power of time.");
     return {std::make_shared<const VDerivative>(std::move(plan)), {}};
 }

@@ -21,6 +21,9 @@ std::string_view OwnName(std::string_view i_Name)
     return colon == std::string_view::npos ? i_Name : i_Name.substr(colon + 1);
 }
 
+constexpr int MostAlike = 6;
+constexpr int SameFrom = 5; ///< this likeness and above: the same thing
+
 /// How well a channel of the same type can stand for another; 0: not at all.
 int Likeness(const Channels::VSourceChannel& i_rWanted, const Channels::VSourceChannel& i_rOther)
 {
@@ -28,13 +31,11 @@ int Likeness(const Channels::VSourceChannel& i_rWanted, const Channels::VSourceC
     const std::string& rOther = i_rOther.GetDefinition().Name;
     const bool bSameNumbers = i_rWanted.GetInstanceId() == i_rOther.GetInstanceId();
     if (!rWanted.empty() && rWanted == rOther)
-        return bSameNumbers ? 6 : 5;
+        return bSameNumbers ? MostAlike : SameFrom;
     if (!rWanted.empty() && OwnName(rWanted) == OwnName(rOther))
         return i_rWanted.GetInstanceId().First == i_rOther.GetInstanceId().First ? 4 : 3;
     return bSameNumbers ? 2 : 0;
 }
-
-constexpr int SameFrom = 5; ///< this likeness and above: the same thing
 
 } // namespace
 
@@ -102,11 +103,17 @@ VChannelMigrationService::Found VChannelMigrationService::FindSource(const TQL::
                                                                      const std::string& i_rContext) const
 {
     const TQL::IChannelInstanceId& rId = i_rChannel.GetInstanceId();
+    if (rId.DataContextName == Channels::GlobalContextName) // the same in all contexts
+        return {m_pService->GetChannel(rId), true};
     const auto* pWanted = dynamic_cast<const Channels::VSourceChannel*>(&i_rChannel);
     const auto* pService = dynamic_cast<const Channels::VChannelService*>(m_pService.get());
     const auto pContext = pService ? pService->FindContext(i_rContext) : nullptr;
     if (!pWanted || !pContext)
         return {m_pService->GetChannel({i_rContext, rId.TypeName, rId.First, rId.Second, rId.Text}), false};
+    // The same name under the same numbers is what is mostly there, and needs no search.
+    if (auto pSame = pContext->FindChannel({i_rContext, rId.TypeName, rId.First, rId.Second, rId.Text}))
+        if (Likeness(*pWanted, *pSame) == MostAlike)
+            return {std::move(pSame), true};
     std::shared_ptr<TQL::IChannel> pBest;
     int best = 0;
     const auto pChannels = pContext->GetChannels();

@@ -8,10 +8,14 @@
 #include <QtCore/QCoreApplication>
 
 #include <algorithm>
+#include <cstdint>
+#include <set>
 #include <variant>
 
 namespace Studio
 {
+
+using TQL::ESelectionKind;
 
 namespace
 {
@@ -53,38 +57,80 @@ QString BranchOf(const std::string& i_rTypeName)
     } rows[] = {{Channels::LabelledReconstructionType, QT_TRANSLATE_NOOP("ChannelTree", "Markers")},
                 {Channels::SegmentPoseType, QT_TRANSLATE_NOOP("ChannelTree", "Segments")},
                 {Channels::DeviceOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Analog outputs")},
-                {Channels::ModelOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Model outputs")}};
+                {Channels::ModelOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Model outputs")},
+                {Channels::CameraPoseType, QT_TRANSLATE_NOOP("ChannelTree", "Cameras")},
+                {Channels::MonitorType, QT_TRANSLATE_NOOP("ChannelTree", "Monitors")}};
     for (const auto& rRow : rows)
         if (rRow.Type == i_rTypeName)
             return QCoreApplication::translate("ChannelTree", rRow.pText);
     return QCoreApplication::translate("ChannelTree", "Other channels");
 }
 
-} // namespace
-
-std::vector<SelectableChannel> ListChannels(const Channels::VChannelContext& i_rContext)
+void AddThings(const Channels::VChannelContext& i_rContext, std::vector<SelectableThing>& o_rThings)
 {
-    std::vector<SelectableChannel> channels;
     for (const auto& rpChannel : *i_rContext.GetChannels())
         if (auto item = Channels::SelectionOfChannel(rpChannel->GetInstanceId()))
         {
             const Channels::ChannelDefinition& rDefinition = rpChannel->GetDefinition();
-            channels.push_back({NameOf(*rpChannel), rpChannel->GetInstanceId().TypeName, std::move(*item),
-                                UnitsOf(rDefinition), Channels::ComponentNamesOf(rDefinition)});
+            o_rThings.push_back({NameOf(*rpChannel), rpChannel->GetInstanceId().TypeName, std::move(*item),
+                                 UnitsOf(rDefinition), Channels::ComponentNamesOf(rDefinition)});
         }
-    return channels;
 }
 
-std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableChannel> i_Channels)
+/// The subjects of the segments among the things. The first segment of each is its root.
+void AddSubjects(std::vector<SelectableThing>& io_rThings)
+{
+    std::set<std::uint64_t> met;
+    std::vector<SelectableThing> subjects;
+    for (const SelectableThing& rThing : io_rThings)
+    {
+        const std::size_t colon = rThing.Name.find(':');
+        if (rThing.Item.Kind != ESelectionKind::Segment || colon == 0 || colon == std::string::npos ||
+            !met.insert(rThing.Item.First).second)
+            continue;
+        subjects.push_back({rThing.Name.substr(0, colon), {}, {ESelectionKind::Subject, rThing.Item.First, 0, {}}});
+        subjects.back().Components = {rThing.Name.substr(colon + 1)};
+    }
+    io_rThings.insert(io_rThings.end(), subjects.begin(), subjects.end());
+}
+
+ChannelTreeLeaf MakeSubjectLeaf(const SelectableThing& i_rSubject)
+{
+    const QString name = QString::fromStdString(i_rSubject.Name);
+    const QStringList root = Texts(i_rSubject.Components);
+    const QString text =
+        QCoreApplication::translate("ChannelTree", "Subject (root segment %1)").arg(root.join(QString()));
+    return {{name}, text, i_rSubject.Item, {name, QCoreApplication::translate("ChannelTree", "Subject"), {}, root}};
+}
+
+} // namespace
+
+std::vector<SelectableThing> ListThings(const Channels::VChannelContext& i_rContext,
+                                        const Channels::VChannelContext* i_pGlobal)
+{
+    std::vector<SelectableThing> things;
+    AddThings(i_rContext, things);
+    if (i_pGlobal)
+        AddThings(*i_pGlobal, things);
+    AddSubjects(things);
+    return things;
+}
+
+std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableThing> i_Things)
 {
     std::vector<ChannelTreeLeaf> leaves;
-    for (const SelectableChannel& rChannel : i_Channels)
+    for (const SelectableThing& rThing : i_Things)
     {
-        const QString name = QString::fromStdString(rChannel.Name);
+        if (rThing.Item.Kind == ESelectionKind::Subject)
+        {
+            leaves.push_back(MakeSubjectLeaf(rThing));
+            continue;
+        }
+        const QString name = QString::fromStdString(rThing.Name);
         const qsizetype colon = name.indexOf(QLatin1Char(':'));
-        const QString kind = BranchOf(rChannel.TypeName);
-        ChannelTreeLeaf leaf{{kind}, name.mid(colon + 1), rChannel.Item, {}};
-        leaf.Search = {name, kind, Texts(rChannel.Units), Texts(rChannel.Components)};
+        const QString kind = BranchOf(rThing.TypeName);
+        ChannelTreeLeaf leaf{{kind}, name.mid(colon + 1), rThing.Item, {}};
+        leaf.Search = {name, kind, Texts(rThing.Units), Texts(rThing.Components)};
         if (colon > 0)
             leaf.Branches.prepend(name.left(colon));
         leaves.push_back(std::move(leaf));
@@ -92,20 +138,20 @@ std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableChannel> i_Cha
     return leaves;
 }
 
-std::vector<TQL::SelectionItem> FindItems(std::span<const SelectableChannel> i_Channels,
+std::vector<TQL::SelectionItem> FindItems(std::span<const SelectableThing> i_Things,
                                           std::span<const std::string> i_Patterns, std::string& o_rUnmatched)
 {
     std::vector<TQL::SelectionItem> items;
     for (const std::string& rPattern : i_Patterns)
     {
         bool bMatched = false;
-        for (const SelectableChannel& rChannel : i_Channels)
+        for (const SelectableThing& rThing : i_Things)
         {
-            if (!Recordings::MatchesPattern(rChannel.Name, rPattern))
+            if (!Recordings::MatchesPattern(rThing.Name, rPattern))
                 continue;
             bMatched = true;
-            if (std::ranges::find(items, rChannel.Item) == items.end())
-                items.push_back(rChannel.Item);
+            if (std::ranges::find(items, rThing.Item) == items.end())
+                items.push_back(rThing.Item);
         }
         if (!bMatched)
         {

@@ -14,26 +14,28 @@ class VChannelContext;
 namespace Studio
 {
 
-/// One channel of a context that an operator can select.
-struct SelectableChannel
+/// One thing that an operator can select: what a channel is about, or a subject.
+struct SelectableThing
 {
-    std::string Name;     ///< as shown: "Walker1:LFHD"
-    std::string TypeName; ///< of its id
+    std::string Name;     ///< as shown: "Walker1:LFHD"; "Walker1" for a subject
+    std::string TypeName; ///< of its channel's id; empty for a subject
     TQL::SelectionItem Item;
     std::vector<std::string> Units = {};      ///< of its components, each once
-    std::vector<std::string> Components = {}; ///< names
+    std::vector<std::string> Components = {}; ///< names; for a subject the name of its root segment
 };
 
-/// In the order of the context.
-std::vector<SelectableChannel> ListChannels(const Channels::VChannelContext& i_rContext);
+/// Those of the context's channels in their order, then of the global ones, then the subjects that have segments.
+/// i_pGlobal may be null.
+std::vector<SelectableThing> ListThings(const Channels::VChannelContext& i_rContext,
+                                        const Channels::VChannelContext* i_pGlobal);
 
-/// The channels as leaves of the tree: what stands before the first colon of a name is the subject and the top branch,
-/// then comes the kind.
-std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableChannel> i_Channels);
+/// The things as leaves of the tree: what stands before the first colon of a name is the subject and the top branch,
+/// then comes the kind. A subject is a leaf of its own branch.
+std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableThing> i_Things);
 
-/// The items of the channels whose names match one of the patterns, each once, in the order of the patterns. When one
+/// The items of the things whose names match one of the patterns, each once, in the order of the patterns. When one
 /// of them matches nothing it is given in o_rUnmatched and the answer is empty.
-std::vector<TQL::SelectionItem> FindItems(std::span<const SelectableChannel> i_Channels,
+std::vector<TQL::SelectionItem> FindItems(std::span<const SelectableThing> i_Things,
                                           std::span<const std::string> i_Patterns, std::string& o_rUnmatched);
 
 } // namespace Studio

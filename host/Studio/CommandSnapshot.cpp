@@ -1,4 +1,4 @@
-#include "Channels/VChannelContext.h"
+#include "Channels/VChannelService.h"
 #include "Services/VSelectionSource.h"
 #include "Studio/ChannelLeaves.h"
 #include "Studio/CommandLine.h"
@@ -89,17 +89,17 @@ private:
 
     bool SelectChannels()
     {
-        const auto channels = ListChannels(*m_rSession.CurrentContext());
-        if (channels.empty())
+        const auto things = ListThings(*m_rSession.CurrentContext(), m_rSession.Channels().GetGlobalChannels().get());
+        if (things.empty())
             return Fail(m_rCommandLine.Files.front() + " has no channels; there is nothing to show");
-        std::vector<TQL::SelectionItem> items{channels.front().Item};
+        std::vector<TQL::SelectionItem> items{things.front().Item};
         if (!m_rCommandLine.Patterns.empty())
         {
             std::string unmatched;
-            items = FindItems(channels, m_rCommandLine.Patterns, unmatched);
+            items = FindItems(things, m_rCommandLine.Patterns, unmatched);
             if (items.empty())
                 return Fail("no channel matches \"" + unmatched + "\"; " +
-                            (m_rCommandLine.bLive ? "one is called \"" + channels.front().Name + "\""
+                            (m_rCommandLine.bLive ? "one is called \"" + things.front().Name + "\""
                                                   : "graphplots-studio channels FILE lists the names"));
         }
         m_rSession.Host().Selection()->Set(items);

@@ -177,11 +177,13 @@ void VChannelPanel::ShowCurrentContext()
     const auto pContext = m_rSession.CurrentContext();
     if (pContext)
     {
-        const auto channels = ListChannels(*pContext);
+        const auto things = ListThings(*pContext, m_rSession.Channels().GetGlobalChannels().get());
         std::vector<TQL::SelectionItem> known;
-        for (const SelectableChannel& rChannel : channels)
-            known.push_back(rChannel.Item);
-        SetLeaves(MakeLeaves(channels));
+        for (const SelectableThing& rThing : things)
+            known.push_back(rThing.Item);
+        if (pContext->GetChannels()->empty()) // monitors alone are nothing to begin with
+            known.clear();
+        SetLeaves(MakeLeaves(things));
         const auto items = m_Selection.Show(pContext->GetName(), known);
         m_pModel->SetTicked(items);
         m_rSession.Host().Selection()->Set(items);

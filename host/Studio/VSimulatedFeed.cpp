@@ -2,6 +2,7 @@
 
 #include "Channels/ChannelTypes.h"
 #include "Channels/VLiveContext.h"
+#include "Simulation/CameraRing.h"
 #include "TQL/ITick.h"
 
 #include <algorithm>
@@ -53,6 +54,7 @@ VSimulatedFeed::VSimulatedFeed(const VWalkSimulator::Options& i_rOptions,
     for (std::uint32_t subject = 0; subject < i_rOptions.Subjects; ++subject)
         AddSubject(subject);
     AddAnalog();
+    AddCameras();
     AddSampleCount();
 }
 
@@ -117,6 +119,30 @@ void VSimulatedFeed::AddAnalog()
         m_Simulator.ReadAnalog(i_Frame, o_Values);
     };
     m_Sources.push_back(std::move(analog));
+}
+
+void VSimulatedFeed::AddCameras()
+{
+    Source cameras;
+    std::vector<float> poses;
+    for (std::uint32_t camera = 0; camera < Simulation::CameraCount; ++camera)
+    {
+        Channels::ChannelDefinition definition;
+        definition.TypeName = Channels::CameraPoseType;
+        definition.First = camera;
+        definition.Name = Simulation::CameraName(camera);
+        definition.Units = "mm";
+        cameras.Channels.push_back(AddTo(*m_pContext, definition, 0));
+        const auto pose = Simulation::CameraPoseOf(camera);
+        poses.insert(poses.end(), pose.begin(), pose.end());
+    }
+    cameras.ValuesPerChannel = poses.size() / Simulation::CameraCount;
+    cameras.Stride = cameras.ValuesPerFrame = poses.size();
+    cameras.Read = [poses = std::move(poses)](std::int64_t, std::span<float> o_Values)
+    {
+        std::ranges::copy(poses, o_Values.begin());
+    };
+    m_Sources.push_back(std::move(cameras));
 }
 
 /// Behind the markers, for it counts what they are in the same batch.

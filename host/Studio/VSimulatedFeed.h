@@ -17,8 +17,8 @@ namespace Studio
 {
 
 /// Puts the simulated capture into a live context: its channels when it is made, its frames when it is told to. The
-/// same channels come out with the same ids as from a recording of the simulator; beside them stands the number of
-/// markers of all subjects that were seen. One thread at a time.
+/// same channels come out with the same ids as from a recording of the simulator; beside them stand the poses of the
+/// cameras and the number of markers of all subjects that were seen. One thread at a time.
 class VSimulatedFeed
 {
 public:
@@ -34,6 +34,7 @@ private:
 
     void AddSubject(std::uint32_t i_Subject);
     void AddAnalog();
+    void AddCameras();
     void AddSampleCount();
     float CountSamples(std::size_t i_Row) const;
     [[nodiscard]] TQL::IResult ProduceBatch(std::int64_t i_FirstFrame, std::int64_t i_FrameCount);

@@ -21,6 +21,7 @@ namespace Channels
 {
 class VChannelContext;
 class VChannelService;
+class VLiveContext;
 } // namespace Channels
 
 namespace Services
@@ -120,6 +121,7 @@ public:
 private:
     void TellSelection();
     void AddContext(const std::shared_ptr<Channels::VChannelContext>& i_rpContext, int i_TimeMode);
+    void AddLive(const std::shared_ptr<Channels::VLiveContext>& i_rpContext, double i_FramesPerSecond);
 
     std::filesystem::path m_SettingsFolder;
     std::map<std::string, std::filesystem::path> m_Files; ///< by context name

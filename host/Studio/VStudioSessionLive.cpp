@@ -1,5 +1,6 @@
 #include "Channels/VChannelService.h"
 #include "Channels/VLiveContext.h"
+#include "Channels/VLiveMonitors.h"
 #include "Channels/VRecordedContext.h"
 #include "OrvanePluginInterface/ITimeController.h"
 #include "Services/VUiPostalService.h"
@@ -35,7 +36,22 @@ std::shared_ptr<const Recordings::VRecording> RecordingOf(const Channels::VChann
     return pContext ? pContext->GetRecording() : nullptr;
 }
 
+double RateOf(const Channels::VLiveContext& i_rContext)
+{
+    return static_cast<double>(TQL::DefaultTickRate) / static_cast<double>(i_rContext.GetFramePeriod());
+}
+
 } // namespace
+
+/// Shows a live input in place of another, and its monitors.
+void VStudioSession::AddLive(const std::shared_ptr<Channels::VLiveContext>& i_rpContext, double i_FramesPerSecond)
+{
+    const auto pMonitors =
+        std::make_shared<Channels::VLiveMonitors>(*i_rpContext, m_pChannels->GetSubTypes(), i_FramesPerSecond);
+    m_pChannels->SetGlobalChannels(pMonitors->GetContext());
+    i_rpContext->SetMeter(pMonitors);
+    AddContext(i_rpContext, OrvanePluginInterface::ETimeMode::Live);
+}
 
 void VStudioSession::StartLive(std::uint32_t i_Subjects, std::int64_t i_HistoryFrames)
 {
@@ -48,7 +64,7 @@ void VStudioSession::StartLive(std::uint32_t i_Subjects, std::int64_t i_HistoryF
     if (i_HistoryFrames > 0)
         if (const TQL::IResult result = pFeed->Produce(0, i_HistoryFrames); result.IsError())
             Log(TQL::ELogSeverity::Error, __LINE__, "The live capture has no history: %1%", result.Description());
-    AddContext(pContext, OrvanePluginInterface::ETimeMode::Live);
+    AddLive(pContext, Simulation::VWalkSimulator::FrameRate);
     m_pCapture = std::make_unique<VLiveCapture>([pFeed](std::int64_t i_First, std::int64_t i_Count)
                                                 { return pFeed->Produce(i_First, i_Count); },
                                                 Simulation::VWalkSimulator::FrameRate, i_HistoryFrames);
@@ -61,7 +77,7 @@ TQL::IResult VStudioSession::StartOsc(const Streaming::VOscInput::Options& i_rOp
         if (m_pChannels->FindContext(LiveContextName) == i_rpContext)
             m_pChannels->AddContext(i_rpContext); // tells that it has other channels now
         else
-            AddContext(i_rpContext, OrvanePluginInterface::ETimeMode::Live);
+            AddLive(i_rpContext, RateOf(*i_rpContext));
     };
     const auto warn = [this](const std::string& i_rText)
     {
@@ -74,9 +90,9 @@ TQL::IResult VStudioSession::StartOsc(const Streaming::VOscInput::Options& i_rOp
         return result;
     StopLive();
     // Something to show until the messages come.
-    AddContext(std::make_shared<Channels::VLiveContext>(LiveContextName, m_pChannels->GetSubTypes(),
-                                                        Channels::VLiveContext::Options()),
-               OrvanePluginInterface::ETimeMode::Live);
+    const auto pEmpty = std::make_shared<Channels::VLiveContext>(LiveContextName, m_pChannels->GetSubTypes(),
+                                                                 Channels::VLiveContext::Options());
+    AddLive(pEmpty, RateOf(*pEmpty));
     m_pOsc = std::move(pOsc);
     return TQL::Result::Ok;
 }
@@ -112,7 +128,7 @@ TQL::IResult VStudioSession::StartReplay(const std::string& i_rContextName, doub
         std::make_shared<Streaming::VReplayFeed>(pRecording, pContext, Streaming::VReplayFeed::Options{i_bLoop});
     for (const std::string& rWarning : pFeed->Warnings())
         Log(TQL::ELogSeverity::Warning, __LINE__, "%1%", rWarning);
-    AddContext(pContext, OrvanePluginInterface::ETimeMode::Live);
+    AddLive(pContext, pFeed->FramesPerSecond() * i_Speed);
     m_pCapture = std::make_unique<VLiveCapture>([pFeed](std::int64_t i_First, std::int64_t i_Count)
                                                 { return pFeed->Produce(i_First, i_Count); },
                                                 pFeed->FramesPerSecond() * i_Speed, pFeed->FirstFrame());

@@ -49,7 +49,8 @@ public:
     CreateDerivedChannel(std::string_view i_Operation, const VDerivedChannelParameters& i_rParameters,
                          const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs) = 0;
 
-    /// By the exact id, its context included. Null when unknown.
+    /// By the exact id, its context included; one without a context names a global channel, whose own id may have one.
+    /// Null when unknown.
     virtual std::shared_ptr<TQL::IChannel> GetChannel(const TQL::IChannelInstanceId& i_rId) const = 0;
 
     /// What the selection means in channels; null in a host without selection.

@@ -57,11 +57,12 @@ std::string ComposeUnitText(const TQL::ComponentGroup& i_rGroup, const ChannelSy
         return {};
     const std::vector<FactorText> factors = ReadFactors(i_rGroup, i_rService);
     const auto below = std::ranges::find_if(factors, [](const FactorText& i_rFactor) { return i_rFactor.Power < 0; });
-    const bool bBrackets = factors.end() - below > 1;
-    std::string text = below == factors.begin() && below != factors.end() ? "1" : "";
+    const bool bLine = below != factors.begin();
+    const bool bBrackets = bLine && factors.end() - below > 1;
+    std::string text;
     for (auto it = factors.begin(); it != factors.end(); ++it)
     {
-        if (it == below)
+        if (it == below && bLine)
             text += bBrackets ? "/(" : "/";
         else if (it != factors.begin())
             text += ".";

@@ -29,7 +29,8 @@ enum class EUnitText
 };
 
 /// The unit of one component: factors by falling exponent, those below the line behind one slash, in brackets when they
-/// are several. A factor that the host does not know is left out; a group that is not used has no unit.
+/// are several. A factor that the host does not know is left out; a group that is not used has no unit. Without a
+/// factor above the line there is no line either, so a host describes a frequency by a unit of its own, such as hertz.
 std::string ComposeUnitText(const TQL::ComponentGroup& i_rGroup, const ChannelSystem::IChannelService& i_rService,
                             EUnitText i_Form);
 

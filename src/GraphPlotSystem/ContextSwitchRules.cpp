@@ -1,9 +1,6 @@
 #include "GraphPlotSystem/ContextSwitchRules.h"
 
-#include "ChannelSystem/IChannel.h"
-
-#include <unordered_set>
-#include <vector>
+#include "ChannelSystemUtils/WalkChannels.h"
 
 namespace GraphPlotUI
 {
@@ -16,21 +13,14 @@ constexpr std::string_view s_GlobalItems = "GlobalItems";
 
 std::string FindDataContext(const std::shared_ptr<TQL::IChannel>& i_rpChannel)
 {
-    std::vector<std::shared_ptr<TQL::IChannel>> open{i_rpChannel};
-    std::unordered_set<const TQL::IChannel*> seen; // channels may share what they are made from
-    while (!open.empty())
-    {
-        const std::shared_ptr<TQL::IChannel> pChannel = std::move(open.back());
-        open.pop_back();
-        if (!pChannel || !seen.insert(pChannel.get()).second)
-            continue;
-        if (!pChannel->GetInstanceId().DataContextName.empty())
-            return pChannel->GetInstanceId().DataContextName;
-        std::vector<std::shared_ptr<TQL::IChannel>> dependents;
-        pChannel->GetDependentChannels(dependents);
-        open.insert(open.end(), dependents.rbegin(), dependents.rend());
-    }
-    return {};
+    std::string context;
+    ChannelSystemUtils::VisitChannels(i_rpChannel,
+                                      [&context](const TQL::IChannel& i_rChannel)
+                                      {
+                                          context = i_rChannel.GetInstanceId().DataContextName;
+                                          return !context.empty();
+                                      });
+    return context;
 }
 
 bool IsSpecialContext(std::string_view i_Name)

@@ -1,10 +1,10 @@
 #include "GraphPlotSystem/PrimaryChannelType.h"
 
-#include "ChannelSystem/IChannel.h"
+#include "ChannelSystemUtils/RelativeMeasurements.h"
+#include "ChannelSystemUtils/WalkChannels.h"
 
 #include <algorithm>
 #include <array>
-#include <vector>
 
 namespace GraphPlotUI
 {
@@ -37,29 +37,16 @@ std::string PrimaryChannelType(const std::set<std::string>& i_rSelectedTypes)
     const auto primary = std::ranges::find_if(i_rSelectedTypes, IsPrimary);
     const std::string& rType = primary == i_rSelectedTypes.end() ? *i_rSelectedTypes.begin() : *primary;
     if (rType.starts_with("SubjectSegmentPose"))
-        return "_PositionAndRotation";
+        return std::string(ChannelSystemUtils::PositionAndRotationType);
     if (rType.starts_with("CalibratedCameraPose"))
-        return "_CameraPosition";
+        return std::string(ChannelSystemUtils::CameraPositionType);
     return rType;
 }
 
 bool IsMadeOfType(const std::shared_ptr<TQL::IChannel>& i_rpChannel, std::string_view i_TypeName)
 {
-    std::vector<std::shared_ptr<TQL::IChannel>> open{i_rpChannel};
-    std::set<const TQL::IChannel*> seen;
-    while (!open.empty())
-    {
-        const std::shared_ptr<TQL::IChannel> pChannel = std::move(open.back());
-        open.pop_back();
-        if (!pChannel || !seen.insert(pChannel.get()).second)
-            continue;
-        if (pChannel->GetInstanceId().TypeName == i_TypeName)
-            return true;
-        std::vector<std::shared_ptr<TQL::IChannel>> inputs;
-        pChannel->GetDependentChannels(inputs);
-        open.insert(open.end(), inputs.begin(), inputs.end());
-    }
-    return false;
+    return ChannelSystemUtils::VisitChannels(i_rpChannel, [i_TypeName](const TQL::IChannel& i_rChannel)
+                                             { return i_rChannel.GetInstanceId().TypeName == i_TypeName; });
 }
 
 } // namespace GraphPlotUI

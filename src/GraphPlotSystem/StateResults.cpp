@@ -5,6 +5,13 @@
 namespace GraphPlotUI
 {
 
+TQL::IResult WorseResult(TQL::IResult i_First, TQL::IResult i_Second)
+{
+    if (i_First.IsError() || (i_Second.IsSuccess() && i_First != TQL::Result::Ok))
+        return i_First;
+    return i_Second;
+}
+
 TQL::IResult CombineStateResults(std::span<const TQL::IResult> i_Results)
 {
     const auto failed = [](const TQL::IResult& i_rResult)

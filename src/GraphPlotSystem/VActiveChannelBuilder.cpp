@@ -109,7 +109,12 @@ VActiveChannelBuilder::FindChannels(const std::vector<TQL::IChannelInstanceId>& 
     {
         if (!o_rIds.insert(rId).second)
             continue;
-        if (auto pChannel = m_pChannelService->GetChannel(rId))
+        auto pChannel = m_pChannelService->GetChannel(rId);
+        if (!pChannel)
+            continue;
+        // That of a global channel may name a context where the one asked for named none.
+        const TQL::IChannelInstanceId& rOwnId = pChannel->GetInstanceId();
+        if (TQL::IsSameChannel(rOwnId, rId) || o_rIds.insert(rOwnId).second)
             channels.push_back(std::move(pChannel));
     }
     return channels;

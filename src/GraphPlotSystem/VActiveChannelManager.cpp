@@ -8,6 +8,7 @@
 #include "ChannelSystemUtils/ChannelParameterNames.h"
 #include "GraphPlotSystem/ChannelOptionPickers.h"
 #include "GraphPlotSystem/PrimaryChannelType.h"
+#include "GraphPlotSystem/StateResults.h"
 #include "GraphPlotSystem/VActiveChannelBuilder.h"
 #include "GraphPlotSystem/VActiveChannelModel.h"
 #include "GraphPlotSystem/VChannelSelectionHelp.h"
@@ -19,18 +20,6 @@
 
 namespace GraphPlotUI
 {
-namespace
-{
-
-/// The failure of the two when there is one, otherwise the remark; of two alike the first.
-TQL::IResult WorseOf(TQL::IResult i_First, TQL::IResult i_Second)
-{
-    if (i_First.IsError() || (i_Second.IsSuccess() && i_First != TQL::Result::Ok))
-        return i_First;
-    return i_Second;
-}
-
-} // namespace
 
 VActiveChannelManager::VActiveChannelManager(std::shared_ptr<TQL::IPostalService> i_pUiPostalService,
                                              std::shared_ptr<ChannelSystem::IChannelService> i_pChannelService,
@@ -138,7 +127,7 @@ void VActiveChannelManager::OnGlobalTypesListed()
 
 void VActiveChannelManager::OnSelectionChanged(bool i_bForce)
 {
-    if (m_ContextName.empty())
+    if (!IsFollowing())
         return;
     EvaluateSelection();
     m_pBuilder->Refresh(i_bForce);
@@ -146,7 +135,7 @@ void VActiveChannelManager::OnSelectionChanged(bool i_bForce)
 
 void VActiveChannelManager::EvaluateSelection()
 {
-    if (m_ContextName.empty() || !m_bSelectionLinked)
+    if (!IsFollowing() || !m_bSelectionLinked)
         return;
     EvaluateAutoType();
     m_pSelectedChannelTypeModel->UpdateAvailability();
@@ -154,7 +143,7 @@ void VActiveChannelManager::EvaluateSelection()
 
 void VActiveChannelManager::EvaluateAutoType()
 {
-    if (m_ContextName.empty() || !m_bSelectionLinked || !m_pSelectedChannelTypeModel->IsAuto())
+    if (!IsFollowing() || !m_bSelectionLinked || !m_pSelectedChannelTypeModel->IsAuto())
         return;
     std::set<std::string> types;
     if (const auto pManager = m_pChannelService->GetSelectionManager())
@@ -164,7 +153,7 @@ void VActiveChannelManager::EvaluateAutoType()
 
 void VActiveChannelManager::OnSelectedTypeChanged()
 {
-    if (m_ContextName.empty())
+    if (!IsFollowing())
         return;
     EvaluateAutoType();
     const std::string type = m_pSelectedChannelTypeModel->GetEffectiveType();
@@ -175,7 +164,7 @@ void VActiveChannelManager::OnSelectedTypeChanged()
 
 void VActiveChannelManager::OnGlobalTypeChanged()
 {
-    if (m_ContextName.empty())
+    if (!IsFollowing())
         return;
     const std::string& rType = m_pGlobalChannelTypeModel->GetPickedType();
     m_pBuilder->SetGlobalChannelType(rType == NoGlobalChannelType ? std::string() : rType);
@@ -283,7 +272,7 @@ TQL::IResult VActiveChannelManager::LoadState(const ActiveChannelState& i_rState
     SetDerivativeOrder(i_rState.DerivativeOrder);
     SetPlotMagnitude(i_rState.bPlotMagnitude);
     OnSelectionChanged(true);
-    return WorseOf(selected, global);
+    return WorseResult(selected, global);
 }
 
 void VActiveChannelManager::SaveState(ActiveChannelState& io_rState) const

@@ -72,7 +72,8 @@ public:
 
     /// Follows the host in the data context of that name; the empty name stops following.
     void SetDataContext(const std::string& i_rName);
-    /// Stops following; the name and the plotted channels stay. The same name can then be set again.
+    /// Stops following; the name and the plotted channels stay. What is picked from then on has its effect when a
+    /// context is set, be it the same one again.
     void ClearContext();
 
     /// Applies the fields that are this object's. OkButModified when a channel type is not listed.
@@ -116,6 +117,7 @@ private:
     template <typename T>
     void SetChoice(T ChannelOptionChoice::*i_pMember, T i_Value, void (VActiveChannelManager::*i_pSignal)());
     void PushOptions();
+    bool IsFollowing() const { return !m_ContextName.empty() && !m_bCleared; }
     void RegisterCallbacks();
     void DropCallbacks();
     void OnSelectedTypesListed();
@@ -142,9 +144,9 @@ private:
     TQL::IO::VEnumListModel* const m_pRotationFormatModel;
     TQL::IO::VEnumListModel* const m_pRotationUnitsModel;
     TQL::IO::VEnumListModel* const m_pLengthUnitsModel;
-    std::string m_ContextName; ///< empty while nothing is followed
+    std::string m_ContextName; ///< empty for none
     ChannelOptionChoice m_Choice;
-    bool m_bCleared = false;
+    bool m_bCleared = false; ///< the name stands, but its host is not followed
     bool m_bSelectionLinked = true;
     bool m_bCanComputeSelectionMagnitude = false;
     NotificationSystem::VSubscriptions m_TypeListSubscriptions;

@@ -7,6 +7,7 @@
 #include "ChannelSystemUtils/ChannelParameterNames.h"
 #include "ChannelSystemUtils/UnitText.h"
 #include "GraphPlotSystem/ChannelSubType.h"
+#include "GraphPlotSystem/StateResults.h"
 #include "TQL/ITraceId.h"
 
 #include <utility>
@@ -19,14 +20,6 @@ namespace
 QString Unknown()
 {
     return QStringLiteral("Unknown");
-}
-
-/// Of one after another: the first failure, else the first success with a remark.
-TQL::IResult CollectResult(TQL::IResult i_Kept, TQL::IResult i_Next)
-{
-    if (i_Kept.IsError() || (i_Next.IsSuccess() && i_Kept != TQL::Result::Ok))
-        return i_Kept;
-    return i_Next;
 }
 
 } // namespace
@@ -106,7 +99,7 @@ TQL::IResult VBaseChannelTextProvider::UpdateInputsLocked(const TQL::IChannel& i
     i_rChannel.GetDependentChannels(inputs);
     TQL::IResult result;
     for (const auto& rpInput : inputs)
-        result = CollectResult(result, UpdateLocked(rpInput, io_rbChanged));
+        result = WorseResult(result, UpdateLocked(rpInput, io_rbChanged));
     return result;
 }
 

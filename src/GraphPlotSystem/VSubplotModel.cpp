@@ -10,12 +10,29 @@
 #include <QtCore/QPointF>
 
 #include <algorithm>
+#include <optional>
 #include <utility>
 
 namespace GraphPlotUI
 {
 
 using namespace TQL::SubplotModelRoles;
+
+namespace
+{
+
+/// Views write a point, native code may write a ValueRange.
+std::optional<QPointF> RangeOf(const QVariant& i_rValue)
+{
+    if (i_rValue.metaType() == QMetaType::fromType<ValueRange>())
+    {
+        const auto range = i_rValue.value<ValueRange>();
+        return QPointF(range.Minimum, range.Maximum);
+    }
+    return i_rValue.canConvert<QPointF>() ? std::optional(i_rValue.value<QPointF>()) : std::nullopt;
+}
+
+} // namespace
 
 VSubplotModel::VSubplotModel(std::shared_ptr<TQL::ITraceDataStorage> i_pStorage, QObject* i_pParent)
     : QAbstractListModel(i_pParent), m_pStorage(std::move(i_pStorage))
@@ -74,10 +91,10 @@ QVariant VSubplotModel::data(const QModelIndex& i_rIndex, int i_Role) const
 
 bool VSubplotModel::setData(const QModelIndex& i_rIndex, const QVariant& i_rValue, int i_Role)
 {
+    const std::optional<QPointF> value = RangeOf(i_rValue);
     if (!checkIndex(i_rIndex, CheckIndexOption::IndexIsValid | CheckIndexOption::ParentIsInvalid) ||
-        i_Role != SubplotYAxisRange || !i_rValue.canConvert<QPointF>())
+        i_Role != SubplotYAxisRange || !value)
         return false;
-    const auto value = i_rValue.value<QPointF>();
     Ranges& rRanges = m_Ranges[At(i_rIndex.row()).Id];
     ValueRange& rRange = m_bFitYAxes ? rRanges.Fit : rRanges.Manual;
     bool bChanged = false;
@@ -88,8 +105,8 @@ bool VSubplotModel::setData(const QModelIndex& i_rIndex, const QVariant& i_rValu
         io_rStored = i_New;
         bChanged = true;
     };
-    store(rRange.Minimum, value.x());
-    store(rRange.Maximum, value.y());
+    store(rRange.Minimum, value->x());
+    store(rRange.Maximum, value->y());
     if (bChanged)
         Q_EMIT dataChanged(i_rIndex, i_rIndex, {SubplotYAxisRange});
     return true;

@@ -25,7 +25,7 @@ enum ESubplotModelRoles
     SubplotYAxisLabel = 256, ///< text
     SubplotYAxisUnits,       ///< rich text in brackets; empty for none
     SubplotYAxisToolTip,     ///< rich text
-    SubplotYAxisRange,       ///< QPointF: minimum, maximum; can be written
+    SubplotYAxisRange,       ///< QPointF: minimum, maximum; can be written, also as a ValueRange
     SubplotChannelModel,     ///< QObject*: the active channels that have a trace in the subplot
     SubplotTraces,           ///< list of TQL::ITraceId
     SubplotTraceModel,       ///< QObject*: a VTraceModel

@@ -1,9 +1,8 @@
 #include "ZarvoQtQuick/VQuickWidget.h"
 
+#include "IOInterfaceQt/QmlComponentFactory.h"
 #include "TQL/Log.h"
 
-#include <QtCore/QDir>
-#include <QtCore/QFileInfo>
 #include <QtQml/QQmlComponent>
 #include <QtQml/QQmlContext>
 #include <QtQml/QQmlEngine>
@@ -80,23 +79,11 @@ QStringList VQuickWidget::ImportPaths() const
     return engine()->importPathList();
 }
 
-QUrl VQuickWidget::FindComponent(const QString& i_rRelativeName) const
-{
-    const QString name = QDir::cleanPath(i_rRelativeName);
-    for (const QString& rFolder : m_SearchFolders)
-    {
-        const QString file = QDir::cleanPath(rFolder + QLatin1Char('/') + name);
-        if (QFileInfo(file).isFile())
-            return QUrl::fromLocalFile(file);
-    }
-    return QFileInfo::exists(QStringLiteral(":/") + name) ? QUrl(QStringLiteral("qrc:/") + name) : QUrl();
-}
-
 void VQuickWidget::SetSource(const QString& i_rRelativeName, const QStringList& i_rFolders)
 {
     ClearSource();
     m_SearchFolders = i_rFolders;
-    m_Source = FindComponent(i_rRelativeName);
+    m_Source = TQL::IO::FindComponentUrl(i_rRelativeName, m_SearchFolders);
     if (m_Source.isEmpty())
     {
         LogLine(TQL::ELogSeverity::Error, __LINE__,

@@ -46,7 +46,6 @@ Q_SIGNALS:
     void postPersistentPropertiesLoad();
 
 private:
-    QUrl FindComponent(const QString& i_rRelativeName) const;
     void OnComponentStatus();
     void CreateRoot();
 

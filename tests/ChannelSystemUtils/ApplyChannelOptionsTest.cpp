@@ -173,7 +173,7 @@ TEST(ApplyChannelOptions, NothingToApplyTo)
     EXPECT_EQ(service.pJournal->Take(), "");
 
     // The output of a channel that has gone is plotted as it is for as long as somebody holds it.
-    const auto pOrphan = std::make_shared<Output>(std::weak_ptr<TQL::IChannel>(), s_Position);
+    const auto pOrphan = std::make_shared<Output>(s_Position);
     EXPECT_EQ(ApplyChannelOptions(service, pOrphan, {}, pOutput), TQL::Result::Ok);
     EXPECT_EQ(pOutput, pOrphan);
     EXPECT_EQ(service.pJournal->Take(), "");

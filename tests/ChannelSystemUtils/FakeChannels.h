@@ -17,28 +17,12 @@ inline constexpr std::uint16_t Volt = 4;
 inline constexpr std::uint16_t Gram = 5;
 inline constexpr std::uint16_t NotInTheTable = 99;
 
-class Output : public FakeHost::View
-{
-public:
-    Output(std::weak_ptr<TQL::IChannel> i_pChannel, TQL::ComponentDescription i_Description)
-        : View(nullptr), m_pChannel(std::move(i_pChannel)), m_Description(std::move(i_Description))
-    {
-    }
-
-    std::shared_ptr<TQL::IChannel> GetChannel() const override { return m_pChannel.lock(); }
-    TQL::ComponentDescription GetDescription() const override { return m_Description; }
-
-private:
-    const std::weak_ptr<TQL::IChannel> m_pChannel;
-    const TQL::ComponentDescription m_Description;
-};
+using FakeHost::Output;
 
 class Channel : public FakeHost::Channel
 {
 public:
     using FakeHost::Channel::Channel;
-
-    std::shared_ptr<TQL::IChannelOutput> GetOutput() const override { return pOutput; }
 
     void SetText(const char* i_pName, const char* i_pText)
     {
@@ -51,8 +35,6 @@ public:
         const auto* pText = std::get_if<std::string>(&value);
         return pText ? *pText : "";
     }
-
-    std::shared_ptr<Output> pOutput;
 };
 
 class Service : public FakeHost::Service
@@ -104,7 +86,7 @@ public:
         if (TQL::ParameterValue value; rInput.pParameters->Read("", "SupportMagnitude", value).IsSuccess())
             (void)pChannel->pParameters->SetParameter("SupportMagnitude", value);
         if (WithoutOutput.contains(what))
-            pChannel->pOutput = nullptr;
+            pChannel->SetOutput(nullptr);
         return pChannel;
     }
 
@@ -113,7 +95,7 @@ public:
     {
         auto pChannel = std::make_shared<Channel>(TQL::IChannelInstanceId{"", "Internal", 0, 0, i_rName});
         pChannel->Description = i_rDescription;
-        pChannel->pOutput = std::make_shared<Output>(pChannel, i_rDescription);
+        pChannel->SetOutput(std::make_shared<Output>(i_rDescription, pChannel));
         m_Channels.push_back(pChannel);
         return pChannel;
     }

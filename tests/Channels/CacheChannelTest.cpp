@@ -31,12 +31,13 @@ protected:
             m_pLive->AddChannel({"SubjectSegmentPose", 0, 0, "", "Pelvis", "mm", {}}, 0, m_Segment).IsSuccess());
     }
 
-    void AddFrames(std::int64_t i_Count)
+    void AddFrames(std::int64_t i_Count, bool i_bMissing = false)
     {
         for (; i_Count > 0; --i_Count, ++m_Frames)
         {
             const auto frame = static_cast<double>(m_Frames);
-            const auto angle = static_cast<float>(std::remainder(frame, 2.0 * std::numbers::pi));
+            const auto angle =
+                i_bMissing ? std::nanf("") : static_cast<float>(std::remainder(frame, 2.0 * std::numbers::pi));
             const auto value = static_cast<float>(m_Frames);
             const std::vector<float> marker{value, -value, 0.0f};
             const std::vector<float> pose{0.0f, angle, 0.0f, value, 0.0f, 0.0f};
@@ -57,10 +58,16 @@ protected:
         return pCache;
     }
 
+    /// Once the channel has everything.
     static TickRange RangeInFrames(TQL::IChannel& i_rChannel)
     {
         TickRange range;
-        i_rChannel.GetOutput()->GetBlock()->GetRange(range);
+        TickRange before;
+        do
+        {
+            before = range;
+            i_rChannel.GetOutput()->GetBlock()->GetRange(range);
+        } while (range != before);
         return {range.First / Period, range.Last / Period};
     }
 
@@ -149,6 +156,26 @@ TEST_F(CacheChannel, UnwrapsFromTheFirstFrameThroughHistoryThatIsFetchedLater)
     expectOneRadianAFrame();
     const auto pBlock = pCache->GetOutput()->GetBlock();
     ASSERT_EQ(pBlock->GetShape().SummaryPeriods.size(), 24u);
+}
+
+TEST_F(CacheChannel, UnwrapsAcrossAGapThatTheWindowHadNarrowedInto)
+{
+    AddFrames(3000);
+    const auto pCache = MakeCache("SubjectSegmentPose", true, 10);
+    RangeInFrames(*pCache);
+    for (int batch = 0; batch < 25; ++batch) // until nothing but the gap is kept
+    {
+        AddFrames(100, true);
+        RangeInFrames(*pCache);
+    }
+    EXPECT_TRUE(pCache->GetParameters()->SetParameter("CacheRangeTicks", 4000 * Period).IsSuccess());
+    ASSERT_EQ(RangeInFrames(*pCache), (TickRange{1500, 5500}));
+    AddFrames(100);
+    std::vector<float> angles = ReadSecond(*pCache);
+    ASSERT_EQ(angles.size(), 4000u);
+    EXPECT_EQ(std::erase_if(angles, [](float i_Angle) { return std::isnan(i_Angle); }), 2500u);
+    for (std::size_t i = 1; i < angles.size(); ++i)
+        ASSERT_LT(std::abs(angles[i] - angles[i - 1]), std::numbers::pi + 1e-2) << "row " << i;
 }
 
 TEST_F(CacheChannel, SharesTheStoreOfItsInputWhereNothingIsAltered)

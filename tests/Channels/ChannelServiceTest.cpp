@@ -215,10 +215,10 @@ TEST(ChannelService, EveryCacheIsNewAndKnownWhileItLives)
     std::vector<std::shared_ptr<TQL::IChannel>> inputs;
     pFirst->GetDependentChannels(inputs);
     EXPECT_EQ(inputs, std::vector<std::shared_ptr<TQL::IChannel>>{pInput});
+    EXPECT_EQ(service.GetChannel(id), pSecond) << "the newest";
+    pSecond = nullptr;
     EXPECT_EQ(service.GetChannel(id), pFirst);
     pFirst = nullptr;
-    EXPECT_EQ(service.GetChannel(id), pSecond);
-    pSecond = nullptr;
     EXPECT_EQ(service.GetChannel(id), nullptr);
     EXPECT_EQ(service.CreateDerivedChannel("Cache", {}, {}), nullptr);
     EXPECT_EQ(service.CreateDerivedChannel("Cache", {}, {nullptr}), nullptr);

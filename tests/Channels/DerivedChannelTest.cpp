@@ -210,7 +210,9 @@ TEST_F(DerivedChannel, SameDerivationIsTheSameObjectWhileItLives)
     EXPECT_EQ(id.Text, "Position");
     EXPECT_EQ(m_Service.GetChannel(id), pFirst);
     Open(); // the same file again: other inputs
-    EXPECT_STREQ(compare(Make("Position(#0)-Position(#1)", "M0 M1")), "same id");
+    const Channel pAgain = Make("Position(#0)-Position(#1)", "M0 M1");
+    EXPECT_STREQ(compare(pAgain), "same id");
+    EXPECT_EQ(m_Service.GetChannel(id), pAgain) << "not what is left of the old one";
 }
 
 TEST_F(DerivedChannel, TextsAreSubstitutedAndInheritedAndFollowTheInputs)
@@ -344,6 +346,59 @@ TEST_F(DerivedChannel, NothingIsKeptTwice)
     EXPECT_EQ(ReadAll(*pPlotA).size(), 29u);
     EXPECT_EQ(samplesOf(pPlotA), samplesOf(pPlotB));
     EXPECT_EQ(samplesOf(pInner)->ByteCount(), 0u);
+
+    // Nor are rotations of a recording that were made continuous kept once a plot.
+    const Channel pUnwrapped = MakeCache(Source("Pelvis"), true);
+    EXPECT_EQ(samplesOf(pUnwrapped), samplesOf(MakeCache(Source("Pelvis"), true)));
+    EXPECT_NE(samplesOf(pUnwrapped), samplesOf(MakeCache(Source("Pelvis"), false)));
+}
+
+TEST_F(DerivedChannel, NoPlotWaitsForALongRecording)
+{
+    constexpr std::int64_t rows = 100000;
+    auto pRecording = std::make_shared<Recordings::VRecording>();
+    Recordings::RecordedChannel channel;
+    channel.Kind = EChannelKind::Marker;
+    channel.Units = "mm";
+    channel.ComponentNames.resize(3);
+    channel.Samples = RandomSamples(3 * rows, 7);
+    pRecording->Channels.push_back(channel);
+    pRecording->Range = channel.GetTickRange();
+    m_Service.AddContext(std::make_shared<Channels::VRecordedContext>("Day", m_Service.GetSubTypes(), pRecording));
+    const Channel pMetres =
+        Make(Algebra("meter(#0)"), {m_Service.GetChannel({"Day", "Labelled Reconstructions", 0, 0, ""})});
+    const Channel pPlot = MakeCache(pMetres);
+    const auto pOutput = pPlot->GetOutput();
+    const std::uint64_t token = pOutput->GetBlock()->GetStore()->AcquireLease(0);
+    TickRange range;
+    TickRange before;
+    int asked = 0;
+    do
+    {
+        before = range;
+        pOutput->GetBlock()->GetRange(range);
+        ASSERT_LE(range.Last - before.Last, 20000 * Period) << "at once";
+        ++asked;
+    } while (range != before);
+    EXPECT_EQ(range, (TickRange{0, rows * Period}));
+    EXPECT_GT(asked, 5);
+    EXPECT_FALSE(pOutput->IsStale());
+    EXPECT_EQ(pOutput->GetBlock()->GetStore()->AcquireLease(0), token) << "more of the same series";
+    const std::vector<float> values = ReadAll(*pPlot);
+    for (float& rValue : channel.Samples)
+        rValue = static_cast<float>(rValue * 0.001);
+    ASSERT_EQ(values.size(), channel.Samples.size());
+    for (std::size_t i = 0; i < values.size(); i += 3)
+        ASSERT_TRUE(std::isnan(values[i]) || values[i] == channel.Samples[i]) << i;
+    std::vector<LodRecord> records(3);
+    ASSERT_TRUE(pOutput->GetBlock()->Summarise(range, records).IsSuccess());
+    std::vector<float> first;
+    for (std::size_t i = 0; i < values.size(); i += 3)
+        first.push_back(values[i]);
+    EXPECT_TRUE(IsSame(records[0], SlowSummary(first)));
+
+    // Who reads a derived channel itself asks once.
+    EXPECT_EQ(ReadAll(*Make(Algebra("centimeter(#0)"), {pMetres})).size(), channel.Samples.size());
 }
 
 TEST_F(DerivedChannel, OutputComesGoesAndTurnsStaleWithThoseOfTheInputs)

@@ -24,11 +24,12 @@ struct Row
 };
 
 constexpr std::uint16_t Unknown = Expressions::IUnitTable::UnknownDimension;
-constexpr std::array<Row, 9> Bases{{
+constexpr std::array<Row, 10> Bases{{
     {"meter", "m", 0, 1.0},
     {"radian", "rad", 7, 1.0},
     {"degree", "deg", 7, std::numbers::pi / 180.0},
     {"second", "s", 2, 1.0},
+    {"hertz", "Hz", 9, 1.0},
     {"minute", "min", 2, 60.0},
     {"newton", "N", 10, 1.0},
     {"inch", "in", 0, 0.0254},

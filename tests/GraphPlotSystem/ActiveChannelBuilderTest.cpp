@@ -91,7 +91,8 @@ protected:
     TestSupport::LogGuard Log;
     std::shared_ptr<Host> pHost = std::make_shared<Host>();
     std::shared_ptr<TestSupport::ManualPostalService> pQueue = std::make_shared<TestSupport::ManualPostalService>();
-    std::unique_ptr<VActiveChannelModel> pModel = std::make_unique<VActiveChannelModel>(pQueue, pHost, pHost, nullptr);
+    std::unique_ptr<VActiveChannelModel> pModel =
+        std::make_unique<VActiveChannelModel>(pQueue, pHost->pTexts, pHost, nullptr);
     std::shared_ptr<VActiveChannelBuilder> pBuilder =
         TQL::MakeShared<VActiveChannelBuilder>(pQueue, pHost, pHost, pModel.get());
 };
@@ -147,7 +148,7 @@ TEST_F(Built, OutputsComeAndGo)
         {"lose b", "b"},
         {"deliver", ""}, // of the new object
     });
-    EXPECT_EQ(pHost->Get("Live/a")->pChanged->Count(), 0u);
+    EXPECT_EQ(pHost->Get("Live/a")->pParameters->pOutputChanged->Count(), 0u);
 }
 
 TEST_F(Built, OneRebuildServesABurst)
@@ -190,7 +191,7 @@ TEST_F(Built, LateNoticesDoNothing)
     Run("lose b");
     pBuilder.reset();
     EXPECT_EQ(Run("deliver"), "b"); // a notice on the way to a builder that is gone
-    EXPECT_EQ(pHost->Get("Live/b")->pChanged->Count(), 0u);
+    EXPECT_EQ(pHost->Get("Live/b")->pParameters->pOutputChanged->Count(), 0u);
 
     pBuilder = TQL::MakeShared<VActiveChannelBuilder>(pQueue, pHost, pHost, pModel.get());
     pBuilder->SetContextName("Live");

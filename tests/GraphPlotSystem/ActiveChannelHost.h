@@ -1,11 +1,9 @@
 #pragma once
 
-#include "ChannelSystem/IChannel.h"
 #include "ChannelSystem/IChannelSelectionManager.h"
-#include "ChannelSystem/IChannelService.h"
 #include "ChannelSystem/IChannelTypeRegistry.h"
-#include "GraphPlotSystem/IChannelTextProvider.h"
-#include "NotificationSystem/VMultiCallbackPostal.h"
+#include "GraphPlotSystem/FakeHost.h"
+#include "GraphPlotSystem/FakeTexts.h"
 #include "OrvanePluginInterface/IChannelMigrationService.h"
 
 #include <map>
@@ -16,86 +14,54 @@
 namespace ActiveChannelHost
 {
 
-struct Output : TQL::IChannelOutput
+struct Channel : FakeHost::Channel, std::enable_shared_from_this<Channel>
 {
-    explicit Output(std::weak_ptr<TQL::IChannel> i_pChannel) : pChannel(std::move(i_pChannel)) {}
-    std::shared_ptr<TQL::IChannel> GetChannel() const override { return pChannel.lock(); }
-    bool IsStale() const override { return false; }
-    std::shared_ptr<ChannelSystem::IChannelBlock> GetBlock() const override { return nullptr; }
-    TQL::ComponentDescription GetDescription() const override
-    {
-        TQL::ComponentDescription description;
-        description.FormatName = "Position";
-        return description;
-    }
-
-    const std::weak_ptr<TQL::IChannel> pChannel;
-};
-
-struct Channel : TQL::IChannel,
-                 TQL::IChannelParameters,
-                 TQL::IChannelChangeNotifier,
-                 std::enable_shared_from_this<Channel>
-{
-    std::shared_ptr<TQL::IChannelParameters> GetParameters() const override
-    {
-        return const_cast<Channel*>(this)->shared_from_this();
-    }
-    void GetDependentChannels(std::vector<std::shared_ptr<TQL::IChannel>>& o_rChannels) const override
-    {
-        o_rChannels = Inputs;
-    }
-    std::shared_ptr<TQL::IChannelOutput> GetOutput() const override { return pOutput; }
-    TQL::ComponentDescription GetDescription() const override { return {}; }
-    const TQL::IChannelInstanceId& GetInstanceId() const override { return Id; }
-    std::uint64_t GetRevision() const override { return 1; }
-
-    TQL::IResult Read(std::string_view, std::string_view, TQL::ParameterValue&) const override
-    {
-        return TQL::Result::NotFound;
-    }
-    TQL::IResult SetParameter(std::string_view, const TQL::ParameterValue&) override { return TQL::Result::NotFound; }
-    std::shared_ptr<TQL::IChannelChangeNotifier> GetChangeNotifier() override { return shared_from_this(); }
-    void GetErrors(std::vector<std::string>& o_rErrors) const override { o_rErrors = Errors; }
-    std::shared_ptr<void> AddOutputChangedCallback(std::function<void()> i_Callback,
-                                                   std::shared_ptr<TQL::IPostalService> i_pPostalService) override
-    {
-        const auto handle = pChanged->Add(std::move(i_Callback), std::move(i_pPostalService));
-        return {nullptr, [pSignal = pChanged, handle](void*)
-                {
-                    pSignal->Remove(handle);
-                }};
-    }
+    using FakeHost::Channel::Channel;
 
     void SetData(bool i_bData)
     {
-        pOutput = i_bData ? std::make_shared<Output>(weak_from_this()) : nullptr;
-        pChanged->Invoke();
+        SetOutput(i_bData ? std::make_shared<FakeHost::Output>(OutputDescription, weak_from_this()) : nullptr);
     }
 
-    TQL::IChannelInstanceId Id;
-    std::shared_ptr<TQL::IChannelOutput> pOutput;
-    std::vector<std::shared_ptr<TQL::IChannel>> Inputs;
-    std::vector<std::string> Errors;
-    std::shared_ptr<NotificationSystem::VChangeSignal> pChanged = std::make_shared<NotificationSystem::VChangeSignal>();
+    TQL::ComponentDescription OutputDescription{{}, false, "Position"};
 };
 
 inline std::shared_ptr<Channel> MakeChannel(const std::string& i_rContext, const std::string& i_rType,
                                             const std::string& i_rText, bool i_bData = true)
 {
-    auto pChannel = std::make_shared<Channel>();
-    pChannel->Id = {i_rContext, i_rType, 0, 0, i_rText};
+    auto pChannel = std::make_shared<Channel>(TQL::IChannelInstanceId{i_rContext, i_rType, 0, 0, i_rText});
     pChannel->SetData(i_bData);
     return pChannel;
 }
 
+/// "Type(a+b)".
+inline std::string MadeOf(std::string_view i_Type, const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs)
+{
+    std::string text(i_Type);
+    for (const auto& rpInput : i_rInputs)
+        text += (text == i_Type ? '(' : '+') + rpInput->GetInstanceId().Text;
+    return text + ")";
+}
+
+/// The name of a channel is the text of its id; nothing else is known of it.
+struct Texts : FakeTexts
+{
+    using FakeTexts::Update;
+    QString GetChannelDisplayName(const TQL::IChannelInstanceId& i_rChannel) const override
+    {
+        return QString::fromStdString(i_rChannel.Text.substr(0, i_rChannel.Text.find('~')));
+    }
+    TQL::IResult Update(const std::shared_ptr<TQL::IChannel>&) override { return TQL::Result::Failed; }
+};
+
 /// All of the host in one object, its tables open to the test.
-struct Host : ChannelSystem::IChannelService,
+struct Host : FakeHost::Service,
               TQL::IChannelSelectionManager,
               TQL::IChannelTypeRegistry,
-              TQL::IChannelTextProvider,
               OrvanePluginInterface::IChannelMigrationService
 {
+    Host() : FakeHost::Service(nullptr) {}
+
     using Channels = std::vector<std::shared_ptr<TQL::IChannel>>;
 
     /// The channel written "context/name", made when first asked for.
@@ -108,12 +74,9 @@ struct Host : ChannelSystem::IChannelService,
         return rpChannel;
     }
 
+    std::shared_ptr<TQL::IChangeSignal> TypeListChanged() const override { return {}; } // of service and registry
+
     // IChannelService
-    std::shared_ptr<ChannelSystem::IChannelContext> GetContextByName(std::string_view) const override { return {}; }
-    std::shared_ptr<TQL::IChangeSignal> ContextListChanged() const override { return {}; }
-    std::shared_ptr<TQL::IChangeSignal> TypeListChanged() const override { return {}; }
-    std::vector<std::string> GetChannelTypes(std::uint64_t, std::string_view) const override { return {}; }
-    std::shared_ptr<TQL::IChannelParameters> GetTypeParameters(std::string_view) const override { return {}; }
     std::shared_ptr<TQL::IChannel> CreateDerivedChannel(std::string_view i_Operation,
                                                         const ChannelSystem::VDerivedChannelParameters& i_rParameters,
                                                         const Channels& i_rInputs) override
@@ -137,7 +100,6 @@ struct Host : ChannelSystem::IChannelService,
     {
         return {std::shared_ptr<void>(), const_cast<Host*>(this)};
     }
-    TQL::IResult GetSubTypeTable(std::uint16_t, TQL::SubTypeRecord&) const override { return TQL::Result::NotFound; }
 
     // IChannelSelectionManager
     void GetSelectedChannelIds(std::string_view i_Context, std::string_view i_Type,
@@ -180,11 +142,8 @@ struct Host : ChannelSystem::IChannelService,
             o_rChannels = {nullptr, nullptr};
             return TQL::Result::Ok;
         }
-        std::string text(i_Type);
-        for (const auto& rpInput : i_rInputs)
-            text += (text == i_Type ? '(' : '+') + rpInput->GetInstanceId().Text;
-        const auto pChannel = MakeChannel("Live", std::string(i_Type), text + ")", i_Type != "Empty");
-        pChannel->Errors = {"no sense in it"};
+        const auto pChannel = MakeChannel("Live", std::string(i_Type), MadeOf(i_Type, i_rInputs), i_Type != "Empty");
+        pChannel->pParameters->Errors = {"no sense in it"};
         o_rChannels = {pChannel};
         return TQL::Result::Ok;
     }
@@ -195,25 +154,6 @@ struct Host : ChannelSystem::IChannelService,
         return TQL::Result::Ok;
     }
     bool CanComputeMagnitude(std::string_view, std::string_view) const override { return false; }
-
-    // IChannelTextProvider
-    QString GetChannelTypeName(const TQL::IChannelInstanceId&) const override { return {}; }
-    QString GetChannelDisplayName(const TQL::IChannelInstanceId& i_rChannel) const override
-    {
-        return QString::fromStdString(i_rChannel.Text.substr(0, i_rChannel.Text.find('~')));
-    }
-    std::uint64_t GetSubTypeId(const TQL::IChannelInstanceId&) const override { return 0; }
-    QString GetSubTypeDisplayName(std::uint64_t) const override { return {}; }
-    QString GetSubTypeUnits(std::uint64_t) const override { return {}; }
-    std::uint64_t GetComponentCount(std::uint64_t) const override { return 0; }
-    QString GetComponentName(const TQL::IChannelInstanceId&, std::uint64_t) const override { return {}; }
-    QString GetComponentName(std::uint64_t, std::uint64_t) const override { return {}; }
-    QString GetComponentUnits(std::uint64_t, std::uint64_t, bool) const override { return {}; }
-    QString GetCategory(const TQL::IChannelInstanceId&) const override { return {}; }
-    TQL::IResult Update(const std::shared_ptr<TQL::IChannel>&) override { return TQL::Result::Failed; }
-    void Update(std::span<const TQL::ITraceId>) override {}
-    std::shared_ptr<TQL::IChangeSignal> TextChanged() const override { return {}; }
-    void NotifyTextChanged() override {}
 
     // IChannelMigrationService: "x..." fails, "y..." finds nothing, "z..." only a fallback.
     TQL::IResult Migrate(const std::shared_ptr<TQL::IChannel>& i_rpChannel, std::string_view i_NewContext,
@@ -235,6 +175,7 @@ struct Host : ChannelSystem::IChannelService,
     std::map<std::string, std::int64_t, std::less<>> Creatable;
     std::string GlobalType = "Clock";
     std::map<std::tuple<std::string, std::uint64_t, Channels>, std::weak_ptr<TQL::IChannel>> Derived;
+    const std::shared_ptr<Texts> pTexts = std::make_shared<Texts>();
     Channels Kept; ///< the derived ones, whose outputs do not keep them
 };
 

@@ -143,7 +143,7 @@ protected:
     const std::shared_ptr<ChannelTypeHost::Host> m_pHost = ChannelTypeHost::MakeHost();
     const std::shared_ptr<TestSupport::ManualPostalService> m_pQueue =
         std::make_shared<TestSupport::ManualPostalService>();
-    VActiveChannelModel m_Model{m_pQueue, m_pHost, nullptr, nullptr};
+    VActiveChannelModel m_Model{m_pQueue, m_pHost->pTexts, nullptr, nullptr};
     VActiveChannelModel* m_pModel = &m_Model;
     std::shared_ptr<VActiveChannelManager> m_pManager;
     std::string m_Signals;
@@ -260,6 +260,12 @@ TEST_F(ActiveChannels, TheContextComesGoesAndChanges)
     EXPECT_EQ(subscribers(), 0U);
     Run({{"select Marker:n", "Auto/Marker mag | O:" POSE("m")}, {"context Other", "Auto/Marker mag | O:" POSE("n")}});
     EXPECT_EQ(subscribers(), 5U);
+    Run({{"global Clock", "Auto/Marker +Clock mag | O:" POSE("Clock") " O:" POSE("n")},
+         {"clear", "Auto/Marker +Clock mag | O:" POSE("Clock") " O:" POSE("n")}});
+    m_Model.clear();
+    QCoreApplication::processEvents();
+    EXPECT_EQ(State(), "Auto/Marker mag | ") << "the picker follows, and brings nothing back";
+    Run({{"context Other", "Auto/Marker mag | O:" POSE("n")}});
     Run({{"context ''", "Auto/Marker mag | "}, {"pick Force", "Force mag | "}});
     EXPECT_EQ(subscribers(), 0U);
 
@@ -273,7 +279,7 @@ TEST_F(ActiveChannels, TheContextComesGoesAndChanges)
 
 TEST_F(ActiveChannels, TheModelMayDieFirst)
 {
-    m_pModel = new VActiveChannelModel(m_pQueue, m_pHost, nullptr, nullptr);
+    m_pModel = new VActiveChannelModel(m_pQueue, m_pHost->pTexts, nullptr, nullptr);
     Make();
     Run({{"context Live", "Auto | "}, {"global Clock", "Auto +Clock | L:" POSE("Clock")}});
     m_pModel->clear();
@@ -337,8 +343,8 @@ TEST_F(ActiveChannels, StateComesBack)
 
 TEST_F(ActiveChannels, AHostWithoutRegistryPlotsItsOwnTypes)
 {
-    m_pHost->Listed[0].pParameters->Values["SupportMagnitude"] = true;
-    m_pHost->Listed[2].pParameters->Values["SupportMagnitude"] = false;
+    (void)m_pHost->Listed[0].pParameters->SetParameter("SupportMagnitude", true);
+    (void)m_pHost->Listed[2].pParameters->SetParameter("SupportMagnitude", false);
     Make(false);
     Run({
         {"context Live", "Auto | "},

@@ -111,7 +111,7 @@ protected:
     }
 
     std::shared_ptr<Host> pHost = std::make_shared<Host>();
-    VActiveChannelModel Model{nullptr, pHost, pHost, nullptr};
+    VActiveChannelModel Model{nullptr, pHost->pTexts, pHost, nullptr};
     Tester ModelTester{&Model, Tester::FailureReportingMode::Fatal};
     std::string Events;
 };

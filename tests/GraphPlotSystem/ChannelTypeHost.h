@@ -8,47 +8,21 @@
 namespace ChannelTypeHost
 {
 
-struct Parameters : TQL::IChannelParameters
+inline std::shared_ptr<FakeHost::Parameters> MakeParameters(const std::string& i_rName, const std::string& i_rCategory)
 {
-    TQL::IResult Read(std::string_view, std::string_view i_Name, TQL::ParameterValue& o_rValue) const override
-    {
-        const auto found = Values.find(i_Name);
-        if (found == Values.end())
-            return TQL::Result::NotFound;
-        o_rValue = found->second;
-        return TQL::Result::Ok;
-    }
-    TQL::IResult SetParameter(std::string_view, const TQL::ParameterValue&) override { return TQL::Result::Failed; }
-    std::shared_ptr<TQL::IChannelChangeNotifier> GetChangeNotifier() override { return nullptr; }
-    void GetErrors(std::vector<std::string>&) const override {}
-
-    std::map<std::string, TQL::ParameterValue, std::less<>> Values;
-};
-
-inline std::shared_ptr<Parameters> MakeParameters(const std::string& i_rName, const std::string& i_rCategory)
-{
-    auto pParameters = std::make_shared<Parameters>();
-    pParameters->Values["TypeDisplayName"] = i_rName;
+    auto pParameters = std::make_shared<FakeHost::Parameters>();
+    (void)pParameters->SetParameter("TypeDisplayName", i_rName);
     if (!i_rCategory.empty())
-        pParameters->Values["CategoryDisplayName"] = i_rCategory;
+        (void)pParameters->SetParameter("CategoryDisplayName", i_rCategory);
     return pParameters;
 }
 
-struct PoseOutput : ActiveChannelHost::Output
-{
-    using Output::Output;
-    TQL::ComponentDescription GetDescription() const override
-    {
-        return {{{true, {{1, boost::rational<std::int8_t>(1)}}}, {true, {{2, boost::rational<std::int8_t>(1)}}}},
-                false,
-                "Pose"};
-    }
-};
+inline const TQL::ComponentDescription s_Pose{{{true, {{1, 1}}}, {true, {{2, 1}}}}, false, "Pose"};
 
 struct ListedType
 {
     std::string Name;
-    std::shared_ptr<Parameters> pParameters; ///< null for a type without
+    std::shared_ptr<FakeHost::Parameters> pParameters; ///< null for a type without
     TQL::ESelectionKind Kind = TQL::ESelectionKind::None;
 };
 
@@ -60,8 +34,9 @@ struct Host : ActiveChannelHost::Host
         auto& rpChannel = Channels[i_rContext + "/" + i_rType + "/" + i_rName];
         if (!rpChannel)
         {
-            rpChannel = ActiveChannelHost::MakeChannel(i_rContext, i_rType, i_rName);
-            rpChannel->pOutput = std::make_shared<PoseOutput>(rpChannel);
+            rpChannel = ActiveChannelHost::MakeChannel(i_rContext, i_rType, i_rName, false);
+            rpChannel->OutputDescription = s_Pose;
+            rpChannel->SetData(true);
         }
         return rpChannel;
     }
@@ -168,10 +143,8 @@ struct Host : ActiveChannelHost::Host
     TQL::IResult CreateChannels(std::string_view i_Type, const Host::Channels& i_rInputs,
                                 Host::Channels& o_rChannels) override
     {
-        std::string text(i_Type);
-        for (const auto& rpInput : i_rInputs)
-            text += (text == i_Type ? '(' : '+') + rpInput->GetInstanceId().Text;
-        o_rChannels = {Make(i_rInputs[0]->GetInstanceId().DataContextName, std::string(i_Type), text + ")")};
+        o_rChannels = {Make(i_rInputs[0]->GetInstanceId().DataContextName, std::string(i_Type),
+                            ActiveChannelHost::MadeOf(i_Type, i_rInputs))};
         std::static_pointer_cast<ActiveChannelHost::Channel>(o_rChannels[0])->Inputs = i_rInputs;
         return TQL::Result::Ok;
     }

@@ -96,7 +96,26 @@ public:
     const std::shared_ptr<Block> pBlock;
 };
 
-class Parameters : public TQL::IChannelParameters
+/// The output of a channel that nobody reads samples from: it tells what it is. It does not keep its channel.
+class Output : public View
+{
+public:
+    explicit Output(TQL::ComponentDescription i_Description, std::weak_ptr<TQL::IChannel> i_pChannel = {})
+        : View(nullptr), m_pChannel(std::move(i_pChannel)), m_Description(std::move(i_Description))
+    {
+    }
+
+    std::shared_ptr<TQL::IChannel> GetChannel() const override { return m_pChannel.lock(); }
+    TQL::ComponentDescription GetDescription() const override { return m_Description; }
+
+private:
+    const std::weak_ptr<TQL::IChannel> m_pChannel;
+    const TQL::ComponentDescription m_Description;
+};
+
+class Parameters : public TQL::IChannelParameters,
+                   public TQL::IChannelChangeNotifier,
+                   public std::enable_shared_from_this<Parameters>
 {
 public:
     TQL::IResult Read(std::string_view, std::string_view i_Name, TQL::ParameterValue& o_rValue) const override
@@ -116,11 +135,23 @@ public:
             pJournal->Add(Owner + ": " + std::string(i_Name) + " = " + TextOf(i_rValue));
         return TQL::Result::Ok;
     }
-    std::shared_ptr<TQL::IChannelChangeNotifier> GetChangeNotifier() override { return nullptr; }
-    void GetErrors(std::vector<std::string>&) const override {}
+    std::shared_ptr<TQL::IChannelChangeNotifier> GetChangeNotifier() override { return shared_from_this(); }
+    void GetErrors(std::vector<std::string>& o_rErrors) const override { o_rErrors = Errors; }
+    std::shared_ptr<void> AddOutputChangedCallback(std::function<void()> i_Callback,
+                                                   std::shared_ptr<TQL::IPostalService> i_pPostalService) override
+    {
+        const auto handle = pOutputChanged->Add(std::move(i_Callback), std::move(i_pPostalService));
+        return {nullptr, [pSignal = pOutputChanged, handle](void*)
+                {
+                    pSignal->Remove(handle);
+                }};
+    }
 
     std::string Owner;
     std::shared_ptr<Journal> pJournal; ///< null tells nobody
+    std::vector<std::string> Errors;
+    const std::shared_ptr<NotificationSystem::VChangeSignal> pOutputChanged =
+        std::make_shared<NotificationSystem::VChangeSignal>();
 
 private:
     static std::string TextOf(const TQL::ParameterValue& i_rValue)
@@ -163,6 +194,16 @@ public:
         const std::lock_guard lock(m_Mutex);
         m_pView = i_bHasOutput ? std::make_shared<View>(std::move(i_pBlock)) : nullptr;
         return m_pView;
+    }
+
+    /// Null for no data. Tells of the change.
+    void SetOutput(std::shared_ptr<View> i_pOutput)
+    {
+        {
+            const std::lock_guard lock(m_Mutex);
+            m_pView = std::move(i_pOutput);
+        }
+        pParameters->pOutputChanged->Invoke();
     }
 
     const TQL::IChannelInstanceId Id;

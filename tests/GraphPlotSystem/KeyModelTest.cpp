@@ -10,40 +10,22 @@ using namespace TQL::KeyModelRoles;
 namespace
 {
 
-/// A channel whose output comes and goes, with as many components as it is told.
-class KeyChannel : public FakeHost::Channel
-{
-public:
-    KeyChannel(TQL::IChannelInstanceId i_Id, std::size_t i_Components)
-        : Channel(std::move(i_Id)), m_pOutput(std::make_shared<Output>())
-    {
-        m_pOutput->Description.Groups.resize(i_Components);
-    }
-    std::shared_ptr<TQL::IChannelOutput> GetOutput() const override { return bHasOutput ? m_pOutput : nullptr; }
-
-    bool bHasOutput = true;
-
-private:
-    struct Output : TQL::IChannelOutput
-    {
-        std::shared_ptr<TQL::IChannel> GetChannel() const override { return nullptr; }
-        bool IsStale() const override { return false; }
-        std::shared_ptr<ChannelSystem::IChannelBlock> GetBlock() const override { return nullptr; }
-        TQL::ComponentDescription GetDescription() const override { return Description; }
-
-        TQL::ComponentDescription Description;
-    };
-    const std::shared_ptr<Output> m_pOutput;
-};
-
 class KeyModel : public SubplotFixture
 {
 protected:
-    using ChannelPointer = std::shared_ptr<KeyChannel>;
+    using ChannelPointer = std::shared_ptr<FakeHost::Channel>;
 
+    static std::shared_ptr<FakeHost::View> MakeOutput(std::size_t i_Components)
+    {
+        TQL::ComponentDescription description;
+        description.Groups.resize(i_Components);
+        return std::make_shared<FakeHost::Output>(std::move(description));
+    }
     static ChannelPointer Make(const char* i_pType, const char* i_pName, std::size_t i_Components)
     {
-        return std::make_shared<KeyChannel>(FakeTexts::Id(i_pType, i_pName), i_Components);
+        auto pChannel = std::make_shared<FakeHost::Channel>(FakeTexts::Id(i_pType, i_pName));
+        pChannel->SetOutput(MakeOutput(i_Components));
+        return pChannel;
     }
     void Select(const std::vector<ChannelPointer>& i_rChannels)
     {
@@ -105,11 +87,11 @@ TEST_F(KeyModel, FollowsDataThatComeAndGo)
 {
     Select({pLasi, pEmg});
     ASSERT_TRUE(Model.setData(Model.index(0), true, KeyPinned));
-    pEmg->bHasOutput = false;
-    pLasi->bHasOutput = false;
+    pEmg->SetOutput(nullptr);
+    pLasi->SetOutput(nullptr);
     Select({pLasi, pEmg});
     EXPECT_EQ(Picture(), "Emg /0FL*?; LASI TX/0F?; ") << "one row for a channel without data";
-    pLasi->bHasOutput = true;
+    pLasi->SetOutput(MakeOutput(3));
     Select({pLasi});
     EXPECT_EQ(Picture(), "Emg /0FL*?; LASI TX/0F; LASI TY/1; LASI TZ/2L; ");
 }

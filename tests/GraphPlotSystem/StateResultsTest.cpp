@@ -28,6 +28,10 @@ TEST(StateResults, Combined)
     };
     for (const auto& rRow : rows)
         EXPECT_EQ(GraphPlotUI::CombineStateResults(rRow.Parts), rRow.Whole) << rRow.Parts.size();
+    EXPECT_EQ(GraphPlotUI::WorseResult(Result::OkButNoEffect, a), a);
+    EXPECT_EQ(GraphPlotUI::WorseResult(b, a), b);
+    EXPECT_EQ(GraphPlotUI::WorseResult(Result::OkButNoEffect, Result::OkButModified), Result::OkButNoEffect);
+    EXPECT_EQ(GraphPlotUI::WorseResult(Result::Ok, Result::OkButModified), Result::OkButModified);
 }
 
 } // namespace

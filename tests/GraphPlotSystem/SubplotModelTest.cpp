@@ -169,6 +169,9 @@ TEST_F(SubplotModel, RangesOfARowAreWrittenAndKept)
     EXPECT_FALSE(Model.setData(Model.index(0), "a word", SubplotYAxisRange));
     EXPECT_FALSE(Model.setData({}, QPointF(1, 2), SubplotYAxisRange));
     EXPECT_EQ(Journal.Take(), "");
+    EXPECT_TRUE(Model.setData(Model.index(0), QVariant::fromValue(ValueRange{-6, 6}), SubplotYAxisRange));
+    EXPECT_EQ(Range(), "-6..6");
+    EXPECT_TRUE(Write(-5, 5));
     EXPECT_EQ(Range(), "-5..5");
     Show({2});
     EXPECT_EQ(Range(), "0..1");

@@ -1,8 +1,11 @@
 #include "ChannelSystem/IChannel.h"
 #include "ChannelSystem/IChannelService.h"
 #include "ChannelSystem/IChannelTypeRegistry.h"
+#include "ChannelSystemUtils/DerivedRecords.h"
 #include "Channels/ContextThings.h"
 #include "Channels/VChannelService.h"
+#include "Channels/VLiveContext.h"
+#include "Channels/VLiveMonitors.h"
 #include "Channels/VRecordedContext.h"
 #include "OrvanePluginInterface/IChannelMigrationService.h"
 #include "Services/VCheckedChannels.h"
@@ -213,6 +216,15 @@ TEST_F(ChannelTypes, ChannelsMigrateByNameThenByNumber)
     EXPECT_EQ(migrate(Create("_DistanceBetween", {"Ann:RFHD", "Ann:Toe"})[0], "B"), "NotFound");
     EXPECT_EQ(migrate(m_pChannels->CreateDerivedChannel("Cache", {}, {Find("A", "Fx")}), "B"), "NotSupported");
     EXPECT_EQ(migrate(Find("A", "Fx"), "C"), "NotFound");
+
+    // A global channel stays what it is, and so does what is made from it.
+    const Channels::VLiveContext capture("Live", m_pService->GetSubTypes(), {});
+    m_pService->SetGlobalChannels(Channels::VLiveMonitors(capture, m_pService->GetSubTypes(), 120.0).GetContext());
+    const Channel pMonitor = m_pChannels->GetChannel({"", "Monitor", 1, 0, ""});
+    EXPECT_EQ(migrate(pMonitor, "B"), "same GlobalItems Relative frame rate");
+    const auto& rRecord = ChannelSystemUtils::GetDerivativeRecord(1, 0);
+    EXPECT_EQ(migrate(m_pChannels->CreateDerivedChannel("Derivative", rRecord, {pMonitor}), "B"),
+              "same GlobalItems Relative frame rate");
     EXPECT_EQ(migrate(nullptr, "B"), "InvalidArgument");
     EXPECT_EQ(m_Host.Faults(), std::vector<std::string>());
 }

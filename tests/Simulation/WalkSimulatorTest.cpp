@@ -1,3 +1,4 @@
+#include "Simulation/CameraRing.h"
 #include "Simulation/RecordWalk.h"
 #include "Simulation/VWalkSimulator.h"
 
@@ -240,6 +241,43 @@ TEST(WalkSimulator, AnalogFollowsTheFeet)
         EXPECT_GE(counts[pLabel], 4) << pLabel;
         EXPECT_LE(counts[pLabel], 6) << pLabel;
     }
+}
+
+TEST(CameraRing, CamerasLookAtTheMiddleAndStandUpright)
+{
+    // A vector turned about the pose's axis by its angle.
+    const auto turn = [](const std::array<float, 6>& i_rPose, const std::array<double, 3>& i_rVector)
+    {
+        const double x = i_rPose[0], y = i_rPose[1], z = i_rPose[2];
+        const double angle = std::sqrt(x * x + y * y + z * z);
+        const std::array<double, 3> axis{x / angle, y / angle, z / angle};
+        double along = 0.0;
+        for (std::size_t i = 0; i < 3; ++i)
+            along += axis[i] * i_rVector[i];
+        std::array<double, 3> turned{};
+        for (std::size_t i = 0; i < 3; ++i)
+        {
+            const std::size_t j = (i + 1) % 3, k = (i + 2) % 3;
+            turned[i] = i_rVector[i] * std::cos(angle) + axis[i] * along * (1.0 - std::cos(angle)) +
+                        (axis[j] * i_rVector[k] - axis[k] * i_rVector[j]) * std::sin(angle);
+        }
+        EXPECT_LE(angle, std::numbers::pi + 1e-6);
+        return turned;
+    };
+    std::set<std::array<float, 6>> poses;
+    for (std::uint32_t camera = 0; camera < Simulation::CameraCount; ++camera)
+    {
+        const auto pose = Simulation::CameraPoseOf(camera);
+        poses.insert(pose);
+        const auto view = turn(pose, {0.0, 0.0, -1.0});
+        const double distance = std::hypot(pose[3], pose[4], pose[5] - 1000.0);
+        const std::array<double, 3> hit{pose[3] + distance * view[0], pose[4] + distance * view[1],
+                                        pose[5] + distance * view[2]};
+        EXPECT_LT(std::hypot(hit[0], hit[1], hit[2] - 1000.0), 0.1) << camera;
+        EXPECT_NEAR(turn(pose, {1.0, 0.0, 0.0})[2], 0.0, 1e-6) << camera;
+        EXPECT_GT(turn(pose, {0.0, 1.0, 0.0})[2], 0.9) << camera;
+    }
+    EXPECT_EQ(poses.size(), Simulation::CameraCount);
 }
 
 } // namespace

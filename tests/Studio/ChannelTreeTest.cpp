@@ -130,22 +130,25 @@ TEST(ChannelTree, ASelectionFromOutsideIsTakenOverWithoutAnEcho)
 
 TEST(ChannelLeaves, NamesMakeTheBranchesAndPatternsFindThem)
 {
-    const std::vector<Studio::SelectableChannel> channels{
+    const std::vector<Studio::SelectableThing> channels{
         {"Walker1:LFHD", "Labelled Reconstructions", Marker(0, 0)},
         {"Walker1:Pelvis", "SubjectSegmentPose", {ESelectionKind::Segment, 0, 0, ""}},
         {"RSHO", "Labelled Reconstructions", Marker(1, 0)},
-        {"Fz1", "DeviceOutput", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}}};
+        {"Fz1", "DeviceOutput", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}},
+        {"Walker1", "", {ESelectionKind::Subject, 0, 0, ""}, {}, {"Pelvis"}}};
     std::string text;
     for (const ChannelTreeLeaf& rLeaf : Studio::MakeLeaves(channels))
         text += rLeaf.Branches.join("/").toStdString() + "=" + rLeaf.Text.toStdString() + "; ";
-    EXPECT_EQ(text, "Walker1/Markers=LFHD; Walker1/Segments=Pelvis; Markers=RSHO; Analog outputs=Fz1; ");
+    EXPECT_EQ(text, "Walker1/Markers=LFHD; Walker1/Segments=Pelvis; Markers=RSHO; Analog outputs=Fz1; "
+                    "Walker1=Subject (root segment Pelvis); ");
 
     static const struct
     {
         std::vector<std::string> Patterns;
         std::size_t Count;
         const char* pUnmatched;
-    } rows[] = {{{"Walker1:*"}, 2, ""}, {{"*"}, 4, ""}, {{"Fz?", "*"}, 4, ""}, {{"Fz1", "Fx1"}, 0, "Fx1"}, {{}, 0, ""}};
+    } rows[] = {{{"Walker1:*"}, 2, ""},     {{"*"}, 5, ""}, {{"Fz?", "*"}, 5, ""}, {{"Walker1"}, 1, ""},
+                {{"Fz1", "Fx1"}, 0, "Fx1"}, {{}, 0, ""}};
     for (const auto& rRow : rows)
     {
         std::string unmatched;

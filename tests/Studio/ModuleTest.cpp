@@ -1,3 +1,4 @@
+#include "Services/VSelectionSource.h"
 #include "Services/VTimeController.h"
 #include "Services/VTimeSource.h"
 #include "Simulation/RecordWalk.h"
@@ -13,10 +14,14 @@
 
 #include <gtest/gtest.h>
 
+#include <QtCore/QAbstractItemModel>
 #include <QtCore/QCoreApplication>
 #include <QtCore/QElapsedTimer>
 #include <QtCore/QTemporaryDir>
 #include <QtGui/QAction>
+#include <QtQml/QQmlContext>
+#include <QtQml/QQmlEngine>
+#include <QtQuick/QQuickItem>
 #include <QtQuickWidgets/QQuickWidget>
 #include <QtWidgets/QMdiArea>
 #include <QtWidgets/QMdiSubWindow>
@@ -142,6 +147,55 @@ TEST_F(StudioModule, TheRangesOfAContentCanBeSetFromOutside)
     EXPECT_TRUE(Studio::SetTimeRange(*pWidget, QPointF(10.0, 90.0)).IsSuccess());
     EXPECT_EQ(Studio::FindTraceManager(*pWidget)->property("timeRange").toPointF(), QPointF(10.0, 90.0));
     EXPECT_TRUE(Studio::SetValueRange(*pWidget, QPointF(-5.0, 5.0)).IsSuccess());
+}
+
+/// The channels that are plotted; ~ without data.
+std::string Rows(const QAbstractItemModel& i_rModel)
+{
+    std::string text;
+    for (int row = 0; row < i_rModel.rowCount(); ++row)
+    {
+        const QModelIndex index = i_rModel.index(row, 0);
+        const bool bMissing = index.data(i_rModel.roleNames().key("activeChannelMissingData", -1)).toBool();
+        text += (text.empty() ? "" : ", ") + index.data().toString().toStdString() + (bMissing ? "~" : "");
+    }
+    return text;
+}
+
+TEST_F(StudioModule, AMonitorIsPlottedInEveryContextAndByTheNextCapture)
+{
+    m_pSession->StartLive(1);
+    m_pSession->ShowContext(Studio::LiveContextName);
+    m_pSession->Host().Selection()->Set({{TQL::ESelectionKind::Monitor, 2, 0, ""}});
+    Studio::VPlotFrame frame;
+    std::string error;
+    ASSERT_TRUE(frame.Open(*m_pSession, error).IsSuccess()) << error;
+    frame.resize(900, 600);
+    frame.show();
+    QQuickWidget* pWidget = Studio::FindQuickWidget(*frame.Content());
+    ASSERT_TRUE(pWidget);
+    auto* pModel = qmlContext(pWidget->rootObject())
+                       ->contextProperty(QStringLiteral("contextActiveChannelModel"))
+                       .value<QAbstractItemModel*>();
+    ASSERT_TRUE(pModel);
+    int resets = 0;
+    QObject::connect(pModel, &QAbstractItemModel::modelReset, pModel, [&resets] { ++resets; });
+    const auto rowsAfter = [&](const std::function<void()>& i_rChange)
+    {
+        const int before = resets;
+        i_rChange();
+        EXPECT_TRUE(WaitFor([&] { return resets > before; })) << "the plot goes to another context";
+        WaitFor([&] { return Rows(*pModel) == "Monitor - Channels with data"; });
+        return Rows(*pModel);
+    };
+    const std::string expected = "Monitor - Channels with data";
+    EXPECT_EQ(rowsAfter([] {}), expected);
+    EXPECT_TRUE(WaitFor([&] { return Studio::HasTraceData(*pWidget); }));
+    EXPECT_EQ(rowsAfter([&] { m_pSession->StartLive(1); }), expected) << "of the next capture";
+    EXPECT_TRUE(WaitFor([&] { return Studio::HasTraceData(*pWidget); }));
+    EXPECT_EQ(rowsAfter([&] { m_pSession->ShowContext(AddWalk(120)); }), expected) << "in a recording";
+    m_pSession->StopLive();
+    EXPECT_EQ(rowsAfter([&] { m_pSession->ShowContext(Studio::LiveContextName); }), expected) << "it has ended";
 }
 
 } // namespace

@@ -98,7 +98,7 @@ TEST(SimulatedFeed, TheLiveContextHoldsWhatTheSimulatorGives)
     ASSERT_TRUE(feed.Produce(250, 3).IsSuccess());
     EXPECT_TRUE(feed.Produce(100, 1).IsError()) << "frames that are there already";
     EXPECT_EQ(pContext->GetTickRange(), (TQL::TickRange{0, 253 * TQL::DefaultFramePeriod}));
-    EXPECT_EQ(pContext->GetChannels()->size(), 2u * (53 + 20) + 16 + 1);
+    EXPECT_EQ(pContext->GetChannels()->size(), 2u * (53 + 20) + 16 + 8 + 1);
 
     // The recording of the same frames has the same samples under the same names.
     const Simulation::VWalkSimulator simulator({2, 4});

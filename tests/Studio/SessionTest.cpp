@@ -10,6 +10,7 @@
 #include "Studio/ChannelLeaves.h"
 #include "Studio/ContextNames.h"
 #include "Studio/PlotContent.h"
+#include "Studio/VContextSelection.h"
 #include "Studio/VMainWindow.h"
 #include "Studio/VStudioSession.h"
 #include "support/LogGuard.h"
@@ -28,6 +29,7 @@
 #include <QtWidgets/QTreeView>
 
 #include <filesystem>
+#include <map>
 #include <string>
 
 namespace
@@ -145,7 +147,7 @@ TEST_F(StudioSession, WhatIsSelectedIsAChannelOfTheContextShown)
     ASSERT_TRUE(m_Session.ShowContext(name));
     std::shared_ptr<ChannelSystem::IChannelService> pService;
     m_Session.Host().GetChannelService(pService);
-    const auto channels = Studio::ListChannels(*m_Session.CurrentContext());
+    const auto channels = Studio::ListThings(*m_Session.CurrentContext(), nullptr);
     ASSERT_EQ(channels.size(), 69u);
     for (const auto& rChannel : channels)
     {
@@ -155,6 +157,40 @@ TEST_F(StudioSession, WhatIsSelectedIsAChannelOfTheContextShown)
         ASSERT_EQ(ids.size(), 1u) << rChannel.Name;
         EXPECT_TRUE(pService->GetChannel(ids.front())) << rChannel.Name;
     }
+}
+
+TEST_F(StudioSession, EveryThingOfALiveCaptureIsSelectedAndFoundAgain)
+{
+    m_Session.StartLive(2, 12);
+    ASSERT_TRUE(m_Session.ShowContext(Studio::LiveContextName));
+    std::shared_ptr<ChannelSystem::IChannelService> pService;
+    m_Session.Host().GetChannelService(pService);
+    const auto pManager = pService->GetSelectionManager();
+    std::map<TQL::ESelectionKind, int> counts;
+    for (const auto& rThing :
+         Studio::ListThings(*m_Session.CurrentContext(), m_Session.Channels().GetGlobalChannels().get()))
+    {
+        ++counts[rThing.Item.Kind];
+        const bool bSubject = rThing.Item.Kind == TQL::ESelectionKind::Subject;
+        m_Session.Host().Selection()->Set({rThing.Item});
+        std::vector<TQL::IChannelInstanceId> ids;
+        pManager->GetSelectedChannelIds(Studio::LiveContextName, bSubject ? "SubjectSegmentPose" : rThing.TypeName,
+                                        ids);
+        ASSERT_EQ(ids.size(), 1u) << rThing.Name;
+        const auto pChannel = pService->GetChannel(ids.front());
+        ASSERT_TRUE(pChannel) << rThing.Name;
+        m_Session.Host().Selection()->Set({});
+        pManager->SelectThingsOf(pChannel, false);
+        const auto items = Studio::AllItems(*m_Session.Host().Selection()->GetSelection());
+        const TQL::SelectionItem root{TQL::ESelectionKind::Segment, rThing.Item.First, 0, {}};
+        EXPECT_EQ(items, std::vector<TQL::SelectionItem>{bSubject ? root : rThing.Item}) << rThing.Name;
+    }
+    using enum TQL::ESelectionKind;
+    EXPECT_EQ(counts,
+              (std::map<TQL::ESelectionKind, int>{
+                  {Label, 106}, {Segment, 40}, {Subject, 2}, {AnalogueDeviceOutput, 16}, {Camera, 8}, {Monitor, 2}}));
+    m_Session.Close();
+    EXPECT_EQ(m_Session.Faults(), std::vector<std::string>());
 }
 
 TEST_F(StudioSession, AModuleThatIsMissingOrNoneIsToldInOneLine)

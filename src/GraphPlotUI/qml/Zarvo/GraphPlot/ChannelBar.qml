@@ -1,5 +1,4 @@
 import QtQuick
-import QtQuick.Controls.Basic
 import Zarvo.GraphPlot 1.0
 
 // Plain boxes for what is plotted and how: types, formats, units, derivative, magnitude, layout.
@@ -50,11 +49,11 @@ Flow {
     }
     EnumBox {
         objectName: "derivativeBox"
-        enumModel: ListModel {
-            ListElement { key: qsTr("No derivative"); value: 0 }
-            ListElement { key: qsTr("1st derivative"); value: 1 }
-            ListElement { key: qsTr("2nd derivative"); value: 2 }
-        }
+        enumModel: [
+            { key: qsTr("No derivative"), value: 0 },
+            { key: qsTr("1st derivative"), value: 1 },
+            { key: qsTr("2nd derivative"), value: 2 }
+        ]
         value: root.manager.derivativeOrder
         prompt: qsTr("Derivative with respect to time")
         onChosen: value => root.manager.derivativeOrder = value

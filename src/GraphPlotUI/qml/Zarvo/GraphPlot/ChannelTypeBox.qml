@@ -28,18 +28,18 @@ ComboBox {
         required property bool channelTypeCategoryHeader
         required property bool channelTypeAvailable
 
-        width: root.width
+        width: ListView.view ? ListView.view.width : 0
         height: 26
         text: channelTypeDisplayName
         enabled: !channelTypeCategoryHeader
-        highlighted: root.highlightedIndex === index
+        highlighted: ListView.isCurrentItem
         opacity: channelTypeCategoryHeader || channelTypeAvailable ? 1 : 0.5
         leftPadding: channelTypeCategoryHeader ? 6 : 16
         font.bold: channelTypeCategoryHeader
         font.pixelSize: 12
     }
 
-    ToolTip.visible: hovered
+    ToolTip.visible: hovered && !popup.visible
     ToolTip.delay: 600
     ToolTip.text: prompt
 }

@@ -24,7 +24,7 @@ ComboBox {
     onValueChanged: _showValue()
     Component.onCompleted: _showValue()
 
-    ToolTip.visible: hovered
+    ToolTip.visible: hovered && !popup.visible
     ToolTip.delay: 600
     ToolTip.text: prompt
 }

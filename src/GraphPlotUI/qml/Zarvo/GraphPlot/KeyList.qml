@@ -31,7 +31,7 @@ ListView {
             color: row.model.keyColour ?? "transparent"
         }
         Text {
-            anchors { left: swatch.right; leftMargin: 6; right: pin.left; verticalCenter: parent.verticalCenter }
+            anchors { left: swatch.right; leftMargin: 6; right: pin.left; rightMargin: 6; verticalCenter: parent.verticalCenter }
             text: row.model.keyComponentName ? `${row.model.keyChannelName} : ${row.model.keyComponentName}`
                                              : row.model.keyChannelName
             textFormat: Text.PlainText
