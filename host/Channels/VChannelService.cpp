@@ -268,7 +268,7 @@ std::shared_ptr<TQL::IChannel> VChannelService::GetChannel(const TQL::IChannelIn
 void VChannelService::SetSelectionManager(std::shared_ptr<TQL::IChannelSelectionManager> i_pSelectionManager)
 {
     const std::unique_lock lock(m_Mutex);
-    m_pSelectionManager = std::move(i_pSelectionManager);
+    m_pSelectionManager.swap(i_pSelectionManager); // the old one goes after the mutex, with whoever listens to it
 }
 
 std::shared_ptr<TQL::IChannelSelectionManager> VChannelService::GetSelectionManager() const

@@ -44,16 +44,17 @@ std::shared_ptr<TQL::IChangeSignal> VSourceMap::Changed() const
 void VSourceMap::Insert(const std::string& i_rName, std::shared_ptr<VTimeSource> i_pSource)
 {
     const std::lock_guard lock(m_Mutex);
-    m_Sources.insert_or_assign(i_rName, std::move(i_pSource));
+    m_Sources[i_rName].swap(i_pSource); // one that stood there goes after the mutex, with whoever listens to it
 }
 
 bool VSourceMap::Erase(std::string_view i_Name)
 {
+    Sources::node_type gone; // destroyed after the mutex: what listens to the source may come back here
     const std::lock_guard lock(m_Mutex);
     const auto found = m_Sources.find(i_Name);
     if (found == m_Sources.end())
         return false;
-    m_Sources.erase(found);
+    gone = m_Sources.extract(found);
     return true;
 }
 

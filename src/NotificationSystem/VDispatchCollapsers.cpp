@@ -32,10 +32,12 @@ VDispatchCollapserDontPostIfAnotherQueued::VDispatchCollapserDontPostIfAnotherQu
 void VDispatchCollapserDontPostIfAnotherQueued::Post(Job i_Job, std::uint64_t i_Tag)
 {
     const auto pSelf = shared_from_this();
+    std::shared_ptr<const Job> pJob; // destroyed after the mutex is free, also where the wrapped service drops it
     const std::lock_guard lock(m_Mutex);
     if (m_bQueued)
         return;
-    m_pWrapped->Post([pSelf, job = std::move(i_Job)] { pSelf->Run(job); }, i_Tag);
+    pJob = std::make_shared<const Job>(std::move(i_Job));
+    m_pWrapped->Post([pSelf, pJob] { pSelf->Run(*pJob); }, i_Tag);
     m_bQueued = true;
 }
 

@@ -7,6 +7,7 @@
 #include <cstddef>
 #include <memory>
 #include <mutex>
+#include <utility>
 #include <vector>
 
 namespace NotificationSystem
@@ -16,8 +17,9 @@ template <typename Signature>
 class VMultiCallback;
 
 /// A list of subscribers that are called directly, in the order of adding. Thread-safe; no lock is held while a
-/// subscriber runs, so it may add or remove, itself too. One removed while a call is under way may still get that call.
-/// A subscriber whose weak target has died is dropped after the call that finds it so; other exceptions pass through.
+/// subscriber runs or is destroyed, so it may add or remove, itself too. One removed while a call is under way may
+/// still get that call. A subscriber whose weak target has died is dropped after the call that finds it so; other
+/// exceptions pass through.
 template <typename... Args>
 class VMultiCallback<void(Args...)> : public TQL::IMultiCallback<void(Args...)>
 {
@@ -29,13 +31,15 @@ public:
     {
         auto pStored = std::make_shared<const Callback>(std::move(i_Callback));
         const Handle handle = HandleOf(pStored);
+        std::shared_ptr<const List> pBefore; // let go of after the mutex: it may own callables that come back here
         const std::lock_guard lock(m_Mutex);
-        Replace([&](List& o_rList) { o_rList.push_back(std::move(pStored)); });
+        pBefore = Replace([&](List& o_rList) { o_rList.push_back(std::move(pStored)); });
         return handle;
     }
 
     std::size_t Remove(Handle i_Handle) override
     {
+        std::shared_ptr<const List> pBefore;
         const std::lock_guard lock(m_Mutex);
         const auto matches = [i_Handle](const Stored& i_rStored)
         {
@@ -43,17 +47,17 @@ public:
         };
         if (!m_pList || std::ranges::none_of(*m_pList, matches))
             return 0;
-        Replace([&](List& o_rList) { std::erase_if(o_rList, matches); });
+        pBefore = Replace([&](List& o_rList) { std::erase_if(o_rList, matches); });
         return 1;
     }
 
     std::size_t RemoveAll() override
     {
+        std::shared_ptr<const List> pBefore;
         const std::lock_guard lock(m_Mutex);
-        const std::size_t count = m_pList ? m_pList->size() : 0;
-        m_pList = nullptr;
+        m_pList.swap(pBefore);
         m_Empty.store(1, std::memory_order_release);
-        return count;
+        return pBefore ? pBefore->size() : 0;
     }
 
     std::size_t Count() const override
@@ -110,14 +114,15 @@ private:
 
     static Handle HandleOf(const Stored& i_rStored) { return reinterpret_cast<Handle>(i_rStored.get()); }
 
-    /// Copy on write: a running Invoke keeps the list that it took, and taking it copies one pointer.
+    /// Copy on write: a running Invoke keeps the list that it took, and taking it copies one pointer. Gives the list
+    /// that stood before.
     template <typename TChange>
-    void Replace(const TChange& i_rChange)
+    [[nodiscard]] std::shared_ptr<const List> Replace(const TChange& i_rChange)
     {
         auto pList = m_pList ? std::make_shared<List>(*m_pList) : std::make_shared<List>();
         i_rChange(*pList);
         m_Empty.store(pList->empty() ? 1 : 0, std::memory_order_release);
-        m_pList = std::move(pList);
+        return std::exchange(m_pList, std::move(pList));
     }
 
     mutable std::mutex m_Mutex;

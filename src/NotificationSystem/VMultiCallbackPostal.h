@@ -11,7 +11,8 @@ namespace NotificationSystem
 {
 
 /// The subscriber side of a signal that calls each subscriber through its postal service. Subscribers of one service
-/// share one inner list; the key null holds the direct ones. Thread-safe; no lock is held while a subscriber runs.
+/// share one inner list; the key null holds the direct ones. Thread-safe; no lock is held while a subscriber runs, or
+/// while one, or a postal service, is destroyed.
 template <typename Signature>
 class VMultiCallbackPostalBase;
 
@@ -39,21 +40,19 @@ public:
 
     std::size_t Remove(Handle i_Handle) override
     {
-        const std::lock_guard lock(m_Mutex);
         std::size_t removed = 0;
-        for (auto& [pService, pInner] : m_Inner)
+        for (const auto& [pService, pInner] : Snapshot())
             removed += pInner->Remove(i_Handle);
-        EraseEmptyLocked();
+        DropEmpty();
         return removed;
     }
 
     std::size_t RemoveAll() override
     {
-        const std::lock_guard lock(m_Mutex);
         std::size_t removed = 0;
-        for (auto& [pService, pInner] : m_Inner)
+        for (const auto& [pService, pInner] : Snapshot())
             removed += pInner->RemoveAll();
-        EraseEmptyLocked();
+        DropEmpty();
         return removed;
     }
 
@@ -84,20 +83,24 @@ protected:
     /// Copies of the lists that have subscribers.
     std::vector<Pair> Snapshot()
     {
+        InnerLists dropped;
         const std::lock_guard lock(m_Mutex);
-        EraseEmptyLocked();
+        dropped = TakeEmptyLocked();
         return std::vector<Pair>(m_Inner.begin(), m_Inner.end());
     }
 
     /// The direct list when it is the only one, else null: the usual case, taken without a copy of the map.
     std::shared_ptr<Inner> OnlyDirect()
     {
+        InnerLists dropped;
         const std::lock_guard lock(m_Mutex);
-        EraseEmptyLocked();
+        dropped = TakeEmptyLocked();
         return m_Inner.size() == 1 && !m_Inner.begin()->first ? m_Inner.begin()->second : nullptr;
     }
 
 private:
+    using InnerLists = std::map<std::shared_ptr<TQL::IPostalService>, std::shared_ptr<Inner>>;
+
     Handle AddFor(std::shared_ptr<TQL::IPostalService> i_pService, Callback i_Callback)
     {
         const std::lock_guard lock(m_Mutex);
@@ -109,15 +112,28 @@ private:
         return handle;
     }
 
-    void EraseEmptyLocked()
+    void DropEmpty()
     {
-        std::erase_if(m_Inner, [](const auto& i_rPair) { return i_rPair.second->IsEmpty(); });
+        InnerLists dropped;
+        const std::lock_guard lock(m_Mutex);
+        dropped = TakeEmptyLocked();
+    }
+
+    /// What is taken out may be the last owner of a postal service and of the jobs that wait in it, so it is let go of
+    /// after the mutex.
+    [[nodiscard]] InnerLists TakeEmptyLocked()
+    {
+        InnerLists taken;
+        for (auto next = m_Inner.begin(); next != m_Inner.end();)
+            if (const auto inner = next++; inner->second->IsEmpty())
+                taken.insert(m_Inner.extract(inner));
         m_NoSubscriber.store(m_Inner.empty() ? 1 : 0, std::memory_order_release);
+        return taken;
     }
 
     mutable std::mutex m_Mutex;
     const std::shared_ptr<TQL::IPostalService> m_pDefault;
-    std::map<std::shared_ptr<TQL::IPostalService>, std::shared_ptr<Inner>> m_Inner; // guarded by m_Mutex
+    InnerLists m_Inner; // guarded by m_Mutex
     std::atomic<std::uint64_t> m_NoSubscriber{1};
 };
 

@@ -15,7 +15,7 @@ template <typename TLists, typename TCount>
 std::size_t Sum(const TLists& i_rLists, const TCount& i_rCount)
 {
     std::size_t sum = i_rLists.pDirect ? i_rCount(*i_rLists.pDirect) : 0;
-    for (const auto& rpPosted : i_rLists.PostedLists)
+    for (const auto& rpPosted : i_rLists.Posted)
         sum += i_rCount(*rpPosted);
     return sum;
 }
@@ -33,7 +33,7 @@ std::shared_ptr<VHandlerCallback::Direct> VHandlerCallback::GetDirect()
 void VHandlerCallback::Post(TQL::ChangeFlags i_What, TQL::ChangeId i_Commit)
 {
     DropEmpty();
-    for (const auto& rpPosted : CopyLists().PostedLists)
+    for (const auto& rpPosted : CopyLists().Posted)
         rpPosted->Invoke(i_What, i_Commit);
 }
 
@@ -120,17 +120,20 @@ VHandlerCallback::Lists VHandlerCallback::CopyLists() const
     const std::lock_guard lock(m_Mutex);
     Lists lists{m_pDirect, {}};
     for (const auto& [pService, pPosted] : m_Posted)
-        lists.PostedLists.push_back(pPosted);
+        lists.Posted.push_back(pPosted);
     return lists;
 }
 
-/// Only lists without callables are destroyed here.
+/// The lists have no callables, but the services of the posted ones may own jobs: they go after the mutex.
 void VHandlerCallback::DropEmpty()
 {
+    PostedLists dropped;
     const std::lock_guard lock(m_Mutex);
     if (m_pDirect && m_pDirect->IsEmpty())
         m_pDirect.reset();
-    std::erase_if(m_Posted, [](const auto& i_rPair) { return i_rPair.second->Count() == 0; });
+    for (auto next = m_Posted.begin(); next != m_Posted.end();)
+        if (const auto posted = next++; posted->second->Count() == 0)
+            dropped.insert(m_Posted.extract(posted));
 }
 
 } // namespace Store

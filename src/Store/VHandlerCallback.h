@@ -14,7 +14,7 @@ namespace Store
 {
 
 /// A handler of one store: who subscribed for the changes of one key. Held by those who asked for it; the store refers
-/// to it weakly. No callable runs, and none is destroyed, while the handler's mutex is held.
+/// to it weakly. No callable runs, and no callable or postal service is destroyed, while the handler's mutex is held.
 class VHandlerCallback final : public TQL::IHandlerCallback, public std::enable_shared_from_this<VHandlerCallback>
 {
 public:
@@ -48,8 +48,9 @@ private:
     struct Lists
     {
         std::shared_ptr<Direct> pDirect;
-        std::vector<std::shared_ptr<Posted>> PostedLists;
+        std::vector<std::shared_ptr<VHandlerCallback::Posted>> Posted;
     };
+    using PostedLists = std::map<std::shared_ptr<TQL::IPostalService>, std::shared_ptr<Posted>>;
 
     Lists CopyLists() const;
     void DropEmpty();
@@ -57,9 +58,9 @@ private:
     const HandlerKey m_Key;
     TQL::ChangeFlags m_Pending;
     mutable std::mutex m_Mutex;
-    std::shared_ptr<TQL::IPostalService> m_pDefaultService;                           // guarded by m_Mutex
-    std::shared_ptr<Direct> m_pDirect;                                                // guarded by m_Mutex
-    std::map<std::shared_ptr<TQL::IPostalService>, std::shared_ptr<Posted>> m_Posted; // guarded by m_Mutex
+    std::shared_ptr<TQL::IPostalService> m_pDefaultService; // guarded by m_Mutex
+    std::shared_ptr<Direct> m_pDirect;                      // guarded by m_Mutex
+    PostedLists m_Posted;                                   // guarded by m_Mutex
 };
 
 } // namespace Store

@@ -103,9 +103,12 @@ std::shared_ptr<void> AddSink(Sink i_Sink)
                                  [pKey](void* i_pState)
                                  {
                                      LogState& rReleased = *static_cast<LogState*>(i_pState);
+                                     std::shared_ptr<const Sink> pGone; // what it owns may log: after the mutex
                                      const std::lock_guard lock(rReleased.m_Mutex);
-                                     std::erase_if(rReleased.m_Sinks,
-                                                   [pKey](const auto& i_rSink) { return i_rSink.get() == pKey; });
+                                     const auto found = std::ranges::find(
+                                         rReleased.m_Sinks, pKey, [](const auto& i_rpSink) { return i_rpSink.get(); });
+                                     pGone = std::move(*found);
+                                     rReleased.m_Sinks.erase(found);
                                  });
 }
 

@@ -70,4 +70,21 @@ TEST(Collapser, QueuedJobsKeepItAliveAndDeadTargetsPassQuietly)
     EXPECT_TRUE(traits.IsStrand()) << "traits come from the wrapped service";
 }
 
+TEST(Collapser, AJobThatIsDroppedMayPostAsItGoes)
+{
+    struct ClosedService : ManualPostalService
+    {
+        void Post(Job, std::uint64_t) override {}
+    };
+    const auto pCollapser = MakeCollapserDontPost(std::make_shared<ClosedService>());
+    bool bGone = false;
+    const auto comeBack = [&](void*)
+    {
+        pCollapser->Post([] {});
+        bGone = true;
+    };
+    pCollapser->Post([pOwned = std::shared_ptr<void>(nullptr, comeBack)] {});
+    EXPECT_TRUE(bGone);
+}
+
 } // namespace

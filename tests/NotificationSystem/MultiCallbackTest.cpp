@@ -6,6 +6,8 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
+#include <memory>
 #include <string>
 #include <thread>
 #include <vector>
@@ -121,6 +123,46 @@ TEST(MultiCallback, SubscribersMayChangeTheListWhileItRuns)
     log.clear();
     signal.Invoke(2);
     EXPECT_EQ(log, "bc");
+}
+
+/// What a subscriber may own: as it goes it comes back to where it was held.
+std::shared_ptr<void> AtTheEnd(std::function<void()> i_Call)
+{
+    return {nullptr, [call = std::move(i_Call)](void*)
+            {
+                call();
+            }};
+}
+
+TEST(MultiCallback, WhatGoesMayUnsubscribeFromTheSameSignal)
+{
+    using End = void (*)(Signal&, Signal::Handle);
+    const End ends[] = {[](Signal& io_rSignal, Signal::Handle i_Handle) { io_rSignal.Remove(i_Handle); },
+                        [](Signal& io_rSignal, Signal::Handle) { io_rSignal.RemoveAll(); },
+                        [](Signal& io_rSignal, Signal::Handle)
+                        {
+                            io_rSignal.Invoke(1);
+                        }};
+    for (const End end : ends)
+    {
+        Signal signal;
+        const auto other = signal.AddDirect([](int) {});
+        const auto handle = signal.AddDirect([pOwned = AtTheEnd([&] { signal.Remove(other); })](int)
+                                             { throw TQL::VDeregisterWeakCallbackException(); });
+        end(signal, handle);
+        EXPECT_EQ(signal.Count(), 0u);
+    }
+    struct Service : ManualPostalService
+    {
+        std::shared_ptr<void> pOwned;
+    };
+    Signal signal;
+    auto pService = std::make_shared<Service>();
+    const auto other = signal.AddDirect([](int) {});
+    pService->pOwned = AtTheEnd([&] { signal.Remove(other); });
+    const auto handle = signal.Add([](int) {}, std::move(pService));
+    EXPECT_EQ(signal.Remove(handle), 1u);
+    EXPECT_EQ(signal.Count(), 0u) << "the service went with its last subscriber";
 }
 
 TEST(MultiCallback, SubscriptionsEndWithTheirHolder)

@@ -255,10 +255,17 @@ TEST_F(TimeControllerTest, TellsOfSourcesAndOfTheModeOfTheCurrentOne)
     expect(3, 4, "replaced while not current");
 
     EXPECT_EQ(m_pController->GetSourceMap()->Changed(), m_pController->SourceListChanged());
-    AddReview("Jump", 0, 1);
     std::string names;
-    m_pController->GetSourceMap()->ForEach([&](const std::string& i_rName, const auto&) { names += i_rName + " "; });
+    const auto note = [&](void*)
+    {
+        m_pController->GetSourceMap()->ForEach([&](const std::string& i_rName, const auto&)
+                                               { names += i_rName + " "; });
+    };
+    AddReview("Jump", 0, 1)->StateChanged()->Add([pOwned = std::shared_ptr<void>(nullptr, note)] {}, nullptr);
+    note(nullptr);
     EXPECT_EQ(names, "Jump Live ");
+    EXPECT_TRUE(m_pController->RemoveSource("Jump"));
+    EXPECT_EQ(names, "Jump Live Live ") << "who listened to the source asks for the others as it goes";
 }
 
 TEST_F(TimeControllerTest, PlaysToTheEndAndStartsAgain)

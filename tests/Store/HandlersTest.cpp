@@ -187,6 +187,35 @@ TEST_F(HandlersTest, ADeadTargetIsDroppedAndAnInlineServiceMayWrite)
     EXPECT_EQ(pHandler->GetTotalSubscriptionCount(), 0u);
 }
 
+TEST_F(HandlersTest, WhatGoesWithASubscriptionMayComeBackToItsHandler)
+{
+    struct Service : TestSupport::ManualPostalService
+    {
+        std::shared_ptr<void> pOwned;
+    };
+    const auto pHandler = Handler({{Script.Entry("A")}, {}});
+    const auto owned = [&]
+    {
+        return std::shared_ptr<void>(nullptr,
+                                     [&](void*) { Log += std::to_string(pHandler->GetTotalSubscriptionCount()); });
+    };
+    for (const bool bClear : {false, true})
+    {
+        auto pService = std::make_shared<Service>();
+        pService->pOwned = owned();
+        Token direct = 0;
+        Token posted = 0;
+        EXPECT_TRUE(pHandler->SubscribeDirect(direct, [pOwned = owned()](ChangeFlags, ChangeId) {}).IsSuccess());
+        EXPECT_TRUE(pHandler->SubscribePostal(posted, std::move(pService), Note("posted"), 0).IsSuccess());
+        if (bClear)
+            EXPECT_EQ(pHandler->Clear(), 2u);
+        else
+            for (const Token token : {direct, posted})
+                EXPECT_EQ(pHandler->RemoveSubscription(token), 1u);
+        EXPECT_EQ(Take(), "10");
+    }
+}
+
 TEST_F(HandlersTest, NothingIsToldAfterClose)
 {
     const auto pHandler = Noting("A", {"A"});

@@ -32,7 +32,10 @@ TEST(Log, FormatsOnlyWhatTheThresholdAdmits)
         << "a failure of formatting falls back to the bare text as an error";
 
     pSink.reset();
-    const auto pOther = TQL::Log::AddSink([](const TQL::LogMessage&) {});
+    auto pLast = std::shared_ptr<void>(nullptr, [](void*) { TQL::Log::GetCategory("LogTest"); });
+    auto pOther = TQL::Log::AddSink([pOwned = std::move(pLast)](const TQL::LogMessage&) {});
+    pOther.reset(); // what a sink owned may use the log as it goes
+    pOther = TQL::Log::AddSink([](const TQL::LogMessage&) {});
     TQL::Log::Format(rCategory, ELogSeverity::Error, "Test", 5, "nobody");
     EXPECT_EQ(lines.size(), 3u);
 }
