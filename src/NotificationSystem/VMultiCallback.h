@@ -1,5 +1,6 @@
 #pragma once
 
+#include "NotificationSystem/VFirstFault.h"
 #include "TQL/IMultiCallback.h"
 
 #include <algorithm>
@@ -18,8 +19,8 @@ class VMultiCallback;
 
 /// A list of subscribers that are called directly, in the order of adding. Thread-safe; no lock is held while a
 /// subscriber runs or is destroyed, so it may add or remove, itself too. One removed while a call is under way may
-/// still get that call. A subscriber whose weak target has died is dropped after the call that finds it so; other
-/// exceptions pass through.
+/// still get that call. A subscriber whose weak target has died is dropped after the call that finds it so; any other
+/// exception passes through once all have been called.
 template <typename... Args>
 class VMultiCallback<void(Args...)> : public TQL::IMultiCallback<void(Args...)>
 {
@@ -92,6 +93,7 @@ public:
         if (!pSnapshot)
             return false;
         std::vector<Handle> dead;
+        VFirstFault fault;
         for (const Stored& rStored : *pSnapshot)
         {
             try
@@ -102,9 +104,14 @@ public:
             {
                 dead.push_back(HandleOf(rStored));
             }
+            catch (...)
+            {
+                fault.KeepCurrent();
+            }
         }
         for (const Handle handle : dead)
             Remove(handle);
+        fault.Rethrow();
         return true;
     }
 

@@ -30,11 +30,20 @@ std::shared_ptr<VHandlerCallback::Direct> VHandlerCallback::GetDirect()
     return m_pDirect;
 }
 
-void VHandlerCallback::Post(TQL::ChangeFlags i_What, TQL::ChangeId i_Commit)
+void VHandlerCallback::Post(TQL::ChangeFlags i_What, TQL::ChangeId i_Commit, NotificationSystem::VFirstFault& io_rFault)
 {
     DropEmpty();
     for (const auto& rpPosted : CopyLists().Posted)
-        rpPosted->Invoke(i_What, i_Commit);
+    {
+        try
+        {
+            rpPosted->Invoke(i_What, i_Commit);
+        }
+        catch (...)
+        {
+            io_rFault.KeepCurrent();
+        }
+    }
 }
 
 TQL::IHandlerCallbackProxy VHandlerCallback::GetProxy()

@@ -29,8 +29,8 @@ public:
 
     /// The direct subscribers, null when there are none.
     std::shared_ptr<Direct> GetDirect();
-    /// Posts the calls to the posted subscribers.
-    void Post(TQL::ChangeFlags i_What, TQL::ChangeId i_Commit);
+    /// Posts the calls to the posted subscribers; a service that fails keeps no other from its call.
+    void Post(TQL::ChangeFlags i_What, TQL::ChangeId i_Commit, NotificationSystem::VFirstFault& io_rFault);
 
     TQL::IHandlerCallbackProxy GetProxy() override;
     TQL::IResult Subscribe(Token& o_rToken, Callback i_Callback, std::uint32_t i_Option) override;

@@ -11,7 +11,35 @@ namespace Store
 namespace
 {
 
+using NotificationSystem::VFirstFault;
+
 const EntryPath s_NoPath;
+
+/// True while one of a thread's queues is being run, also where a callable throws.
+class ScopedFlag
+{
+public:
+    explicit ScopedFlag(bool& io_rbFlag) : m_rbFlag(io_rbFlag) { m_rbFlag = true; }
+    ~ScopedFlag() { m_rbFlag = false; }
+    ScopedFlag(const ScopedFlag&) = delete;
+    ScopedFlag& operator=(const ScopedFlag&) = delete;
+
+private:
+    bool& m_rbFlag;
+};
+
+template <typename TCallable>
+void RunGuarded(const TCallable& i_rCallable, VFirstFault& io_rFault)
+{
+    try
+    {
+        i_rCallable();
+    }
+    catch (...)
+    {
+        io_rFault.KeepCurrent();
+    }
+}
 
 void LogUnmatched(const char* i_pText)
 {
@@ -82,8 +110,10 @@ void VStore::EndRead()
     if (!m_Gate.EndRead(rSlot.Hold) || rSlot.Deferred.empty())
         return;
     const auto pKept = weak_from_this().lock();
+    VFirstFault fault;
     for (const auto& rCallable : std::exchange(rSlot.Deferred, {}))
-        rCallable();
+        RunGuarded(rCallable, fault);
+    fault.Rethrow();
 }
 
 TQL::IStoreWriter* VStore::BeginWrite()
@@ -96,68 +126,70 @@ void VStore::EndWrite()
     ThreadSlot& rSlot = m_Slots.OfThisThread();
     if (rSlot.Hold.Depth == 0 || rSlot.Hold.Mode == EGateMode::Read)
         return LogUnmatched("A write of a store was ended on a thread that had begun none.");
-    std::shared_ptr<const Notices> pNotices;
-    if (!m_Gate.EndWrite(rSlot.Hold, [&](std::uint64_t i_Id) { pNotices = Commit(TQL::ChangeId(i_Id)); }))
+    std::shared_ptr<const CommitNotices> pNotices;
+    if (!m_Gate.EndWrite(rSlot.Hold, [&](std::uint64_t i_Id) { pNotices = Commit(rSlot, TQL::ChangeId(i_Id)); }))
         return;
     const auto pKept = weak_from_this().lock();
-    if (!pNotices->bClosed && !pNotices->List.empty())
-    {
-        PostNotices();
+    VFirstFault fault;
+    PostNotices(rSlot, fault);
+    if (!pNotices->bClosed)
         QueueDirectCalls(rSlot, *pNotices);
-    }
     pNotices.reset();
     for (auto& rCallable : std::exchange(rSlot.Deferred, {}))
         rSlot.DirectCalls.push_back(std::move(rCallable));
-    RunDirectCalls(rSlot);
+    RunDirectCalls(rSlot, fault);
+    fault.Rethrow();
 }
 
-/// Under m_Mutex: what is returned keeps handlers alive, so it must be let go of after that.
-std::shared_ptr<const VStore::Notices> VStore::Commit(TQL::ChangeId i_Id)
+/// Under m_Mutex: what is returned keeps handlers alive, so it must be let go of after that. A turn that was given out
+/// has to be taken, so nothing may fail after that.
+std::shared_ptr<const CommitNotices> VStore::Commit(ThreadSlot& io_rSlot, TQL::ChangeId i_Id)
 {
     VCommit commit(m_Table, m_Staging, m_Handlers, i_Id);
     commit.Run();
     for (const QueuedNotice& rNotice : std::exchange(m_QueuedNotices, {}))
         commit.Tell(rNotice);
-    auto pNotices = std::make_shared<const Notices>(Notices{m_Handlers.TakeNotices(), i_Id, m_bClosed});
+    auto pNotices = std::make_shared<CommitNotices>(CommitNotices{m_Handlers.TakeNotices(), i_Id, m_bClosed, 0});
     if (!pNotices->bClosed && !pNotices->List.empty())
     {
+        io_rSlot.ToPost.push_back(pNotices);
         const std::lock_guard lock(m_PostMutex);
-        m_ToPost.push_back(pNotices);
+        pNotices->Turn = ++m_LastTurn;
     }
     return pNotices;
 }
 
-/// A commit that another thread makes meanwhile is posted by the thread that already posts, so calls stay in order
-/// although no lock is held while a service is called.
-void VStore::PostNotices()
+/// A commit that is made inside Post, by a service that runs jobs there, is posted by the call outside.
+void VStore::PostNotices(ThreadSlot& io_rSlot, VFirstFault& io_rFault)
 {
-    std::unique_lock lock(m_PostMutex);
-    if (m_bPosting)
+    if (io_rSlot.bPosting)
         return;
-    m_bPosting = true;
-    while (!m_ToPost.empty())
+    const ScopedFlag posting(io_rSlot.bPosting);
+    while (!io_rSlot.ToPost.empty())
     {
-        auto pNotices = std::move(m_ToPost.front());
-        m_ToPost.pop_front();
-        lock.unlock();
-        try
-        {
-            for (const auto& [pHandler, what] : pNotices->List)
-                pHandler->Post(what, pNotices->Commit);
-        }
-        catch (...)
-        {
-            lock.lock();
-            m_bPosting = false;
-            throw;
-        }
-        pNotices.reset();
-        lock.lock();
+        const auto pNotices = std::move(io_rSlot.ToPost.front());
+        io_rSlot.ToPost.pop_front();
+        PostInTurn(*pNotices, io_rFault);
     }
-    m_bPosting = false;
 }
 
-void VStore::QueueDirectCalls(ThreadSlot& io_rSlot, const Notices& i_rNotices)
+/// No lock is held while a service is called; the turn keeps the calls of several threads in order.
+void VStore::PostInTurn(const CommitNotices& i_rNotices, VFirstFault& io_rFault)
+{
+    {
+        std::unique_lock lock(m_PostMutex);
+        m_TurnMoved.wait(lock, [&] { return m_Posted + 1 == i_rNotices.Turn; });
+    }
+    for (const auto& [rpHandler, what] : i_rNotices.List)
+        RunGuarded([&] { rpHandler->Post(what, i_rNotices.Commit, io_rFault); }, io_rFault);
+    {
+        const std::lock_guard lock(m_PostMutex);
+        m_Posted = i_rNotices.Turn;
+    }
+    m_TurnMoved.notify_all();
+}
+
+void VStore::QueueDirectCalls(ThreadSlot& io_rSlot, const CommitNotices& i_rNotices)
 {
     for (const auto& [pHandler, what] : i_rNotices.List)
         if (auto pDirect = pHandler->GetDirect())
@@ -166,22 +198,16 @@ void VStore::QueueDirectCalls(ThreadSlot& io_rSlot, const Notices& i_rNotices)
 }
 
 /// A commit made by one of the calls adds to the queue that is being run.
-void VStore::RunDirectCalls(ThreadSlot& io_rSlot)
+void VStore::RunDirectCalls(ThreadSlot& io_rSlot, VFirstFault& io_rFault)
 {
-    if (io_rSlot.DirectNesting != 0)
+    if (io_rSlot.bCalling)
         return;
-    struct Nesting
-    {
-        std::uint32_t& rCount;
-        explicit Nesting(std::uint32_t& io_rCount) : rCount(io_rCount) { ++rCount; }
-        ~Nesting() { --rCount; }
-    };
-    const Nesting nesting(io_rSlot.DirectNesting);
+    const ScopedFlag calling(io_rSlot.bCalling);
     while (!io_rSlot.DirectCalls.empty())
     {
         const auto call = std::move(io_rSlot.DirectCalls.front());
         io_rSlot.DirectCalls.pop_front();
-        call();
+        RunGuarded(call, io_rFault);
     }
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "NotificationSystem/VFirstFault.h"
 #include "Store/EntryPatterns.h"
 #include "Store/VCommit.h"
 #include "Store/VEntryTable.h"
@@ -10,7 +11,8 @@
 #include "StoreInterface/IStore.h"
 #include "TQL/VShared.h"
 
-#include <deque>
+#include <condition_variable>
+#include <cstdint>
 #include <functional>
 #include <memory>
 #include <mutex>
@@ -23,9 +25,20 @@ namespace Store
 class VStoreReader;
 class VStoreWriter;
 
+/// What one commit told.
+struct CommitNotices
+{
+    NoticeList List;
+    TQL::ChangeId Commit;
+    bool bClosed = false;   ///< nobody is to be told
+    std::uint64_t Turn = 0; ///< in the order of posting; 0 where nothing is to be posted
+};
+
 /// The store. Made by TQL::MakeShared; handlers refer to it weakly and do nothing once it is gone. Its mutex guards the
 /// gate, the table of entries and the handlers, and is held during a commit; no callable runs and no handler is
-/// destroyed under it. What was told is posted in the order of commits, by one thread at a time.
+/// destroyed under it. What was told is posted in the order of commits: EndWrite waits until the threads that committed
+/// before have posted, and returns when its own notices are posted. An exception of a callable or of a postal service
+/// leaves EndWrite or EndRead after all the others have been told.
 class VStore final : public TQL::IStore, public TQL::VShared
 {
 public:
@@ -71,18 +84,11 @@ public:
     }
 
 private:
-    /// What one commit told.
-    struct Notices
-    {
-        NoticeList List;
-        TQL::ChangeId Commit;
-        bool bClosed = false; ///< nobody is to be told
-    };
-
-    std::shared_ptr<const Notices> Commit(TQL::ChangeId i_Id);
-    void PostNotices();
-    static void QueueDirectCalls(ThreadSlot& io_rSlot, const Notices& i_rNotices);
-    static void RunDirectCalls(ThreadSlot& io_rSlot);
+    std::shared_ptr<const CommitNotices> Commit(ThreadSlot& io_rSlot, TQL::ChangeId i_Id);
+    void PostNotices(ThreadSlot& io_rSlot, NotificationSystem::VFirstFault& io_rFault);
+    void PostInTurn(const CommitNotices& i_rNotices, NotificationSystem::VFirstFault& io_rFault);
+    static void QueueDirectCalls(ThreadSlot& io_rSlot, const CommitNotices& i_rNotices);
+    static void RunDirectCalls(ThreadSlot& io_rSlot, NotificationSystem::VFirstFault& io_rFault);
     void ReleaseHandler(VHandlerCallback& i_rHandler);
 
     const std::shared_ptr<void> m_pOwner;
@@ -97,9 +103,10 @@ private:
     std::unique_ptr<VStoreReader> m_pReader;
     std::unique_ptr<VStoreWriter> m_pWriter;
 
-    std::mutex m_PostMutex;                              // taken after m_Mutex, never before it
-    std::deque<std::shared_ptr<const Notices>> m_ToPost; // guarded by m_PostMutex; in the order of commits
-    bool m_bPosting = false;                             // guarded by m_PostMutex
+    std::mutex m_PostMutex; // taken after m_Mutex, never before it
+    std::condition_variable m_TurnMoved;
+    std::uint64_t m_LastTurn = 0; // guarded by m_PostMutex; given out
+    std::uint64_t m_Posted = 0;   // guarded by m_PostMutex; the last turn that is through
 };
 
 } // namespace Store

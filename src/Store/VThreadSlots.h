@@ -6,19 +6,24 @@
 #include <cstdint>
 #include <deque>
 #include <functional>
+#include <memory>
 #include <vector>
 
 namespace Store
 {
+
+struct CommitNotices;
 
 /// What one thread keeps about one store. Only that thread touches it.
 struct ThreadSlot
 {
     std::uint64_t StoreSerial = 0;
     GateHold Hold;
-    std::vector<std::function<void()>> Deferred;   ///< run when the thread holds no access any more
+    std::vector<std::function<void()>> Deferred;             ///< run when the thread holds no access any more
+    std::deque<std::shared_ptr<const CommitNotices>> ToPost; ///< of this thread's commits, in their order
+    bool bPosting = false;
     std::deque<std::function<void()>> DirectCalls; ///< notices of this thread's commits, in their order
-    std::uint32_t DirectNesting = 0;               ///< above 0 while direct calls run
+    bool bCalling = false;                         ///< while direct calls run
 };
 
 /// Gives each thread its slot for one store. The store owns it. Stores number themselves by the lowest free number, so

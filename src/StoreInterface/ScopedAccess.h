@@ -13,7 +13,7 @@ class ScopedRead
 {
 public:
     explicit ScopedRead(IStore& i_rStore) : m_rStore(i_rStore), m_rReader(i_rStore.BeginRead()) {}
-    ~ScopedRead() { m_rStore.EndRead(); }
+    ~ScopedRead() noexcept(false) { m_rStore.EndRead(); } // deferred callables may throw
     ScopedRead(const ScopedRead&) = delete;
     ScopedRead& operator=(const ScopedRead&) = delete;
 

@@ -216,6 +216,92 @@ TEST_F(HandlersTest, WhatGoesWithASubscriptionMayComeBackToItsHandler)
     }
 }
 
+TEST_F(HandlersTest, WhoThrowsCostsNobodyElseANotice)
+{
+    struct FullService : InlineService
+    {
+        void Post(Job, std::uint64_t) override { throw std::runtime_error("no room"); }
+    };
+    const auto pService = std::make_shared<TestSupport::ManualPostalService>();
+    const auto pThrowing = Handler({{Script.Entry("A")}, {}});
+    Token token = 0;
+    const auto fail = [](ChangeFlags, ChangeId)
+    {
+        throw std::runtime_error("a fault");
+    };
+    EXPECT_TRUE(pThrowing->SubscribeDirect(token, fail).IsSuccess());
+    EXPECT_TRUE(pThrowing->SubscribeDirect(token, Note("beside")).IsSuccess());
+    EXPECT_TRUE(pThrowing->SubscribePostal(token, std::make_shared<FullService>(), fail, 0).IsSuccess());
+    EXPECT_TRUE(pThrowing->SubscribePostal(token, pService, Note("posted"), 0).IsSuccess());
+    const auto pOther = Noting("other", {"B"});
+    EXPECT_TRUE(pOther->SubscribePostal(token, pService, Note("posted"), 0).IsSuccess());
+    for (const bool bNew : {true, false})
+    {
+        const std::string what = bNew ? "(Verified Created) " : "(Verified) ";
+        EXPECT_THROW(
+            {
+                TQL::ScopedWrite writer(Script.Get());
+                writer->Defer([&] { Log += "deferred "; });
+                for (const char* const pPath : {"A", "B"})
+                    (void)writer->SetValue(Script.Entry(pPath), Store::MakeValue(bNew ? 1 : 2));
+            },
+            std::runtime_error);
+        EXPECT_EQ(Take(), "beside" + what + "other" + what + "deferred ");
+        pService->RunAll();
+        EXPECT_EQ(Take(), "posted" + what + "posted" + what);
+        EXPECT_EQ(Guard.Take().size(), 1u) << "the second of two faults is in the log";
+    }
+    EXPECT_THROW(
+        {
+            const TQL::ScopedRead reader(Script.Get());
+            reader->Defer([] { throw std::runtime_error("a fault"); });
+            reader->Defer([&] { Log += "deferred"; });
+        },
+        std::runtime_error);
+    EXPECT_EQ(Take(), "deferred");
+}
+
+TEST_F(HandlersTest, AWriteEndsWithItsNoticesPosted)
+{
+    /// While it takes a job another thread commits.
+    struct SlowService : InlineService
+    {
+        void Post(Job, std::uint64_t) override { Meanwhile(); }
+        std::function<void()> Meanwhile;
+    };
+    const auto pFirst = std::make_shared<SlowService>();
+    const auto pSecond = std::make_shared<TestSupport::ManualPostalService>();
+    Token token = 0;
+    const auto pA = Handler({{Script.Entry("A")}, {}});
+    const auto pB = Handler({{Script.Entry("B")}, {}});
+    EXPECT_TRUE(pA->SubscribePostal(token, pFirst, Note("A"), 0).IsSuccess());
+    EXPECT_TRUE(pB->SubscribePostal(token, pSecond, Note("B"), 0).IsSuccess());
+    for (int i = 1; i <= 20; ++i)
+    {
+        std::size_t posted = 0;
+        std::jthread other;
+        const std::string value = std::to_string(i);
+        pFirst->Meanwhile = [&]
+        {
+            other = std::jthread(
+                [&]
+                {
+                    {
+                        TQL::ScopedWrite writer(Script.Get());
+                        (void)writer->SetValue(Script.Entry("B"), Store::MakeValue(i));
+                    }
+                    posted = pSecond->Pending();
+                });
+            while (Script.State("B") != value + " - - 0")
+                std::this_thread::yield();
+        };
+        Script.Write("A=" + value);
+        other.join();
+        EXPECT_EQ(posted, 1u);
+        pSecond->RunAll();
+    }
+}
+
 TEST_F(HandlersTest, NothingIsToldAfterClose)
 {
     const auto pHandler = Noting("A", {"A"});

@@ -148,7 +148,7 @@ TEST(ThreadSlots, ANewStoreNeverFindsWhatAnEarlierOneLeft)
     auto pFirst = std::make_unique<VThreadSlots>();
     const VThreadSlots second;
     ThreadSlot& rOther = second.OfThisThread();
-    rOther.DirectNesting = 7;
+    rOther.bCalling = true;
     pFirst->OfThisThread().Hold.Depth = 3;
     pFirst->OfThisThread().Deferred.emplace_back([] {});
     std::thread([&] { EXPECT_EQ(pFirst->OfThisThread().Hold.Depth, 0u); }).join();
@@ -158,7 +158,7 @@ TEST(ThreadSlots, ANewStoreNeverFindsWhatAnEarlierOneLeft)
     EXPECT_EQ(third.OfThisThread().Hold.Depth, 0u);
     EXPECT_TRUE(third.OfThisThread().Deferred.empty());
     EXPECT_EQ(&second.OfThisThread(), &rOther);
-    EXPECT_EQ(rOther.DirectNesting, 7u);
+    EXPECT_TRUE(rOther.bCalling);
 }
 
 } // namespace
