@@ -290,7 +290,10 @@ TQL::IResult VStoreWriter::SetValueSchema(EntryHandle i_Entry, const TQL::ISchem
     if (!pSchema)
     {
         const bool bVoid = rUnique.Type == TQL::EType::Void;
-        m_rStore.Staging().Stage(*pEntry).pSchema = bVoid ? nullptr : &rUnique;
+        VStaging& rStaging = m_rStore.Staging();
+        // A removed entry stays so, but one that comes into being needs all above it.
+        EntryChange& rChange = pEntry->pData ? rStaging.Stage(*pEntry) : rStaging.Write(*pEntry);
+        rChange.pSchema = bVoid ? nullptr : &rUnique;
         return TQL::Result::Ok;
     }
     if (pSchema == &rUnique)
