@@ -1,5 +1,6 @@
 #include "StoreIO/VStoreVersionedIO.h"
 
+#include "Store/VStore.h"
 #include "StoreIO/FirstResult.h"
 #include "StoreIO/IStoreExporter.h"
 #include "StoreIO/IStoreImporter.h"
@@ -10,6 +11,7 @@
 #include "StoreInterface/ScopedAccess.h"
 
 #include <algorithm>
+#include <iterator>
 #include <utility>
 
 namespace StoreIO
@@ -26,10 +28,65 @@ void LogFailure(const char* i_pFormat, const TQL::IStoreMigrator& i_rMigrator, I
         LogError(i_pFormat, i_rMigrator.GetName(), i_Result.Description());
 }
 
-IResult CopyAll(const TQL::IStoreReader& i_rReader, TQL::IStoreWriter& i_rWriter)
+IResult CopyAll(const TQL::IStoreReader& i_rReader, TQL::IStoreWriter& i_rWriter, std::uint32_t i_Options = 0)
 {
     return CopyEntryTree(i_rReader, i_rReader.GetStore().GetRoot(), i_rWriter, i_rWriter.GetStore().GetRoot(),
-                         CopyOption::Literal);
+                         CopyOption::Literal | i_Options);
+}
+
+bool IsEmptyStore(const TQL::IStoreReader& i_rReader)
+{
+    return !i_rReader.HasChildren(i_rReader.GetStore().GetRoot());
+}
+
+/// Adds what i_rWriter's store lacks. A copy onto an entry of another type would be refused, so what is to win goes
+/// first, and an entry keeps what it has below.
+IResult CopyMissing(TQL::IStore& i_rFrom, TQL::IStoreWriter& i_rWriter)
+{
+    const TQL::ScopedRead from(i_rFrom);
+    if (IsEmptyStore(*from))
+        return TQL::Result::Ok;
+    return CopyAll(*from, i_rWriter, CopyOption::KeepValues);
+}
+
+/// Takes an entry out, so that it can come back with another type, and puts back what is below it.
+IResult Retype(TQL::IStoreWriter& i_rWriter, Store::EntryHandle i_Entry)
+{
+    const auto pKept = TQL::MakeShared<Store::VStore>();
+    const Store::EntryPath path = i_rWriter.GetStore().GetEntryPath(i_Entry);
+    IResult result;
+    for (const Store::EntryHandle child : i_rWriter.GetChildren(i_Entry))
+    {
+        const TQL::ScopedWrite kept(*pKept);
+        const auto target = pKept->GetEntry(i_rWriter.GetStore().GetEntryPath(child));
+        KeepFirst(result, CopyEntryTree(i_rWriter, child, *kept, target, CopyOption::Literal));
+    }
+    KeepFirst(result, i_rWriter.RemoveEntry(i_Entry));
+    const TQL::ScopedRead kept(*pKept);
+    for (const Store::EntryHandle child : kept->GetChildren(pKept->GetEntry(path)))
+    {
+        const auto target = i_rWriter.GetStore().GetEntry(pKept->GetEntryPath(child));
+        KeepFirst(result, CopyEntryTree(*kept, child, i_rWriter, target, CopyOption::Literal));
+    }
+    return result;
+}
+
+/// Makes room for the values of i_rReader where i_rWriter's store has values of other types.
+IResult RetypeLike(const TQL::IStoreReader& i_rReader, TQL::IStoreWriter& i_rWriter)
+{
+    IResult result;
+    std::vector<Store::EntryHandle> open{i_rReader.GetStore().GetRoot()};
+    while (!open.empty())
+    {
+        const Store::EntryHandle entry = open.back();
+        open.pop_back();
+        std::ranges::copy(i_rReader.GetChildren(entry), std::back_inserter(open));
+        const auto target = i_rWriter.GetStore().GetEntry(i_rReader.GetStore().GetEntryPath(entry));
+        if (i_rReader.HasValue(entry) && i_rWriter.HasValue(target) &&
+            &i_rReader.GetValueSchema(entry) != &i_rWriter.GetValueSchema(target))
+            KeepFirst(result, Retype(i_rWriter, target));
+    }
+    return result;
 }
 
 } // namespace
@@ -83,8 +140,6 @@ IResult VStoreVersionedIO::Populate(TQL::IStoreReader& i_rReader)
 {
     const TQL::ScopedWrite temporary(*m_pTemporaryStore);
     IResult result = RemoveChildren(*temporary, m_pTemporaryStore->GetRoot());
-    if (result.IsSuccess())
-        result = CopyFoundEarlier(*temporary);
     if (result.IsError())
         return result;
     for (const auto& rpMigrator : m_Migrators)
@@ -97,17 +152,10 @@ IResult VStoreVersionedIO::Populate(TQL::IStoreReader& i_rReader)
         LogFailure("Failed to write version '%1%': '%2%'", *rpMigrator, written);
         KeepFirst(result, written);
     }
+    // What was found earlier fills in what the parts lack: the application's own values win, whatever their types.
+    if (m_pLostAndFoundStore && result.IsSuccess())
+        KeepFirst(result, CopyMissing(*m_pLostAndFoundStore, *temporary));
     return result;
-}
-
-IResult VStoreVersionedIO::CopyFoundEarlier(TQL::IStoreWriter& i_rTemporary)
-{
-    if (!m_pLostAndFoundStore)
-        return TQL::Result::Ok;
-    const TQL::ScopedRead lostAndFound(*m_pLostAndFoundStore);
-    if (!lostAndFound->HasChildren(m_pLostAndFoundStore->GetRoot()))
-        return TQL::Result::Ok;
-    return CopyAll(*lostAndFound, i_rTemporary);
 }
 
 IResult VStoreVersionedIO::ExportTemporary(IStoreExporter& i_rExporter)
@@ -192,10 +240,11 @@ void VStoreVersionedIO::KeepUnknown()
     if (!m_pLostAndFoundStore)
         return;
     const TQL::ScopedRead temporary(*m_pTemporaryStore);
-    if (!temporary->HasChildren(m_pTemporaryStore->GetRoot()))
+    if (IsEmptyStore(*temporary))
         return;
     const TQL::ScopedWrite lostAndFound(*m_pLostAndFoundStore);
-    const IResult result = CopyAll(*temporary, *lostAndFound);
+    IResult result = RetypeLike(*temporary, *lostAndFound);
+    KeepFirst(result, CopyAll(*temporary, *lostAndFound));
     if (result.IsError())
         LogError("Store import: failed to update the lost and found store on import, unknown data will be lost on "
                  "export: %1%",

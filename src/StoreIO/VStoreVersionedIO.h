@@ -16,7 +16,9 @@ class IStoreImporter;
 /// Stands between an application's store and its files, so that no file touches that store directly and nothing is lost
 /// that this application does not know. A file is read into a temporary store, each registered part is upgraded there
 /// and copied out; what is left (parts of a newer version, and what no part claims) goes to the lost-and-found store
-/// and from there into every file that is written later: nothing leaves that store.
+/// and from there into every file that is written later: nothing leaves that store. Where two of them have the same
+/// entry, the application's own value goes into the file before one that was found, and what was found last before what
+/// was found earlier, also where their types differ.
 /// Shared by the owners of the application's stores. From any thread; one import or export at a time. The caller holds
 /// a read or a write of the application's store and none of the two others; their handlers must not call back in here.
 class VStoreVersionedIO final : public TQL::IStoreMigratorRegistry
@@ -30,9 +32,9 @@ public:
     TQL::ChangeId GetLatestChangeId(TQL::IStoreReader& i_rReader) const override;
     std::shared_ptr<TQL::IStore> GetTemporaryStore() const override { return m_pLostAndFoundStore; }
 
-    /// Exports what was found earlier and the persistable entries of all parts, with their versions. With a reader of
-    /// the temporary or the lost-and-found store, what the temporary store holds. The first failure, or else the
-    /// exporter's result.
+    /// Exports the persistable entries of all parts, with their versions, and what was found earlier beside them. With
+    /// a reader of the temporary or the lost-and-found store, what the temporary store holds. The first failure, or
+    /// else the exporter's result.
     TQL::IResult Export(TQL::IStoreReader& i_rReader, IStoreExporter& i_rExporter);
 
     /// Imports all parts that this application can use, all entries marked Persistable and no Readout touched;
@@ -46,7 +48,6 @@ private:
 
     bool IsOwnStore(const TQL::IStore& i_rStore) const;
     TQL::IResult Populate(TQL::IStoreReader& i_rReader);
-    TQL::IResult CopyFoundEarlier(TQL::IStoreWriter& i_rTemporary);
     TQL::IResult ExportTemporary(IStoreExporter& i_rExporter);
     TQL::IResult ImportTemporary(IStoreImporter& i_rImporter);
     Migrators BringPartsUpToDate();
