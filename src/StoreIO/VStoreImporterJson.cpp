@@ -32,8 +32,13 @@ JsonReadResult ReadMapped(const std::string& i_rPath, rapidjson::Document& o_rDo
         return ReadUnmapped(i_rPath, o_rDocument);
     if (opened.IsError())
         return {opened, {}};
+    file.GuardViews();
     const auto [bytes, bWhole] = file.GetFile().GetWholeFile();
-    return bWhole ? ReadJson(bytes, o_rDocument) : ReadJson(file, o_rDocument);
+    JsonReadResult result = bWhole ? ReadJson(bytes, o_rDocument) : ReadJson(file, o_rDocument);
+    if (file.IsStillWhole())
+        return result;
+    o_rDocument.SetNull();
+    return {TQL::Result::FileIOFailure, "Another program shortened the file while it was read."};
 }
 
 TQL::IResult WithoutRemark(TQL::IResult i_Result)

@@ -43,10 +43,9 @@ void VMemoryMappedFileBase::CloseFile()
 {
     {
         const std::lock_guard lock(m_Mutex);
-        ReleaseGuards();
-        for (const auto& [base, length] : m_Views)
-            System::UnmapView(reinterpret_cast<void*>(base), length);
-        m_Views.clear();
+        while (!m_Views.empty())
+            ReleaseLocked(m_Views.begin());
+        m_bGuarding = m_bReadZeros = false;
     }
     System::CloseMapped(m_File);
 }
@@ -63,38 +62,46 @@ std::pair<std::byte*, TQL::IResult> VMemoryMappedFileBase::MapView(std::uint64_t
     if (const auto error = System::MapView(m_File, i_Offset - remainder, length, pView))
         return {nullptr, MappingFailed(error)};
     const std::lock_guard lock(m_Mutex);
-    m_Views.emplace(reinterpret_cast<std::uintptr_t>(pView), length);
+    m_Views[reinterpret_cast<std::uintptr_t>(pView)] = {length, m_bGuarding ? System::GuardView(pView, length) : -1};
     return {static_cast<std::byte*>(pView) + remainder, TQL::Result::Ok};
 }
 
 void VMemoryMappedFileBase::ForgetViews()
 {
     const std::lock_guard lock(m_Mutex);
-    for (const auto& [base, length] : m_Views)
-        System::ForgetView(reinterpret_cast<void*>(base), length);
+    for (const auto& [base, rView] : m_Views)
+        System::ForgetView(reinterpret_cast<void*>(base), rView.Length);
 }
 
 void VMemoryMappedFileBase::GuardViews()
 {
     const std::lock_guard lock(m_Mutex);
-    ReleaseGuards();
-    for (const auto& [base, length] : m_Views)
-        if (const int guard = System::GuardView(reinterpret_cast<void*>(base), length); guard >= 0)
-            m_Guards.push_back(guard);
+    m_bGuarding = true;
+    for (auto& [base, rView] : m_Views)
+        if (rView.Guard < 0)
+            rView.Guard = System::GuardView(reinterpret_cast<void*>(base), rView.Length);
 }
 
 bool VMemoryMappedFileBase::IsStillWhole()
 {
+    const auto hasReadZeros = [](const auto& i_rPair)
+    {
+        return i_rPair.second.Guard >= 0 && System::HasGuardActed(i_rPair.second.Guard);
+    };
     const std::lock_guard lock(m_Mutex);
-    return System::GetSizeNow(m_File) >= m_File.Size && std::ranges::none_of(m_Guards, System::HasGuardActed);
+    return System::GetSizeNow(m_File) >= m_File.Size && !m_bReadZeros && std::ranges::none_of(m_Views, hasReadZeros);
 }
 
-/// Under the mutex.
-void VMemoryMappedFileBase::ReleaseGuards()
+void VMemoryMappedFileBase::ReleaseLocked(Views::iterator i_View)
 {
-    for (const int guard : m_Guards)
+    const auto& [length, guard] = i_View->second;
+    if (guard >= 0)
+    {
+        m_bReadZeros = m_bReadZeros || System::HasGuardActed(guard);
         System::ReleaseGuard(guard);
-    m_Guards.clear();
+    }
+    System::UnmapView(reinterpret_cast<void*>(i_View->first), length);
+    m_Views.erase(i_View);
 }
 
 void VMemoryMappedFileBase::UnmapView(const std::byte* i_pView)
@@ -104,11 +111,8 @@ void VMemoryMappedFileBase::UnmapView(const std::byte* i_pView)
     if (found == m_Views.begin())
         return;
     --found;
-    if (reinterpret_cast<std::uintptr_t>(i_pView) - found->first >= found->second)
-        return;
-    ReleaseGuards(); // nobody unmaps single views of a file that is guarded, but none shall outlive its view
-    System::UnmapView(reinterpret_cast<void*>(found->first), found->second);
-    m_Views.erase(found);
+    if (reinterpret_cast<std::uintptr_t>(i_pView) - found->first < found->second.Length)
+        ReleaseLocked(found);
 }
 
 } // namespace UtilsFileSystem

@@ -9,7 +9,6 @@
 #include <mutex>
 #include <string>
 #include <utility>
-#include <vector>
 
 namespace UtilsFileSystem
 {
@@ -44,8 +43,8 @@ public:
     /// Gives back the memory that the views of an input file hold; where they are read again, so is the file.
     void ForgetViews();
 
-    /// From now on reads of the views that there are give zeros where another program has shortened the file, instead
-    /// of ending the process, as far as the system can do that. Ask IsStillWhole before what was read is believed.
+    /// From now on reads of all views give zeros where another program has shortened the file, instead of ending the
+    /// process, as far as the system can do that. Ask IsStillWhole before what was read is believed.
     void GuardViews();
 
     /// Whether the open file still has all its bytes, and had them whenever a guarded view was read.
@@ -55,14 +54,21 @@ protected:
     std::uint64_t GetFileSize() const { return m_File.Size; }
 
 private:
+    struct View
+    {
+        std::uint64_t Length = 0;
+        int Guard = -1;
+    };
+    using Views = std::map<std::uintptr_t, View>; // by base address
+
     TQL::IResult Open(const std::string& i_rPath, System::EMapping i_Mapping, std::uint64_t i_Size);
+    void ReleaseLocked(Views::iterator i_View);
 
     System::MappedFile m_File;
-    void ReleaseGuards();
-
     std::mutex m_Mutex;
-    std::map<std::uintptr_t, std::uint64_t> m_Views; // base address to length; guarded by m_Mutex
-    std::vector<int> m_Guards;                       // guarded by m_Mutex
+    Views m_Views;             // guarded by m_Mutex
+    bool m_bGuarding = false;  // guarded by m_Mutex
+    bool m_bReadZeros = false; // guarded by m_Mutex; in a view that is gone
     const std::uint64_t m_Granularity = System::GetAllocationGranularity();
 };
 

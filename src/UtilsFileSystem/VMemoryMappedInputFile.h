@@ -76,6 +76,8 @@ public:
         return m_Stream.Open(i_rPath, i_WindowMebibytes, i_Option);
     }
     void Close() { m_Stream.Close(); }
+    void GuardViews() { m_Stream.GuardViews(); }
+    bool IsStillWhole() { return m_Stream.IsStillWhole(); }
     const VMemoryMappedInputFile& GetFile() const { return m_Stream; }
 };
 

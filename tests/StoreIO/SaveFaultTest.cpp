@@ -99,4 +99,24 @@ TEST(SaveFaults, AWholeStoreIsLoadedWhereverASaveWasCutOff)
     RecordProperty("points", points);
 }
 
+TEST(LoadFaults, AFileThatIsShortenedMeanwhileIsRefused)
+{
+    const TestUtilsFileSystem::TestFolder folder;
+    folder.Put("m", FileOf("Main"));
+    const auto shorten = [&]
+    {
+        std::filesystem::resize_file(folder / "m", 5000);
+    };
+    EXPECT_EQ(FaultLayer::InChild(
+                  [&]
+                  {
+                      TestSupport::LogGuard log;
+                      std::string answer;
+                      FaultLayer::With({{}, 0, 0, 0, "mmap", shorten}, [&] { answer = Load(folder / "m"); });
+                      const auto lines = log.Take();
+                      return answer == "FileIOFailure" && lines.size() == 1 ? 0 : 1;
+                  }),
+              0);
+}
+
 } // namespace

@@ -20,6 +20,8 @@ int Enter(const std::string& i_rName)
 {
     if (!s_pPlan || (!s_pPlan->Only.empty() && s_pPlan->Only != i_rName))
         return 0;
+    if (s_pPlan->Before)
+        s_pPlan->Before();
     if (++s_Count == s_pPlan->StopAt)
         ::_exit(StoppedCode);
     if (s_Count == s_pPlan->FailAt)

@@ -16,7 +16,8 @@ struct Plan
     int StopAt = 0;                ///< the process ends instead of the n-th call
     int FailAt = 0;                ///< the n-th call fails
     int FailWith = EIO;
-    std::string Only; ///< only calls of this name are counted; all when empty
+    std::string Only;                  ///< only calls of this name are counted; all when empty
+    std::function<void()> Before = {}; ///< what another program does before each call
 };
 
 /// The plan holds while i_rWork runs.

@@ -1,5 +1,6 @@
 #include "UtilsFileSystem/SystemCalls.h"
 
+#include <algorithm>
 #include <array>
 #include <atomic>
 #include <csignal>
@@ -10,7 +11,8 @@
 #include <unistd.h>
 
 // Reading a mapped page behind the end of its file raises SIGBUS. The handler here puts zeros in the place of the rest
-// of a guarded view and lets the read go on; a fault anywhere else goes to whoever handled the signal before.
+// of a guarded view and lets the read go on; a fault anywhere else goes to whoever handled the signal before. It is
+// there only while views are guarded: this code may be part of a module that is unloaded.
 namespace UtilsFileSystem::System
 {
 namespace
@@ -27,7 +29,8 @@ constexpr std::size_t s_Places = 32;
 
 // Read by the signal handler, so plain atomics that live as long as the process.
 std::array<Range, s_Places> s_Ranges;
-std::mutex s_Mutex; // held while places are taken and freed
+std::mutex s_Mutex;        // held while places are taken and freed
+bool s_bInstalled = false; // guarded by s_Mutex
 struct sigaction s_Before;
 std::uintptr_t s_PageSize = 0;
 
@@ -59,18 +62,27 @@ void HandleFault(int i_Signal, siginfo_t* i_pInfo, void* i_pContext)
         ::sigaction(SIGBUS, &s_Before, nullptr); // the fault comes again and ends the process as it always would
 }
 
-bool InstallOnce()
+/// Under the mutex, as the one below.
+bool Install()
 {
-    static const bool s_bInstalled = []
-    {
-        s_PageSize = static_cast<std::uintptr_t>(::sysconf(_SC_PAGESIZE));
-        struct sigaction action = {};
-        action.sa_sigaction = HandleFault;
-        action.sa_flags = SA_SIGINFO;
-        ::sigemptyset(&action.sa_mask);
-        return ::sigaction(SIGBUS, &action, &s_Before) == 0;
-    }();
+    if (s_bInstalled)
+        return true;
+    s_PageSize = static_cast<std::uintptr_t>(::sysconf(_SC_PAGESIZE));
+    struct sigaction action = {};
+    action.sa_sigaction = HandleFault;
+    action.sa_flags = SA_SIGINFO;
+    ::sigemptyset(&action.sa_mask);
+    s_bInstalled = ::sigaction(SIGBUS, &action, &s_Before) == 0;
     return s_bInstalled;
+}
+
+/// Whoever came after hands faults on to here, so it stays where there is somebody.
+void Uninstall()
+{
+    struct sigaction now = {};
+    const bool bLast = ::sigaction(SIGBUS, nullptr, &now) == 0 && now.sa_sigaction == HandleFault;
+    if (bLast && ::sigaction(SIGBUS, &s_Before, nullptr) == 0)
+        s_bInstalled = false;
 }
 
 } // namespace
@@ -78,7 +90,7 @@ bool InstallOnce()
 int GuardView(void* i_pView, std::uint64_t i_Length)
 {
     const std::lock_guard lock(s_Mutex);
-    if (!InstallOnce())
+    if (!Install())
         return -1;
     for (std::size_t place = 0; place < s_Places; ++place)
     {
@@ -104,6 +116,8 @@ void ReleaseGuard(int i_Guard)
 {
     const std::lock_guard lock(s_Mutex);
     s_Ranges[static_cast<std::size_t>(i_Guard)].First.store(0);
+    if (std::ranges::all_of(s_Ranges, [](const Range& i_rRange) { return i_rRange.First.load() == 0; }))
+        Uninstall();
 }
 
 } // namespace UtilsFileSystem::System
