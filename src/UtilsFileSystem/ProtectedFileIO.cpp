@@ -111,15 +111,23 @@ void RemoveBackup(const std::string& i_rPath, const std::string& i_rOldPath)
                 result.Description());
 }
 
+/// A link is not replaced but followed: the side files stand beside the file itself, and so does the swap. Whoever
+/// refuses to overwrite refuses a link too.
+std::string TargetOf(const std::string& i_rPath, EWriteMode i_Mode)
+{
+    return i_Mode == EWriteMode::Exclusive ? i_rPath : System::ResolveLink(i_rPath);
+}
+
 } // namespace
 
 TQL::IResult ProtectedSave(const FileCallback& i_rWriter, const std::string& i_rPath, EWriteMode i_Mode)
 {
     if (!IsUsable(i_rPath))
         return TQL::Result::FileNotFound;
-    if (const TQL::IResult cleared = ClearOldFile(i_rPath); cleared.IsError())
+    const std::string path = TargetOf(i_rPath, i_Mode);
+    if (const TQL::IResult cleared = ClearOldFile(path); cleared.IsError())
         return cleared;
-    const std::string newPath = NewName(i_rPath);
+    const std::string newPath = NewName(path);
     // A new file that a cut off move left can be a second name of the file itself: writing to it would empty both.
     if (const auto error = RemoveIntermediate(newPath))
         return ResultFromError(error);
@@ -131,7 +139,7 @@ TQL::IResult ProtectedSave(const FileCallback& i_rWriter, const std::string& i_r
         (void)RemoveIntermediate(newPath);
         return result;
     }
-    return CompleteProtectedSave(i_rPath, newPath, i_Mode);
+    return CompleteProtectedSave(path, newPath, i_Mode);
 }
 
 TQL::IResult CompleteProtectedSave(const std::string& i_rPath, const std::string& i_rNewPath, EWriteMode i_Mode)
@@ -143,25 +151,26 @@ TQL::IResult CompleteProtectedSave(const std::string& i_rPath, const std::string
             System::SyncFolderOf(i_rPath);
         return moved;
     }
-    const std::string oldPath = OldName(i_rPath);
-    const TQL::IResult result = ReplaceFile(i_rNewPath, i_rPath, oldPath);
+    const std::string path = TargetOf(i_rPath, i_Mode);
+    const std::string oldPath = OldName(path);
+    const TQL::IResult result = ReplaceFile(i_rNewPath, path, oldPath);
     if (result == TQL::Result::FileNotFound) // a repair that finds the swap done
     {
         LogFile(ELogSeverity::Detail, "Protected save: new file [%1%] doesn't exist so it wasn't moved to [%2%].",
-                i_rNewPath, i_rPath);
+                i_rNewPath, path);
     }
     else if (result.IsError())
     {
         LogFile(ELogSeverity::Error, "Protected save: new file [%1%] could not be moved to [%2%]: %3%", i_rNewPath,
-                i_rPath, result.Description());
+                path, result.Description());
         return result;
     }
     else
     {
-        System::SyncFolderOf(i_rPath);
-        LogFile(ELogSeverity::Detail, "Protected save: new file [%1%] moved to [%2%].", i_rNewPath, i_rPath);
+        System::SyncFolderOf(path);
+        LogFile(ELogSeverity::Detail, "Protected save: new file [%1%] moved to [%2%].", i_rNewPath, path);
     }
-    RemoveBackup(i_rPath, oldPath);
+    RemoveBackup(path, oldPath);
     return result;
 }
 
@@ -169,7 +178,7 @@ TQL::IResult ProtectedLoad(const FileCallback& i_rReader, const std::string& i_r
 {
     if (!IsUsable(i_rPath))
         return TQL::Result::FileNotFound;
-    Repair(i_rPath);
+    Repair(System::ResolveLink(i_rPath));
     return i_rReader(i_rPath);
 }
 

@@ -7,9 +7,9 @@
 #include <string>
 
 /// Saves that leave the file whole when they are cut off by a crash or a power failure. A save writes a side file, path
-/// +
-/// ".new", brings it to the disk and swaps it in; the previous file is path + ".old" during the swap. A load looks at
-/// which of the three names exist and repairs before it reads. Two savers of one path at once are not guarded against.
+/// + ".new", brings it to the disk and swaps it in; the previous file is path + ".old" during the swap. A load looks at
+/// which of the three names exist and repairs before it reads. Of a path that is a symbolic link the file behind it is
+/// meant. Two savers of one path at once are not guarded against.
 namespace UtilsFileSystem
 {
 

@@ -46,6 +46,10 @@ std::error_code Remove(const std::string& i_rPath);
 /// Whether the name is taken, be it by a link to nowhere. Any failure counts as missing.
 bool Exists(const std::string& i_rPath);
 
+/// Where the path leads when its last name is a link, be it to nowhere; else, and where links go in a circle, the path
+/// itself, as always on Windows, where links are rare.
+std::string ResolveLink(const std::string& i_rPath);
+
 /// Brings the bytes of a file, or the names in the folder of a file, to the disk as far as the file system can do that.
 /// An error only where the system says that bytes were lost.
 std::error_code SyncFile(const std::string& i_rPath);

@@ -109,6 +109,29 @@ TEST(ProtectedSave, EachModeInEachState)
     }
 }
 
+#ifndef _WIN32
+TEST(ProtectedSave, ReplacesTheFileBehindALink)
+{
+    const TestFolder folder;
+    const TestSupport::LogGuard log;
+    folder.Set("m=M");
+    std::filesystem::create_symlink("m", folder / "first");
+    std::filesystem::create_symlink(folder / "first", folder / "link");
+    std::filesystem::create_symlink("n", folder / "nowhere");
+    EXPECT_EQ(ProtectedSave(Writer("S"), folder / "link", EWriteMode::Overwrite), TQL::Result::Ok);
+    EXPECT_EQ(ProtectedSave(Writer("S"), folder / "nowhere", EWriteMode::Exclusive), TQL::Result::AlreadyPresent);
+    EXPECT_EQ(folder.Show(), "first=S link=S m=S nowhere=");
+    EXPECT_EQ(ProtectedSave(Writer("T"), folder / "nowhere", EWriteMode::Overwrite), TQL::Result::Ok);
+    EXPECT_EQ(folder.Show(), "first=S link=S m=S n=T nowhere=T");
+    for (const char* const pLink : {"first", "link", "nowhere"})
+        EXPECT_TRUE(std::filesystem::is_symlink(folder / pLink)) << pLink;
+    folder.Put("m.new", "N");
+    folder.Put("m.old", "O");
+    EXPECT_EQ(LoadText(folder / "link"), "N") << "what an interrupted save left lies beside the file";
+    EXPECT_EQ(folder.Show(), "first=N link=N m=N n=T nowhere=T");
+}
+#endif
+
 TEST(ProtectedSave, TellsWhatItDoes)
 {
     const TestFolder folder;

@@ -2,7 +2,9 @@
 #include "UtilsFileSystem/SystemCalls.h"
 
 #include <array>
+#include <climits>
 #include <cstdlib>
+#include <string_view>
 
 #include <fcntl.h>
 #include <sys/stat.h>
@@ -224,6 +226,23 @@ bool Exists(const std::string& i_rPath)
 {
     struct stat status;
     return ::lstat(Raw(i_rPath), &status) == 0;
+}
+
+std::string ResolveLink(const std::string& i_rPath)
+{
+    constexpr int mostLinks = 40; // as the system's own
+    std::string path = i_rPath;
+    std::array<char, PATH_MAX> target;
+    for (int link = 0; link < mostLinks; ++link)
+    {
+        const ssize_t length = ::readlink(Raw(path), target.data(), target.size());
+        if (length <= 0)
+            return path;
+        const std::string_view next(target.data(), static_cast<std::size_t>(length));
+        const std::size_t folder = next.front() == '/' ? 0 : path.rfind('/') + 1; // npos + 1 is 0
+        path.replace(folder, std::string::npos, next);
+    }
+    return i_rPath;
 }
 
 std::error_code SyncFile(const std::string& i_rPath)

@@ -115,6 +115,11 @@ bool Exists(const std::string& i_rPath)
     return ::GetFileAttributesW(Wide(i_rPath).c_str()) != INVALID_FILE_ATTRIBUTES;
 }
 
+std::string ResolveLink(const std::string& i_rPath)
+{
+    return i_rPath;
+}
+
 std::error_code SyncFile(const std::string& i_rPath)
 {
     const Handle file(::CreateFileW(Wide(i_rPath).c_str(), GENERIC_WRITE,
