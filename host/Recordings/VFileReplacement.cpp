@@ -1,9 +1,10 @@
 #include "Recordings/VFileReplacement.h"
 
 #include "Recordings/FileMessage.h"
+#include "UtilsFileSystem/FileIO.h"
 
 #include <cerrno>
-#include <system_error>
+#include <cstdio>
 #include <utility>
 
 namespace Recordings
@@ -12,17 +13,15 @@ namespace Recordings
 namespace
 {
 
-std::filesystem::path FreeSibling(const std::filesystem::path& i_rPath)
+std::string Utf8Of(const std::filesystem::path& i_rPath)
 {
-    std::error_code error;
-    std::filesystem::path sibling = i_rPath;
-    sibling += ".part";
-    for (int i = 2; std::filesystem::exists(sibling, error); ++i)
-    {
-        sibling = i_rPath;
-        sibling += ".part" + std::to_string(i);
-    }
-    return sibling;
+    const std::u8string text = i_rPath.u8string();
+    return {text.begin(), text.end()};
+}
+
+std::filesystem::path PathOf(const std::string& i_rUtf8)
+{
+    return std::u8string(i_rUtf8.begin(), i_rUtf8.end());
 }
 
 } // namespace
@@ -31,7 +30,7 @@ VFileReplacement::VFileReplacement(std::filesystem::path i_Path) : m_Path(std::m
 
 VFileReplacement::~VFileReplacement()
 {
-    m_Stream.close();
+    m_pFile.reset();
     std::error_code ignored;
     if (!m_Temporary.empty())
         std::filesystem::remove(m_Temporary, ignored);
@@ -47,23 +46,34 @@ TQL::IResult VFileReplacement::Open(std::string& o_rError)
         return TQL::Result::InvalidArgument;
     }
     // A pipe or a device has no name of its own to resolve, and nothing beside it to put in its place.
-    const bool bDirect = std::filesystem::exists(status) && !std::filesystem::is_regular_file(status);
-    if (!bDirect)
-    {
-        const auto resolved = std::filesystem::weakly_canonical(m_Path, error);
-        m_Target = error ? m_Path : resolved;
-        m_Temporary = FreeSibling(m_Target);
-    }
-    errno = 0;
-    m_Stream.open(bDirect ? m_Target : m_Temporary, std::ios::binary | std::ios::trunc);
-    return m_Stream ? TQL::Result::Ok : Fail(errno, o_rError);
+    if (std::filesystem::exists(status) && !std::filesystem::is_regular_file(status))
+        error = UtilsFileSystem::CreateFileAt(Utf8Of(m_Path), m_pFile);
+    else
+        error = OpenBeside();
+    return error ? Fail(error.value(), o_rError) : TQL::Result::Ok;
+}
+
+std::error_code VFileReplacement::OpenBeside()
+{
+    m_Target = PathOf(UtilsFileSystem::ResolveLink(Utf8Of(m_Path)));
+    // A name that is too long has to show now, not when all has been written beside it under a shorter one.
+    std::error_code error;
+    const auto type = std::filesystem::symlink_status(m_Target, error).type();
+    if (type == std::filesystem::file_type::none)
+        return error;
+    std::string created;
+    error = UtilsFileSystem::CreateFileBeside(Utf8Of(m_Target), created, m_pFile);
+    if (!error)
+        m_Temporary = PathOf(created);
+    return error;
 }
 
 TQL::IResult VFileReplacement::Write(std::span<const std::byte> i_Bytes, std::string& o_rError)
 {
     errno = 0;
-    m_Stream.write(reinterpret_cast<const char*>(i_Bytes.data()), static_cast<std::streamsize>(i_Bytes.size()));
-    return m_Stream ? TQL::Result::Ok : Fail(errno, o_rError);
+    const bool bWritten =
+        m_pFile && std::fwrite(i_Bytes.data(), 1, i_Bytes.size(), m_pFile->GetFile()) == i_Bytes.size();
+    return bWritten ? TQL::Result::Ok : Fail(errno, o_rError);
 }
 
 TQL::IResult VFileReplacement::Write(std::string_view i_Text, std::string& o_rError)
@@ -74,9 +84,10 @@ TQL::IResult VFileReplacement::Write(std::string_view i_Text, std::string& o_rEr
 TQL::IResult VFileReplacement::Commit(std::string& o_rError)
 {
     errno = 0;
-    m_Stream.close();
-    if (!m_Stream)
+    const bool bComplete = m_pFile && std::fflush(m_pFile->GetFile()) == 0 && !std::ferror(m_pFile->GetFile());
+    if (!bComplete || m_pFile->Close().IsError())
         return Fail(errno, o_rError);
+    m_pFile.reset();
     return m_Temporary.empty() ? TQL::Result::Ok : MoveIntoPlace(o_rError);
 }
 

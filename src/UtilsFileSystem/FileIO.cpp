@@ -6,6 +6,8 @@
 
 #include <cerrno>
 #include <filesystem>
+#include <random>
+#include <string_view>
 
 namespace UtilsFileSystem
 {
@@ -60,6 +62,34 @@ catch (const std::exception&) // a path that is no text of the system's
 std::ios::openmode BinaryFlag(EOpenMode i_Mode)
 {
     return i_Mode == EOpenMode::Binary ? std::ios::binary : std::ios::openmode{};
+}
+
+std::error_code OpenQuietly(const std::string& i_rPath, System::EOpen i_Open,
+                            std::unique_ptr<VFileOutputStream>& o_rpFile)
+{
+    std::FILE* pFile = nullptr;
+    if (const auto error = System::Open(i_rPath, i_Open, true, pFile))
+        return error;
+    o_rpFile = std::make_unique<VFileOutputStream>(pFile);
+    return {};
+}
+
+/// The path with 80 random bits and ".part" behind its name, which is cut where there is no room for them.
+std::string SideName(const std::string& i_rPath)
+{
+    constexpr std::string_view letters = "abcdefghijklmnopqrstuvwxyz234567";
+    constexpr std::size_t longestName = 255;
+    std::string suffix = ".";
+    std::random_device random;
+    for (int i = 0; i < 16; ++i)
+        suffix += letters[random() % letters.size()];
+    suffix += ".part";
+    std::size_t end = i_rPath.size();
+    const std::size_t name = end - NativePath(i_rPath).filename().u8string().size();
+    if (end - name > longestName - suffix.size())
+        for (end = name + longestName - suffix.size(); (static_cast<unsigned char>(i_rPath[end]) & 0xC0) == 0x80;)
+            --end; // inside a character
+    return i_rPath.substr(0, end) + suffix;
 }
 
 } // namespace
@@ -182,6 +212,23 @@ TQL::IResult RemoveFile(const std::string& i_rPath)
         LogFile(TQL::ELogSeverity::Error, "Failed to remove file '%1%': %2%", i_rPath, error.message());
     }
     return result;
+}
+
+std::string ResolveLink(const std::string& i_rPath)
+{
+    return System::ResolveLink(i_rPath);
+}
+
+std::error_code CreateFileBeside(const std::string& i_rPath, std::string& o_rCreated,
+                                 std::unique_ptr<VFileOutputStream>& o_rpFile)
+{
+    o_rCreated = SideName(i_rPath);
+    return OpenQuietly(o_rCreated, System::EOpen::Create, o_rpFile);
+}
+
+std::error_code CreateFileAt(const std::string& i_rPath, std::unique_ptr<VFileOutputStream>& o_rpFile)
+{
+    return OpenQuietly(i_rPath, System::EOpen::Overwrite, o_rpFile);
 }
 
 bool FindLockingProcesses(const std::string& i_rPath, std::vector<std::string>& o_rNames)

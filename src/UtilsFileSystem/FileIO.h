@@ -6,6 +6,7 @@
 #include <fstream>
 #include <memory>
 #include <string>
+#include <system_error>
 #include <utility>
 #include <vector>
 
@@ -58,6 +59,16 @@ TQL::IResult ReplaceFileByRename(const std::string& i_rFrom, const std::string& 
 
 /// `OkButNoEffect` when there is nothing to remove. Never removes a folder.
 TQL::IResult RemoveFile(const std::string& i_rPath);
+
+/// Where the path leads when it is a symbolic link, be it to nowhere; else the path itself.
+std::string ResolveLink(const std::string& i_rPath);
+
+/// For callers that tell of a failure in their own words, by the system's error, which is empty when it worked; nothing
+/// is logged. The first creates a file beside i_rPath, for what is to take its place, under a new name that nobody can
+/// guess, so that nobody can put a link there before; o_rCreated is its path. The second empties or creates i_rPath.
+std::error_code CreateFileBeside(const std::string& i_rPath, std::string& o_rCreated,
+                                 std::unique_ptr<VFileOutputStream>& o_rpFile);
+std::error_code CreateFileAt(const std::string& i_rPath, std::unique_ptr<VFileOutputStream>& o_rpFile);
 
 /// Appends the full image paths of the processes that hold the file ("unknown process" where the system does not tell).
 /// False when the query failed or found more than ten; nothing is appended then.

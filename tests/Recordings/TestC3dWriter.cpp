@@ -241,15 +241,25 @@ TEST(C3dWriter, PlacesThatCannotBeWritten)
 TEST(C3dWriter, KeepsLinksAndPermissions)
 {
     const TemporaryFolder folder;
+    const std::string longest = std::string(251, 'x') + ".c3d";
     WriteBytes(folder / "real.c3d", {std::byte{'o'}});
     std::filesystem::create_symlink(folder / "real.c3d", folder / "link.c3d");
+    std::filesystem::create_symlink("fresh.c3d", folder / "nowhere.c3d");
+    std::filesystem::create_symlink("victim", folder / "real.c3d.part"); // a name that could have been guessed
     const auto permissions = std::filesystem::perms::owner_read | std::filesystem::perms::owner_write;
     std::filesystem::permissions(folder / "real.c3d", permissions);
     std::string error;
-    ASSERT_EQ(Recordings::WriteC3d(MakeRecording(1, 0, 10), folder / "link.c3d", error), TQL::Result::Ok) << error;
+    for (const std::string& rName : {std::string("link.c3d"), std::string("nowhere.c3d"), longest})
+        EXPECT_EQ(Recordings::WriteC3d(MakeRecording(1, 0, 10), folder / rName, error), TQL::Result::Ok) << error;
     EXPECT_TRUE(std::filesystem::is_symlink(folder / "link.c3d"));
+    EXPECT_TRUE(std::filesystem::is_symlink(folder / "nowhere.c3d"));
     EXPECT_EQ(std::filesystem::status(folder / "real.c3d").permissions(), permissions);
-    EXPECT_GT(std::filesystem::file_size(folder / "real.c3d"), 512u);
+    for (const std::string& rName : {std::string("real.c3d"), std::string("fresh.c3d"), longest})
+        EXPECT_GT(std::filesystem::file_size(folder / rName), 512u);
+    EXPECT_FALSE(std::filesystem::exists(folder / "victim"));
+    EXPECT_EQ(Recordings::WriteC3d(MakeRecording(1, 0, 10), folder / ("x" + longest), error),
+              TQL::Result::FileIOFailure);
+    EXPECT_EQ(folder.FileNames().size(), 6u) << "nothing is left beside them";
 }
 
 } // namespace TestRecordings
