@@ -128,6 +128,17 @@ void VTraceManager::UpdateDefaultRangeFromPreset()
         SetTimeFrames(*range);
 }
 
+void VTraceManager::FollowPreset()
+{
+    const TQL::FrameRange oldDefault = m_Inputs.DefaultTimeRange;
+    UpdateDefaultRangeFromPreset();
+    // Who looked at the whole of a recording looks at the whole live window next; the recording's frames lie ahead of
+    // the latest one, where nothing ever is. And who looks at ten seconds goes on doing so when frames turn out to be
+    // longer or shorter: their number is another then.
+    if (m_Inputs.bLive && TQL::NearlyEqual(m_Inputs.TimeRange, oldDefault))
+        SetTimeFrames(m_Inputs.DefaultTimeRange);
+}
+
 void VTraceManager::SetLiveTimePresetIndex(int i_Index)
 {
     if (i_Index == m_LiveTimePresetIndex)

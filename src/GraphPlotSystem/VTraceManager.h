@@ -152,6 +152,9 @@ private:
     void SetTimeFrames(const TQL::FrameRange& i_rRange);
     void SetDefaultFrames(const TQL::FrameRange& i_rRange);
     void UpdateDefaultRangeFromPreset();
+    /// The default range anew, for another kind of context or another frame period. A shown range that was the default
+    /// one goes with it.
+    void FollowPreset();
     void UseContext(const std::string& i_rName, std::shared_ptr<ChannelSystem::IChannelContext> i_pContext);
     void DropContext();
     void SetContextType(std::int32_t i_Type);

@@ -94,12 +94,7 @@ void VTraceManager::SetContextType(std::int32_t i_Type)
     SetInput(&UpdateInputs::bLive, i_Type == static_cast<std::int32_t>(ChannelSystem::EContextType::Live));
     Q_EMIT LiveContextChanged();
 
-    const TQL::FrameRange oldDefault = m_Inputs.DefaultTimeRange;
-    UpdateDefaultRangeFromPreset();
-    // Who looked at the whole of a recording looks at the whole live window next; the recording's frames lie ahead of
-    // the latest one, where nothing ever is.
-    if (m_Inputs.bLive && TQL::NearlyEqual(m_Inputs.TimeRange, oldDefault))
-        SetTimeFrames(m_Inputs.DefaultTimeRange);
+    FollowPreset();
 }
 
 void VTraceManager::FollowRecordedRange()
@@ -188,7 +183,7 @@ void VTraceManager::OnFramePeriodChanged()
     if (period == 0 || period == m_Inputs.FramePeriod)
         return;
     SetInput(&UpdateInputs::FramePeriod, period);
-    UpdateDefaultRangeFromPreset();
+    FollowPreset();
     m_pStorage->SetTicksPerFrame(period);
     Q_EMIT ContextFramePeriodChanged();
 }

@@ -154,7 +154,7 @@ TEST_F(TraceManager, FollowsTheFramePeriodWhileActive)
     EXPECT_EQ(Notes(), "") << "not active";
     pManager->SetContext("Live");
     pUi->RunAll();
-    EXPECT_EQ(Notes(), "DefaultTimeRange ContextFramePeriod ");
+    EXPECT_EQ(Notes(), "DefaultTimeRange TimeRange ContextFramePeriod ");
     EXPECT_EQ(pManager->GetDefaultTimeRange(), QPointF(-600, 0));
     EXPECT_EQ(pManager->GetContextFramePeriod(), 2 * TQL::DefaultFramePeriod);
     EXPECT_EQ(pJournal->Take(), "period 2250000\n");
@@ -166,6 +166,43 @@ TEST_F(TraceManager, FollowsTheFramePeriodWhileActive)
     pTime->SetFramePeriod(TQL::DefaultFramePeriod);
     pUi->RunAll();
     EXPECT_EQ(Notes(), "");
+}
+
+TEST_F(TraceManager, TheWindowOfALiveContextIsTenSecondsAtEveryRate)
+{
+    struct Case
+    {
+        std::int64_t Rate;
+        std::int64_t RecordingRate;
+        double Frames;
+    };
+    for (const Case& rCase : {Case{100, 50, 1000}, Case{50, 200, 500}, Case{1000, 100, 10000}, Case{120, 1000, 1200}})
+    {
+        SCOPED_TRACE(rCase.Rate);
+        const auto setRate = [&](std::int64_t i_Rate)
+        {
+            pTime->SetFramePeriod(TQL::DefaultTickRate / i_Rate);
+            pUi->RunAll();
+        };
+        const QPointF window(-rCase.Frames, 0);
+        const auto pManager = Make();
+        pManager->SetContext("Live");
+        setRate(rCase.Rate);
+        EXPECT_EQ(pManager->GetTimeRange(), window) << "the rate comes after the context";
+
+        AddRecording("Take", 100, 300);
+        pManager->SetContext("Take");
+        setRate(rCase.RecordingRate);
+        EXPECT_EQ(pManager->GetTimeRange(), QPointF(100, 300));
+        pManager->SetContext("Live");
+        setRate(rCase.Rate);
+        EXPECT_EQ(pManager->GetTimeRange(), window) << "on the way back";
+
+        pManager->SetTimeRange({-70, -20});
+        setRate(rCase.RecordingRate);
+        EXPECT_EQ(pManager->GetTimeRange(), QPointF(-70, -20)) << "a range that the operator chose stays";
+        setRate(120);
+    }
 }
 
 TEST_F(TraceManager, FollowsTheUnwrappingPreferenceWhileActive)
