@@ -49,7 +49,9 @@ bool VTraceInspector::UpdateWindow(const ChannelSystem::IChannelBlock& i_rBlock,
 {
     TickRange available;
     i_rBlock.GetRange(available);
-    const bool bRestart = !m_pStatistics || m_WindowSamples != i_WindowSamples || m_Window.Last > available.Last;
+    // The statistics take samples in at their newer end only, so that older ones ask for a new beginning.
+    const bool bRestart = !m_pStatistics || m_WindowSamples != i_WindowSamples || m_Window.Last > available.Last ||
+                          available.First < m_Window.First;
     if (!bRestart && m_Window == available)
         return false;
     TickRange range;
@@ -62,13 +64,13 @@ bool VTraceInspector::UpdateWindow(const ChannelSystem::IChannelBlock& i_rBlock,
     {
         m_pStatistics = std::make_unique<RollingStatistics>(i_WindowSamples);
         m_WindowSamples = i_WindowSamples;
-        m_Span = available.Last - range.First;
         m_Window.First = available.First;
     }
     m_pStatistics->Push(i_rScratch);
     m_Mean = m_pStatistics->Mean();
     m_StandardDeviation = m_pStatistics->StandardDeviation();
     m_Window = {std::max(m_Window.First, available.First), range.Last};
+    m_Span = available.Last - m_Window.First; // a live block grows while its past is taken in
     return true;
 }
 

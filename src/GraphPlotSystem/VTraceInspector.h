@@ -38,8 +38,8 @@ public:
                      std::vector<float>& i_rScratch);
 
     /// Takes in the samples that follow those already seen. Starts anew with another window size (in samples, at least
-    /// 1), when the data went back, and after a hole. True when anything was read. Throws std::length_error for an
-    /// impossible window size, and is as before then.
+    /// 1), when the data went back or begin earlier than before, and after a hole. True when anything was read. Throws
+    /// std::length_error for an impossible window size, and is as before then.
     bool UpdateWindow(const ChannelSystem::IChannelBlock& i_rBlock, std::uint32_t i_Component,
                       std::int64_t i_WindowSamples, std::vector<float>& i_rScratch);
 
@@ -55,7 +55,7 @@ private:
     float m_Mean = NoNumber;
     float m_StandardDeviation = NoNumber;
     TQL::TickRange m_Window; ///< ticks taken in so far
-    std::int64_t m_Span = 0; ///< ticks to take in until the window is complete
+    std::int64_t m_Span = 0; ///< ticks there were to take in, at the last read
     std::optional<std::int64_t> m_ValueTick;
     std::unique_ptr<RollingStatistics> m_pStatistics;
     std::int64_t m_WindowSamples = 0; ///< what the statistics were made for

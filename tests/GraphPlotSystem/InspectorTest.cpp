@@ -186,6 +186,7 @@ TEST(Inspector, StartsAnewWhenTheWindowIsNoLongerTheSame)
         std::int64_t TrimEnd;
         std::int64_t Append;
         const char* pReads;
+        std::int64_t Prepend = 0;
     };
     const Case cases[] = {
         {"unchanged", 50, 0, 0, 0, ""},
@@ -193,6 +194,7 @@ TEST(Inspector, StartsAnewWhenTheWindowIsNoLongerTheSame)
         {"another window", 60, 0, 0, 0, "component 0 [0, 100)\n"},
         {"data went back", 50, 0, 20, 0, "component 0 [0, 80)\n"},
         {"a hole in the data", 50, 105, 0, 110, "component 0 [105, 210)\n"},
+        {"more history", 150, 0, 0, 0, "component 0 [-20, 100)\n", 20},
     };
     for (const Case& rCase : cases)
     {
@@ -202,16 +204,34 @@ TEST(Inspector, StartsAnewWhenTheWindowIsNoLongerTheSame)
         block.Append(samples);
         VTraceInspector inspector;
         std::vector<float> scratch;
-        ASSERT_TRUE(inspector.UpdateWindow(block, 0, 50, scratch));
+        ASSERT_TRUE(inspector.UpdateWindow(block, 0, rCase.Prepend > 0 ? rCase.Window : 50, scratch));
         block.TakeReads();
         block.Append(Ramp(100, 100 + rCase.Append));
+        block.Prepend(Ramp(-rCase.Prepend, 0));
         block.TrimHead(rCase.TrimHead);
         block.TrimEnd(rCase.TrimEnd);
         inspector.UpdateWindow(block, 0, rCase.Window, scratch);
         EXPECT_EQ(block.TakeReads(), rCase.pReads);
         const auto expected = Naive(Ramp(block.First(), block.End()), static_cast<std::size_t>(rCase.Window));
         ExpectNear(inspector.Values().Mean, inspector.Values().StandardDeviation, expected);
+        EXPECT_EQ(inspector.Progress(), 1.0);
     }
+}
+
+TEST(Inspector, ProgressIsOneOnlyWhereAllWasTakenIn)
+{
+    MemoryBlock block(1, Period);
+    block.Append(Wave(3 * 120));
+    VTraceInspector inspector;
+    std::vector<float> scratch;
+    for (int call = 1; inspector.UpdateWindow(block, 0, 10'000, scratch); ++call)
+    {
+        const double taken = std::min(120.0 * call, static_cast<double>(block.End()));
+        EXPECT_DOUBLE_EQ(inspector.Progress(), taken / static_cast<double>(block.End())) << call;
+        if (call < 4)
+            block.Append(Wave(30));
+    }
+    EXPECT_EQ(inspector.Progress(), 1.0);
 }
 
 TEST(Inspector, FollowsBlocksOfAnyPeriodAndPlace)

@@ -60,6 +60,11 @@ public:
     {
         m_Values.insert(m_Values.end(), i_rValues.begin(), i_rValues.end());
     }
+    void Prepend(const std::vector<float>& i_rValues)
+    {
+        m_Values.insert(m_Values.begin(), i_rValues.begin(), i_rValues.end());
+        m_First -= static_cast<std::int64_t>(i_rValues.size()) / m_Components;
+    }
     void TrimHead(std::int64_t i_Samples)
     {
         m_Values.erase(m_Values.begin(), m_Values.begin() + i_Samples * m_Components);
