@@ -26,7 +26,7 @@ public:
     virtual void SetInspectedTraces(IResult& o_rResult, std::span<const ITraceId> i_Traces) = 0;
     virtual void RemoveInspectedTraces(IResult& o_rResult, std::span<const ITraceId> i_Traces) = 0;
     virtual void ClearInspectedTraces() = 0;
-    /// Frames relative to the base tick that InspectTrace gets.
+    /// Frames relative to the base tick that InspectTrace gets. NaN is ignored, a time beyond the clock is its end.
     virtual void SetInspectionTime(double i_Frames) = 0;
     /// InvalidArgument when the counts differ. Progress is 0..1: how much of the windows has been read.
     virtual void GetInspectionValues(IResult& o_rResult, std::span<const ITraceId> i_Traces,

@@ -1,7 +1,10 @@
 // What the models of the user interface ask for: colours, and the inspection of traces.
 #include "GraphPlotSystem/VTraceDataProvider.h"
 
+#include "GraphPlotSystem/TraceTimeRules.h"
+
 #include <algorithm>
+#include <cmath>
 
 namespace GraphPlotUI
 {
@@ -76,8 +79,10 @@ void VTraceDataProvider::ClearInspectedTraces()
 
 void VTraceDataProvider::SetInspectionTime(double i_Frames)
 {
+    if (std::isnan(i_Frames))
+        return;
     const std::lock_guard lock(m_Mutex);
-    m_InspectionOffset = TQL::FramesToTicks(i_Frames, m_TicksPerFrame);
+    m_InspectionOffset = SaturatedFramesToTicks(i_Frames, m_TicksPerFrame);
 }
 
 void VTraceDataProvider::GetInspectionValues(IResult& o_rResult, std::span<const ITraceId> i_Traces,

@@ -6,6 +6,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <limits>
 #include <sstream>
 #include <string>
@@ -323,6 +324,35 @@ TEST_F(Provider, InspectsTheChosenTraces)
     std::vector<GraphPlotUI::TraceInspectionValues> tooFew(1);
     m_Provider.GetInspectionValues(result, traces, tooFew, progress);
     EXPECT_EQ(result, Result::InvalidArgument);
+}
+
+TEST_F(Provider, NoInspectionTimeIsTooFarAway)
+{
+    MemoryBlock block;
+    block.Append({1, 2, 3});
+    m_Provider.SetTicksPerFrame(10);
+    const double infinity = std::numeric_limits<double>::infinity();
+    struct Case
+    {
+        double Time;
+        float Expected; ///< NaN: none
+    };
+    IResult result;
+    std::uint64_t number = 0;
+    for (const Case& rCase : {Case{1.0, 2.0f}, Case{std::nan(""), 2.0f}, Case{1e300, Gap}, Case{-1e300, Gap},
+                              Case{infinity, Gap}, Case{-infinity, Gap}, Case{1e17, Gap}})
+    {
+        const ITraceId trace(Channel(++number), 0);
+        m_Provider.SetInspectedTraces(result, std::span(&trace, 1));
+        m_Provider.SetInspectionTime(rCase.Time);
+        for (const std::int64_t base : {std::int64_t{0}, std::int64_t{-10} << 50})
+            m_Provider.InspectTrace(trace.Channel(), block, base, 4);
+        GraphPlotUI::TraceInspectionValues values;
+        float progress = 0.0f;
+        m_Provider.GetInspectionValues(result, std::span(&trace, 1), std::span(&values, 1), progress);
+        EXPECT_TRUE(std::isnan(rCase.Expected) ? std::isnan(values.Value) : values.Value == rCase.Expected)
+            << rCase.Time << " gives " << values.Value;
+    }
 }
 
 TEST_F(Provider, FramesAndTicksPassThrough)
