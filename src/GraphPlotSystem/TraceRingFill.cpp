@@ -50,7 +50,7 @@ private:
 /// No rows yet, the first to come at i_Tick.
 RingExtent EmptyAt(std::int64_t i_Tick)
 {
-    return {0, 0, i_Tick, i_Tick, i_Tick, i_Tick};
+    return {0, 0, i_Tick, i_Tick, i_Tick, i_Tick, i_Tick};
 }
 
 TickRange Intersect(const TickRange& i_rA, const TickRange& i_rB)
@@ -65,7 +65,7 @@ struct FillJob
     RingScratch& rScratch;
     TickRange Allowed; ///< what the block has and the limit allows
     TickRange Wanted;  ///< the request inside that
-    std::int64_t BlockLast;
+    TickRange Block;   ///< what the block has
     std::int64_t GridOffset;
     std::int64_t Stride;
 
@@ -73,6 +73,9 @@ struct FillJob
     {
         return (i_Last - i_First - 1 + Stride) / Stride;
     }
+
+    /// Where what the block has of the first row begins.
+    std::int64_t HeadOf(const RingExtent& i_rExtent) const { return std::max(i_rExtent.FirstTick, Block.First); }
 };
 
 /// Makes the ring's texels fit its source. Here only, when new rows have been read: a failed read must leave all.
@@ -124,13 +127,14 @@ void TrimRing(RingExtent& i_rExtent, const FillJob& i_rJob)
         i_rExtent.Start = (i_rExtent.Start + static_cast<std::uint32_t>(dropped)) & TraceTexelRing::RowMask;
         i_rExtent.RowCount -= static_cast<std::uint32_t>(dropped);
         i_rExtent.FirstTick += dropped * stride;
+        i_rExtent.HeadTick = i_rExtent.FirstTick;
         i_rExtent.ValidFirstTick = i_rExtent.FirstTick;
         i_rExtent.EndTick = std::max(i_rExtent.EndTick, i_rExtent.FirstTick);
     }
     // A row that summarises ticks which the block has lost goes with them; a whole row across the limit stays.
     const std::int64_t last =
-        i_rJob.BlockLast < i_rExtent.EndTick
-            ? AlignDown(std::min(i_rJob.BlockLast, i_rJob.Allowed.Last), stride, i_rJob.GridOffset)
+        i_rJob.Block.Last < i_rExtent.EndTick
+            ? AlignDown(std::min(i_rJob.Block.Last, i_rJob.Allowed.Last), stride, i_rJob.GridOffset)
             : AlignUp(i_rJob.Allowed.Last, stride, i_rJob.GridOffset);
     if (i_rExtent.EndTick > last)
     {
@@ -141,8 +145,29 @@ void TrimRing(RingExtent& i_rExtent, const FillJob& i_rJob)
     }
 }
 
-/// The rows before the ring's first. False when they could not be read.
-bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+/// Drops a first row that summarises other samples than the block has of it now: the block began inside that row and
+/// has got older samples since, or has lost some of them. Where the request reaches that far it is read again. False
+/// when no row is left.
+bool DropChangedHead(RingExtent& i_rExtent, const FillJob& i_rJob)
+{
+    if (i_rExtent.RowCount == 0 || i_rExtent.HeadTick == i_rJob.HeadOf(i_rExtent))
+        return true;
+    i_rExtent.Start = (i_rExtent.Start + 1) & TraceTexelRing::RowMask;
+    --i_rExtent.RowCount;
+    i_rExtent.FirstTick += i_rJob.Stride;
+    return i_rExtent.RowCount > 0;
+}
+
+enum class EFill
+{
+    Nothing, ///< the ring has it all
+    Done,
+    NothingRead, ///< a failed read, the ring is as it was
+    PartRead     ///< a failed read behind rows that are there now
+};
+
+/// The rows before the ring's first.
+EFill Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
 {
     RingExtent& rExtent = i_rRing.Extent;
     const std::int64_t stride = i_rJob.Stride;
@@ -153,9 +178,9 @@ bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
     const std::int64_t last = bSummary ? AlignUp(i_rJob.Wanted.Last, stride, i_rJob.GridOffset) : i_rJob.Wanted.Last;
     const std::int64_t first = std::max(wanted, last - Capacity * stride);
     if (first >= rExtent.FirstTick)
-        return true;
+        return EFill::Nothing;
     if (!ReadRows(i_rRing, i_rJob, {first, rExtent.FirstTick}))
-        return false;
+        return EFill::NothingRead;
     const std::int64_t rows = i_rJob.RowsOf(first, rExtent.FirstTick);
     if (rows >= Capacity)
     {
@@ -171,7 +196,7 @@ bool Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
     rExtent.Start = (rExtent.Start - static_cast<std::uint32_t>(rows)) & TraceTexelRing::RowMask;
     rExtent.FirstTick = first;
     WriteReadRows(i_rRing, i_rJob, rows, 0);
-    return true;
+    return EFill::Done;
 }
 
 /// The next rows after the ring's last, from that row on where it is incomplete, at most i_MostRows of them. False when
@@ -205,21 +230,14 @@ bool AppendPiece(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t i_
     return true;
 }
 
-enum class EAppend
-{
-    Done,
-    NothingRead, ///< a failed read, the ring is as it was
-    PartRead     ///< a failed read behind rows that are there now
-};
-
 /// The rows after the ring's last, at most 4096 of them.
-EAppend Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+EFill Append(TraceTexelRing& i_rRing, const FillJob& i_rJob)
 {
     const std::int64_t piece = i_rRing.Source.Level > 0 ? PieceRows : Capacity;
     for (std::int64_t read = 0; read < Capacity && i_rRing.Extent.EndTick < i_rJob.Wanted.Last; read += piece)
         if (!AppendPiece(i_rRing, i_rJob, piece))
-            return read == 0 ? EAppend::NothingRead : EAppend::PartRead;
-    return EAppend::Done;
+            return read == 0 ? EFill::NothingRead : EFill::PartRead;
+    return EFill::Done;
 }
 
 /// Whether the rows held can be kept for the job.
@@ -228,6 +246,25 @@ bool IsContinued(const TraceTexelRing& i_rRing, const RingSource& i_rSource, con
     const RingExtent& rExtent = i_rRing.Extent;
     return rExtent.RowCount > 0 && i_rRing.Source == i_rSource && i_rJob.Wanted.First <= rExtent.EndTick &&
            i_rJob.Wanted.Last >= rExtent.FirstTick;
+}
+
+EFill StartAnew(TraceTexelRing& i_rRing, const RingSource& i_rSource, const FillJob& i_rJob)
+{
+    i_rRing.Source = i_rSource;
+    i_rRing.Extent = EmptyAt(i_rJob.Wanted.First);
+    return Append(i_rRing, i_rJob);
+}
+
+EFill GoOn(TraceTexelRing& i_rRing, const FillJob& i_rJob)
+{
+    TrimRing(i_rRing.Extent, i_rJob);
+    if (!DropChangedHead(i_rRing.Extent, i_rJob))
+        return StartAnew(i_rRing, i_rRing.Source, i_rJob);
+    const EFill prepended = Prepend(i_rRing, i_rJob);
+    if (prepended == EFill::NothingRead)
+        return prepended;
+    const EFill appended = Append(i_rRing, i_rJob);
+    return appended == EFill::NothingRead && prepended == EFill::Done ? EFill::PartRead : appended;
 }
 
 } // namespace
@@ -247,32 +284,18 @@ bool FillRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const IChannelBl
     const StoreLease lease(i_rBlock.GetStore(), allowed.First);
     const RingSource source = {rShape.pLayout->ComponentCount, rShape.FormatTag, rShape.SamplePeriod, lease.Token(),
                                i_Level};
-    const FillJob job = {i_rBlock, i_rScratch, allowed, wanted, i_rAvailable.Last, rShape.GridOffset, source.Stride()};
+    const FillJob job = {i_rBlock, i_rScratch, allowed, wanted, i_rAvailable, rShape.GridOffset, source.Stride()};
     const RingExtent extentBefore = i_rRing.Extent;
     const RingSource sourceBefore = i_rRing.Source;
-    if (IsContinued(i_rRing, source, job))
-    {
-        TrimRing(i_rRing.Extent, job);
-        if (!Prepend(i_rRing, job))
-        {
-            i_rRing.Extent = extentBefore;
-            return false;
-        }
-        const bool bPrepended = i_rRing.Extent.FirstTick < extentBefore.FirstTick;
-        const EAppend appended = Append(i_rRing, job);
-        if (appended == EAppend::NothingRead && !bPrepended)
-            i_rRing.Extent = extentBefore;
-        return appended == EAppend::Done;
-    }
-    i_rRing.Source = source;
-    i_rRing.Extent = EmptyAt(wanted.First);
-    const EAppend appended = Append(i_rRing, job);
-    if (appended == EAppend::NothingRead)
+    const EFill filled = IsContinued(i_rRing, source, job) ? GoOn(i_rRing, job) : StartAnew(i_rRing, source, job);
+    if (filled == EFill::NothingRead)
     {
         i_rRing.Source = sourceBefore;
         i_rRing.Extent = extentBefore;
+        return false;
     }
-    return appended == EAppend::Done;
+    i_rRing.Extent.HeadTick = job.HeadOf(i_rRing.Extent);
+    return filled == EFill::Done;
 }
 
 void UpdateRing(TraceTexelRing& i_rRing, RingScratch& i_rScratch, const IChannelBlock& i_rBlock,

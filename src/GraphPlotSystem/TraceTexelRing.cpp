@@ -299,10 +299,10 @@ void WriteSourceRows(TraceTexelRing& i_rRing, std::span<const TSource> i_Source,
 
     i_rRing.Extent.RowCount += count;
     UpdateValidTicks(i_rRing, i_RowOffset, count, bWasEmpty);
-    std::uint32_t changed = count;
     if (i_RowOffset == 0 && !bWasEmpty)
-        changed = RepairDistances(i_rRing, count);
-    MarkDirty(i_rRing.Dirty, first, changed);
+        MarkDirty(i_rRing.DirtyHead, first, RepairDistances(i_rRing, count));
+    else
+        MarkDirty(i_rRing.Dirty, first, count);
 }
 
 } // namespace

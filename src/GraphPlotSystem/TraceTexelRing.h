@@ -39,6 +39,9 @@ struct RingExtent
     std::int64_t EndTick = 0;        ///< exclusive; inside the last row while that row is incomplete
     std::int64_t ValidFirstTick = 0; ///< the part without a gap at its ends
     std::int64_t ValidEndTick = 0;
+    std::int64_t HeadTick = 0; ///< what row 0 holds begins here: FirstTick, or where the block began inside that row
+
+    friend bool operator==(const RingExtent&, const RingExtent&) = default;
 };
 
 /// What the rows are made from. A ring whose source has changed starts anew.
@@ -85,6 +88,8 @@ struct TraceTexelRing
     RingExtent Extent;
     RingSource Source;
     DirtyRows Dirty;
+    DirtyRows
+        DirtyHead; ///< of rows put before others: apart, so that both ends of a live ring can change at little cost
     std::vector<TraceTexel> Texels;
     std::vector<RingGaps> Gaps; ///< one a component
 

@@ -3,6 +3,8 @@
 
 #include "CoreGraphics/Texture2D.h"
 
+#include <utility>
+
 namespace GraphPlotUI
 {
 
@@ -26,11 +28,12 @@ bool UploadRows(TraceTexelRing& i_rRing, CoreGraphics::Texture2D& i_rTexture, Co
             return false;
         MarkDirty(i_rRing.Dirty, 0, TraceTexelRing::Capacity);
     }
-    if (i_rRing.Dirty.IsEmpty())
-        return true;
-    i_rTexture.UploadRows(i_rContext, static_cast<int>(i_rRing.Dirty.First), static_cast<int>(i_rRing.Dirty.End),
-                          i_rRing.Texels.data() + std::size_t{i_rRing.Dirty.First} * i_rRing.Source.ComponentCount);
-    i_rRing.Dirty = {};
+    for (DirtyRows* pRows : {&i_rRing.Dirty, &i_rRing.DirtyHead})
+    {
+        const DirtyRows rows = std::exchange(*pRows, {});
+        i_rTexture.UploadRows(i_rContext, static_cast<int>(rows.First), static_cast<int>(rows.End),
+                              i_rRing.Texels.data() + std::size_t{rows.First} * i_rRing.Source.ComponentCount);
+    }
     return true;
 }
 

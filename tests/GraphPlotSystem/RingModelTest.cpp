@@ -10,6 +10,7 @@
 #include <cstring>
 #include <random>
 #include <string>
+#include <utility>
 #include <vector>
 
 // Random sequences of what a window does to a ring, each step compared with rows computed anew from the block.
@@ -26,7 +27,6 @@ namespace
 
 constexpr std::int64_t Period = 10;
 constexpr std::int64_t GridOffset = 3;
-constexpr std::int64_t TrimStep = 16; ///< samples; whole rows of every level in use
 constexpr TickRange Everything = {-1'000'000'000, 1'000'000'000};
 
 class RingModel
@@ -35,7 +35,7 @@ public:
     RingModel(unsigned i_Seed, std::uint32_t i_Components)
         : m_Random(i_Seed), m_Components(i_Components), m_Block(i_Components, Period, 4, GridOffset)
     {
-        m_Block.Append(MakeSamples(3000));
+        m_Block.Append(MakeSamples(0, 3000));
         m_Window = {1000, 2200};
     }
 
@@ -79,20 +79,38 @@ private:
     }
     bool Chance(double i_Probability) { return std::bernoulli_distribution(i_Probability)(m_Random); }
 
-    /// A wave a component, with holes of up to 40 samples.
-    std::vector<float> MakeSamples(std::int64_t i_Count)
+    /// Some number that always comes with a sample, a component and the present series.
+    std::uint32_t Hash(std::int64_t i_Sample, std::uint32_t i_Component) const
     {
+        std::uint32_t hash = static_cast<std::uint32_t>(i_Sample) * 0x9e3779b1u + i_Component * 0x85ebca6bu + m_Series;
+        hash = (hash ^ (hash >> 15)) * 0x2c1b3c6du;
+        return hash ^ (hash >> 13);
+    }
+
+    /// A wave a component with noise on it and holes of up to 40 samples. What a block has lost comes back the same.
+    std::vector<float> MakeSamples(std::int64_t i_First, std::int64_t i_End) const
+    {
+        constexpr std::int64_t cell = 64; // may have one hole
         std::vector<float> samples;
-        std::vector<std::int64_t> hole(m_Components, 0);
-        for (std::int64_t i = 0; i < i_Count; ++i)
+        for (std::int64_t n = i_First; n < i_End; ++n)
             for (std::uint32_t c = 0; c < m_Components; ++c)
             {
-                if (hole[c] == 0 && Chance(0.01))
-                    hole[c] = Between(1, 40);
-                samples.push_back(hole[c] > 0 ? Gap : std::sin(0.01f * static_cast<float>(++m_Phase)));
-                hole[c] = std::max<std::int64_t>(0, hole[c] - 1);
+                const std::uint32_t hash = Hash(TQL::FloorDivide(n, cell), c);
+                const std::int64_t place = TQL::AlignDown(n, cell) + (hash >> 8) % cell - 20;
+                const bool bHole = hash % 2 == 0 && n >= place && n < place + (hash >> 16) % 40;
+                const float noise = static_cast<float>(Hash(n, c) % 1000) * 0.001f;
+                samples.push_back(bHole ? Gap : std::sin(0.01f * static_cast<float>(n)) + noise);
             }
         return samples;
+    }
+
+    void Append(std::int64_t i_Samples) { m_Block.Append(MakeSamples(m_Block.End(), m_Block.End() + i_Samples)); }
+    void Prepend(std::int64_t i_Samples) { m_Block.Prepend(MakeSamples(m_Block.First() - i_Samples, m_Block.First())); }
+
+    /// At most i_Samples, so that one is left.
+    std::int64_t Spared(std::int64_t i_Samples) const
+    {
+        return std::min(i_Samples, m_Block.End() - m_Block.First() - 1);
     }
 
     void MoveWindow(std::int64_t i_By)
@@ -103,19 +121,19 @@ private:
 
     void Change()
     {
-        switch (Between(0, 10))
+        switch (Between(0, 13))
         {
         case 0:
         case 1:
         case 2: // live: new samples, and the window follows
         {
             const std::int64_t count = Between(1, 60);
-            m_Block.Append(MakeSamples(count));
+            Append(count);
             MoveWindow(count);
             break;
         }
         case 3:
-            m_Block.Append(MakeSamples(Between(1, 700)));
+            Append(Between(1, 700));
             break;
         case 4:
         case 5:
@@ -132,11 +150,24 @@ private:
             m_Level = static_cast<std::uint8_t>(Between(0, 4));
             break;
         case 9:
-            m_Block.TrimHead(std::min(Between(0, 20), (m_Block.End() - m_Block.First()) / TrimStep - 1) * TrimStep);
+            m_Block.TrimHead(Spared(Between(0, 320)));
+            break;
+        case 10:
+            m_Block.TrimEnd(Spared(Between(0, 50)));
+            break;
+        case 11:
+        case 12: // history that comes after the newest, and a window on all there is of it
+            Prepend(Between(1, 900));
+            if (Chance(0.5))
+                m_Window.First = m_Block.First() - Between(0, 40);
             break;
         default:
             if (Chance(0.3))
-                m_Block.Replace(TrimStep * Between(0, 40), MakeSamples(Between(500, 6000)));
+            {
+                m_Series = static_cast<std::uint32_t>(Between(0, 1'000'000));
+                const std::int64_t first = Between(-300, 600);
+                m_Block.Replace(first, MakeSamples(first, first + Between(500, 6000)));
+            }
             m_Window = {m_Block.First() + Between(-100, 500), m_Block.First() + Between(600, 6500)};
             break;
         }
@@ -197,10 +228,13 @@ private:
     void UploadAndCompare()
     {
         m_Texture.resize(m_Ring.Texels.size());
-        const auto begin = static_cast<std::ptrdiff_t>(m_Ring.Dirty.First * m_Components);
-        std::copy_n(m_Ring.Texels.begin() + begin, (m_Ring.Dirty.End - m_Ring.Dirty.First) * m_Components,
-                    m_Texture.begin() + begin);
-        m_Ring.Dirty = {};
+        for (GraphPlotUI::DirtyRows* pRows : {&m_Ring.Dirty, &m_Ring.DirtyHead})
+        {
+            const auto rows = std::exchange(*pRows, {});
+            const auto begin = static_cast<std::ptrdiff_t>(rows.First * m_Components);
+            std::copy_n(m_Ring.Texels.begin() + begin, (rows.End - rows.First) * m_Components,
+                        m_Texture.begin() + begin);
+        }
         for (std::uint32_t row = 0; row < m_Ring.Extent.RowCount; ++row)
         {
             const std::size_t first = std::size_t{m_Ring.TextureRow(row)} * m_Components;
@@ -217,7 +251,7 @@ private:
     std::vector<TraceTexel> m_Texture;
     TickRange m_Window; ///< samples
     std::uint8_t m_Level = 0;
-    int m_Phase = 0;
+    std::uint32_t m_Series = 0;
     std::string m_Log;
 };
 

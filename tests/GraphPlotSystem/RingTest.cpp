@@ -230,16 +230,19 @@ TEST(Ring, PrependedRowsRepairTheDistancesAfterThem)
         const char* pDirty; ///< new rows, and those after them up to the first with data
     };
     const Step steps[] = {
-        {{4, 9}, "level 0 ticks [40, 90) valid [70, 80) rows 5 at 4095\n4/1 -/1 -/2 7/3 8/1\n", 3, "[0, 4096)"},
-        {{3, 9}, "level 0 ticks [30, 90) valid [70, 80) rows 6 at 4094\n3/1 4/1 -/1 -/2 7/3 8/1\n", 3, "[4094, 4096)"},
+        {{4, 9}, "level 0 ticks [40, 90) valid [70, 80) rows 5 at 4095\n4/1 -/1 -/2 7/3 8/1\n", 3, "head [0, 4096)"},
+        {{3, 9},
+         "level 0 ticks [30, 90) valid [70, 80) rows 6 at 4094\n3/1 4/1 -/1 -/2 7/3 8/1\n",
+         3,
+         "head [4094, 4096)"},
         {{2, 9},
          "level 0 ticks [20, 90) valid [70, 80) rows 7 at 4093\n-/1 3/2 4/1 -/1 -/2 7/3 8/1\n",
          3,
-         "[4093, 4095)"},
+         "head [4093, 4095)"},
         {{0, 9},
          "level 0 ticks [0, 90) valid [70, 80) rows 9 at 4091\n0/1 1/1 -/1 3/2 4/1 -/1 -/2 7/3 8/1\n",
          3,
-         "[4091, 4095)"},
+         "head [4091, 4095)"},
     };
     for (const Step& rStep : steps)
     {
@@ -291,8 +294,8 @@ TEST(Ring, DropsWhatTheLimitOrTheBlockTakesAway)
          1,
          [](MemoryBlock& rBlock) { rBlock.TrimHead(3); },
          {0, 7},
-         "level 1 ticks [20, 70) valid [20, 60) rows 3 at 1\n2..2.5..3/1 4..4.5..5/1 6..6..6/1\n",
-         ""},
+         "level 1 ticks [20, 70) valid [20, 60) rows 3 at 1\n3..3..3/1 4..4.5..5/1 6..6..6/1\n",
+         "summary 0 [2, 4)\n"},
         {"limit before a half filled row",
          1,
          [](MemoryBlock&) {},

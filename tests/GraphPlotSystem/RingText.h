@@ -5,6 +5,7 @@
 #include <cmath>
 #include <sstream>
 #include <string>
+#include <utility>
 
 namespace TestSupport
 {
@@ -51,12 +52,18 @@ inline std::string RingText(const GraphPlotUI::TraceTexelRing& i_rRing)
     return text;
 }
 
-/// "[3, 5)" or "none"; the ring's dirty rows count as uploaded then.
+/// "[3, 5)" or "none", with "head [1, 2)" before it for rows put before others; they count as uploaded then.
 inline std::string TakeDirty(GraphPlotUI::TraceTexelRing& i_rRing)
 {
-    const GraphPlotUI::DirtyRows dirty = i_rRing.Dirty;
-    i_rRing.Dirty = {};
-    return dirty.IsEmpty() ? "none" : "[" + std::to_string(dirty.First) + ", " + std::to_string(dirty.End) + ")";
+    const auto text = [](const GraphPlotUI::DirtyRows& i_rRows)
+    {
+        return "[" + std::to_string(i_rRows.First) + ", " + std::to_string(i_rRows.End) + ")";
+    };
+    const auto head = std::exchange(i_rRing.DirtyHead, {});
+    const auto dirty = std::exchange(i_rRing.Dirty, {});
+    if (!head.IsEmpty())
+        return "head " + text(head) + (dirty.IsEmpty() ? "" : " " + text(dirty));
+    return dirty.IsEmpty() ? "none" : text(dirty);
 }
 
 } // namespace TestSupport
