@@ -98,25 +98,32 @@ struct TimeUnit
     double Seconds;
 };
 
-constexpr std::array<TimeUnit, 21> TimeUnits{{{"s", 1.0},
+constexpr std::array<TimeUnit, 28> TimeUnits{{{"s", 1.0},
                                               {"sec", 1.0},
                                               {"secs", 1.0},
                                               {"second", 1.0},
                                               {"seconds", 1.0},
                                               {"ms", 1e-3},
                                               {"msec", 1e-3},
+                                              {"msecs", 1e-3},
                                               {"millis", 1e-3},
                                               {"millisecond", 1e-3},
                                               {"milliseconds", 1e-3},
                                               {"us", 1e-6},
                                               {"\xC2\xB5s", 1e-6},
                                               {"\xCE\xBCs", 1e-6},
+                                              {"usec", 1e-6},
+                                              {"microsecond", 1e-6},
                                               {"microseconds", 1e-6},
                                               {"ns", 1e-9},
+                                              {"nanosecond", 1e-9},
                                               {"nanoseconds", 1e-9},
                                               {"min", 60.0},
+                                              {"mins", 60.0},
                                               {"minutes", 60.0},
                                               {"h", 3600.0},
+                                              {"hr", 3600.0},
+                                              {"hour", 3600.0},
                                               {"hours", 3600.0},
                                               {"minute", 60.0}}};
 
@@ -144,6 +151,11 @@ std::optional<double> SecondsOf(std::string_view i_Unit)
     const auto found = std::find_if(TimeUnits.begin(), TimeUnits.end(),
                                     [&](const TimeUnit& i_rUnit) { return i_rUnit.Name == i_Unit; });
     return found == TimeUnits.end() ? std::nullopt : std::optional<double>(found->Seconds);
+}
+
+bool IsTimeWord(std::string_view i_Name)
+{
+    return Contains(TimeWords, i_Name) || i_Name == "t";
 }
 
 // In small letters, without a unit in brackets.
@@ -288,7 +300,9 @@ std::string UnitInName(std::string_view i_Name)
     if (name.back() != (name[open] == '[' ? ']' : ')'))
         return {};
     const std::string unit = BareUnit(name.substr(open));
-    return name[open] == '[' || IsUnit(unit) ? unit : std::string();
+    // "Height (h)" is no time, "Time (h)" is one.
+    const bool bOfTime = SecondsOf(SmallLetters(unit)) && IsTimeWord(SmallLetters(TrimBlanks(name.substr(0, open))));
+    return name[open] == '[' || IsUnit(unit) || bOfTime ? unit : std::string();
 }
 
 TimeColumn FindTimeColumn(const std::vector<ColumnHead>& i_rHeads)

@@ -27,7 +27,8 @@ bool IsUnit(std::string_view i_Text);
 /// A unit without the brackets around it.
 std::string BareUnit(std::string_view i_Text);
 
-/// The unit at the end of a name: "Force [N]" gives "N", "time (ms)" "ms"; round brackets only around a known unit.
+/// The unit at the end of a name: "Force [N]" gives "N", "time (ms)" "ms"; round brackets only around a known unit, one
+/// of time too where the name is that of a time: "Time (h)".
 std::string UnitInName(std::string_view i_Name);
 
 /// Which column holds the times, and what they are.

@@ -1,5 +1,6 @@
 #include "RecordingText.h"
 
+#include "Recordings/ColumnNames.h"
 #include "Recordings/CsvReader.h"
 #include "Recordings/StorageTableReader.h"
 #include "Recordings/TextScan.h"
@@ -241,6 +242,18 @@ TEST(CsvReader, HeadIsFoundByLooking)
     };
     for (const Case& rCase : cases)
         EXPECT_EQ(Brief(Recordings::ReadCsv, rCase.Text), rCase.Expected) << rCase.Text;
+}
+
+TEST(CsvReader, TimesInAllUnits)
+{
+    const std::pair<const char*, double> heads[] = {
+        {"Time (msec)", 1e-3}, {"Time (h)", 3600.0},         {"time (minutes)", 60.0}, {"Elapsed (second)", 1.0},
+        {"t (hr)", 3600.0},    {"Time (\xCE\xBCs)", 1e-6},   {"time [usec]", 1e-6},    {"time_msec", 1e-3},
+        {"minutes", 60.0},     {"Timestamp (Hours)", 3600.0}};
+    for (const auto& [pHead, seconds] : heads)
+        EXPECT_EQ(Recordings::FindTimeColumn({{pHead, Recordings::UnitInName(pHead)}}).Unit, seconds) << pHead;
+    EXPECT_EQ(Brief(Recordings::ReadCsv, "Time (msec),Height (h)\n0,1\n4,2\n8,3\n"),
+              "column Height (h) [] 250 Hz: 1 | 2 | 3\n");
 }
 
 TEST(CsvReader, GroupsOnlyWhatIsClearlyOneThing)
