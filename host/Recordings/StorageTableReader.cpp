@@ -27,6 +27,7 @@ constexpr std::size_t MostParts = 1024;
 struct StorageHead
 {
     std::vector<std::string_view> Labels;
+    char Separator = '\t'; ///< of the labels
     bool bDegrees = false;
     bool bAngleUnits = false; ///< whether the head says how angles are given
     bool bVectors = false;    ///< whether it says that cells hold several numbers
@@ -38,19 +39,39 @@ struct StorageHead
     std::size_t BodyLine = 1;
 };
 
-bool IsHeadEnd(std::string_view i_Line)
+// A line of the head without what spreadsheets fill up its row with.
+std::string_view TrimPadding(std::string_view i_Line)
 {
-    return EqualsAnyCase(TrimBlanks(i_Line), "endheader");
+    while (!i_Line.empty() && std::string_view(" \t,;").find(i_Line.back()) != std::string_view::npos)
+        i_Line.remove_suffix(1);
+    return TrimBlanks(i_Line);
 }
 
-// "key=value", "key value" and "key: value" alike.
+bool IsHeadEnd(std::string_view i_Line)
+{
+    return EqualsAnyCase(TrimPadding(i_Line), "endheader");
+}
+
+// What stands between the names: tabs, else semicolons or commas as spreadsheets write them, else runs of blanks.
+char LabelSeparator(std::string_view i_Line)
+{
+    if (i_Line.find('\t') != std::string_view::npos)
+        return '\t';
+    const std::size_t words = SplitCells(i_Line, ' ').size();
+    for (const char separator : {';', ','})
+        if (const std::size_t cells = SplitCells(i_Line, separator).size(); cells > 1 && cells >= words)
+            return separator;
+    return ' ';
+}
+
+// "key=value", "key value", "key: value" and "key,value" alike.
 void ReadFact(std::string_view i_Line, StorageHead& io_rHead)
 {
-    const std::string_view line = TrimBlanks(i_Line);
-    const std::size_t end = std::min(line.find_first_of("=: \t"), line.size());
+    const std::string_view line = TrimPadding(i_Line);
+    const std::size_t end = std::min(line.find_first_of("=: \t,;"), line.size());
     const std::string_view key = line.substr(0, end);
     std::string_view value = line.substr(end);
-    while (!value.empty() && std::string_view("=: \t").find(value.front()) != std::string_view::npos)
+    while (!value.empty() && std::string_view("=: \t,;").find(value.front()) != std::string_view::npos)
         value.remove_prefix(1);
     if (EqualsAnyCase(key, "nRows") || EqualsAnyCase(key, "datarows"))
         io_rHead.bRows = ReadCount(value, io_rHead.Rows);
@@ -73,13 +94,15 @@ bool ReadHead(std::string_view i_Text, StorageHead& o_rHead)
     bool bEnded = false;
     while (lines.GetLineCount() < MostHeadLines && lines.Next(line))
     {
-        const std::vector<std::string_view> cells = SplitCells(line.substr(0, 4096), TabOrBlank(line));
+        const std::vector<std::string_view> cells =
+            SplitCells(line.substr(0, 4096), LabelSeparator(line.substr(0, 4096)));
         const bool bNames = cells.size() > 1 && EqualsAnyCase(cells.front(), "time");
         if (IsHeadEnd(line))
             bEnded = true;
         else if (bNames || (bEnded && !cells.empty()))
         {
-            o_rHead.Labels = SplitCells(line, TabOrBlank(line));
+            o_rHead.Separator = LabelSeparator(line);
+            o_rHead.Labels = SplitCells(line, o_rHead.Separator);
             o_rHead.BodyOffset = lines.GetOffset();
             o_rHead.BodyLine = lines.GetLineCount() + 1;
             return true;
@@ -104,11 +127,14 @@ struct RowLook
     bool bRows = false;
 };
 
-char RowSeparator(std::string_view i_Row, std::size_t i_Columns)
+char RowSeparator(std::string_view i_Row, const StorageHead& i_rHead)
 {
+    if (i_rHead.Separator == ',' || i_rHead.Separator == ';')
+        return i_rHead.Separator;
     if (i_Row.find('\t') == std::string_view::npos)
         return ' ';
-    const bool bTabs = SplitCells(i_Row, '\t').size() == i_Columns || SplitCells(i_Row, ' ').size() != i_Columns;
+    const bool bTabs = SplitCells(i_Row, '\t').size() == i_rHead.Labels.size() ||
+                       SplitCells(i_Row, ' ').size() != i_rHead.Labels.size();
     return bTabs ? '\t' : ' ';
 }
 
@@ -121,7 +147,7 @@ RowLook LookAtRows(std::string_view i_Rows, const StorageHead& i_rHead)
     {
         if (TrimBlanks(line).empty())
             continue;
-        look.Separator = row++ == 0 ? RowSeparator(line, i_rHead.Labels.size()) : look.Separator;
+        look.Separator = row++ == 0 ? RowSeparator(line, i_rHead) : look.Separator;
         look.bRows = true;
         const std::vector<std::string_view> cells = SplitCells(line, look.Separator);
         look.Parts.resize(std::max(look.Parts.size(), cells.size()), 1);

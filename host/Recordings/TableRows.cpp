@@ -174,7 +174,7 @@ private:
 
     void ReadParts(std::string_view i_Cell, std::size_t i_Column, std::span<float> o_Values)
     {
-        constexpr std::string_view around = "~()[]";
+        constexpr std::string_view around = "~()[]\"";
         while (!i_Cell.empty() && around.find(i_Cell.front()) != std::string_view::npos)
             i_Cell.remove_prefix(1);
         while (!i_Cell.empty() && around.find(i_Cell.back()) != std::string_view::npos)
@@ -249,6 +249,14 @@ bool IsRow(const TableBody& i_rBody, std::string_view i_Line)
     return !i_rBody.bRemarks || !IsRemark(i_Line);
 }
 
+// Without the rows at the end that hold nothing, which spreadsheets leave where something stood once.
+std::string_view WithoutEmptyEnd(std::string_view i_Rows, char i_Separator)
+{
+    const std::string nothing = std::string(" \t\r\n\"") + i_Separator;
+    const std::size_t last = i_Rows.find_last_not_of(nothing);
+    return last == std::string_view::npos ? i_Rows : i_Rows.substr(0, i_Rows.find_first_of("\r\n", last));
+}
+
 // Calls a function with each row and the number of its line. The share of the whole that is done rises from i_Before to
 // i_After. False when the progress says stop.
 template <typename TFunction>
@@ -264,7 +272,7 @@ bool ForEachRow(const TableBody& i_rBody, VReadProgress* i_pProgress, double i_B
         return TellProgress(i_pProgress, static_cast<std::size_t>(done * static_cast<double>(whole)), whole);
     };
     std::size_t nextTold = 0;
-    VLineScanner lines(i_rBody.Rows);
+    VLineScanner lines(WithoutEmptyEnd(i_rBody.Rows, i_rBody.Rules.Separator));
     for (std::string_view line; lines.Next(line);)
     {
         if (lines.GetOffset() >= nextTold)

@@ -66,8 +66,9 @@ inline constexpr std::size_t MostColumns = 100'000;
 
 /// Reads rows into the samples of channels, row by row from the first sample on; what no cell feeds is NaN. The names
 /// and components of the channels stand already. o_rTimes gets a time for each row, in seconds; its hint is set.
-/// Blank lines are no rows. Memory: a float for each cell that the file holds; an error where the head names so many
-/// columns that most would stand empty. i_pProgress may be null; when it says stop the result is Canceled.
+/// Blank lines are no rows, nor are rows of empty cells at the end. Memory: a float for each cell that the file holds;
+/// an error where the head names so many columns that most would stand empty. i_pProgress may be null; when it says
+/// stop the result is Canceled.
 [[nodiscard]] TQL::IResult ReadTableRows(const TableBody& i_rBody, VReadProgress* i_pProgress,
                                          std::vector<RecordedChannel>& io_rChannels, TableTimes& o_rTimes,
                                          TableFindings& o_rFindings, std::string& o_rError);

@@ -171,6 +171,14 @@ TEST(StorageTable, HeadsAndCells)
          "column torso [] 100 Hz: 1 0 0 0 | - - - -\ncolumn leg [] 100 Hz: 0.5 0.5 -0.5 0.5 | 0 1 0 0\n"},
         {"endheader\ntime\ta\n0\t~[1, 2,3]\n0.01\t(4,5,6)\n", "column a [] 100 Hz: 1 2 3 | 4 5 6\n"},
         {"endheader\ntime\ta\n0,00\t1,5\n0,01\t-2,5\n", "column a [] 100 Hz: 1.5 | -2.5\n"},
+        // As spreadsheets save them.
+        {"Name,,\nnRows=9,,\ninDegrees=yes,,\nendheader,,\ntime,hip_flexion,f\n0,1,2\n0.01,3,\n,,\n",
+         "column hip_flexion [deg] 100 Hz: 1 | 3\ncolumn f [] 100 Hz: 2 | -\n"
+         "warning: The head of the file promises 9 rows; it holds 2.\n"},
+        {"DataType=Quaternion,\nendheader,\ntime,a\n0,\"1,0,0,0\"\n1,\"0,1,0,0\"\n",
+         "column a [] 1 Hz: 1 0 0 0 | 0 1 0 0\n"},
+        {"inDegrees;no;\nendheader;;\ntime;hip rotation;b\n0;0,5;1\n0,01;1,5;2\n",
+         "column hip rotation [rad] 100 Hz: 0.5 | 1.5\ncolumn b [] 100 Hz: 1 | 2\n"},
         {"datacolumns 2\ndatarows 1\ntime a\n0 1\n", "column a [] 120 Hz: 1\n"},
         {"endheader\na\tb\n1\t2\t3\n", "column a [] 120 Hz: 1\ncolumn b [] 120 Hz: 2\ncolumn Column 3 [] 120 Hz: 3\n"
                                        "warning: The file has no times and says no rate; the rows follow one another "
@@ -215,6 +223,9 @@ TEST(CsvReader, HeadIsFoundByLooking)
          "column Column 2 [] 50 Hz: 1 | 3 | 5\ncolumn Column 3 [] 50 Hz: 2 | 4 | 6\nwarning: The table has no row of "
          "names; its columns are numbered.\nwarning: The first column has no name and rises evenly; it is taken as the "
          "time in seconds.\n"},
+        {"x,y\n1,2\n,\n,3\n,\n , \n\"\",\n",
+         "column x [] 120 Hz: 1 | - | -\ncolumn y [] 120 Hz: 2 | - | 3\nwarning: The file has no times and says no "
+         "rate; the rows follow one another at 120 Hz.\n"},
         {"x,y\n1,2\n", "column x [] 120 Hz: 1\ncolumn y [] 120 Hz: 2\nwarning: The file has no times and says no rate; "
                        "the rows follow one another at 120 Hz.\n"},
         {"time,what,x,,\n0,stand,1,,\n1,walk,2,,\n2,,3,,\n",
