@@ -209,29 +209,43 @@ public:
     {
     }
 
-    /// False when the reading was stopped. i_Size: bytes of the whole file.
-    bool Read(VLineScanner& io_rLines, std::size_t i_Size, VReadProgress* i_pProgress,
-              std::vector<std::string>& io_rWarnings)
+    /// i_Text: the whole file, of which io_rLines gives the lines.
+    TQL::IResult Read(std::string_view i_Text, VLineScanner& io_rLines, VReadProgress* i_pProgress,
+                      std::vector<std::string>& io_rWarnings, std::string& o_rError)
     {
         const bool bWrapped = AreFramesWrapped(io_rLines, m_Frame.size());
+        const char* const pEnd = i_Text.data() + i_Text.size();
         for (std::string_view line; io_rLines.Next(line);)
         {
             const std::size_t words = TakeWords(line, bWrapped);
-            if (words != 0 && !bWrapped)
+            if (words != 0 && words < m_Frame.size() && !bWrapped && line.data() + line.size() == pEnd)
+                m_bTorn = true; // its last number may be half of one
+            else if (words != 0 && !bWrapped)
                 EndLine(words);
-            if (!TellProgress(i_pProgress, io_rLines.GetOffset(), i_Size))
-                return false;
+            if (m_Absent > std::max(FreeNumbers, i_Text.size()))
+                return RefuseShortLines(o_rError);
+            if (!TellProgress(i_pProgress, io_rLines.GetOffset(), i_Text.size()))
+                return StoppedReading(o_rError);
         }
-        if (bWrapped && m_Filled != 0)
+        if (m_bTorn || (bWrapped && m_Filled != 0))
             io_rWarnings.push_back("The last frame is not complete; it is left out.");
         Tell(io_rWarnings, m_Unreadable, "numbers could not be read; they are missing samples.");
         Tell(io_rWarnings, m_UnequalLines,
              "lines hold another number of values than the hierarchy has channels; values without a channel are left "
              "out, absent ones are missing samples.");
-        return true;
+        return TQL::Result::Ok;
     }
 
 private:
+    static constexpr std::size_t FreeNumbers = 1 << 13; ///< that a small file may lack
+
+    TQL::IResult RefuseShortLines(std::string& o_rError) const
+    {
+        o_rError = "the hierarchy has " + std::to_string(m_Frame.size()) +
+                   " channels, but most lines of the motion are much shorter" + s_pExportAgain;
+        return TQL::Result::InvalidFormat;
+    }
+
     static void Tell(std::vector<std::string>& io_rWarnings, std::size_t i_Count, const char* i_pWhat)
     {
         if (i_Count != 0)
@@ -257,6 +271,7 @@ private:
     void EndLine(std::size_t i_Words)
     {
         m_UnequalLines += i_Words == m_Frame.size() ? 0 : 1;
+        m_Absent += m_Frame.size() - m_Filled;
         TakeFrame();
     }
 
@@ -272,6 +287,8 @@ private:
     std::size_t m_Filled = 0;
     std::size_t m_Unreadable = 0;
     std::size_t m_UnequalLines = 0;
+    std::size_t m_Absent = 0; ///< numbers that no line holds: they cost memory, but nothing in the file
+    bool m_bTorn = false;
 };
 
 /// The frames that the rest of the file can hold at most, or what the header says if that is less.
@@ -296,8 +313,10 @@ TQL::IResult ReadAll(std::span<const std::byte> i_File, const ReadOptions& i_rOp
         hierarchy, header.Rate,
         ExpectedFrames(header, text.size() - std::min(lines.GetOffset(), text.size()), hierarchy.ColumnCount),
         recording);
-    if (!FrameReader(hierarchy.ColumnCount, sink).Read(lines, text.size(), i_rOptions.pProgress, recording.Warnings))
-        return StoppedReading(o_rError);
+    if (const TQL::IResult result = FrameReader(hierarchy.ColumnCount, sink)
+                                        .Read(text, lines, i_rOptions.pProgress, recording.Warnings, o_rError);
+        result.IsError())
+        return result;
     if (sink.GetFrameCount() == 0)
     {
         o_rError = std::string("the file holds no frame of motion") + s_pExportAgain;

@@ -111,7 +111,9 @@ TEST(Bvh, QuirksAreReadAndTold)
          "HIERARCHY" + s_Hierarchy.substr(9) + "MOTION\nFrames: 2147483648\nFrame Time: 0.01\n" + s_Rest,
          "promises 2147483648", "0.000 0.000 0.000"},
         {"frames across lines", Motion("0 0 0 0\n0 0 0\n0 0\n0 0 0 0 0 0 4\n5\n6\n"), "", "4.000 5.000 6.000"},
-        {"a line cut short", Motion(s_Rest + "0 0 0 0 0 0 7 8"), "another number of values", "7.000 8.000 nan"},
+        {"a line that is short", Motion(s_Rest + "0 0 0 0 0 0 7 8\n"), "another number of values", "7.000 8.000 nan"},
+        {"a file torn in a number", Motion(s_Rest + s_Rest + "0 0 0 0 0 0 7 8.7"), "not complete; it is left out",
+         "0.000 0.000 0.000"},
         {"a word and a number beyond all", Motion(s_Rest + "0 0 0 0 0 0 x 1e999 2\n"), "2 numbers", "nan nan 2.000"},
     };
     for (const Row& rRow : rows)
@@ -157,7 +159,19 @@ TEST(Bvh, BadFilesGetAClearError)
     std::string deep = "HIERARCHY\nROOT R\n{\n";
     for (int i = 0; i < 100000; ++i)
         deep += "JOINT J\n{\n";
+    // Each short line would become a frame of all channels.
+    std::string wide = "HIERARCHY\nROOT R\n{\n";
+    for (int i = 0; i < 1000; ++i)
+        wide += "CHANNELS 3 Xrotation Yrotation Zrotation\nJOINT J\n{\n";
+    for (int i = 0; i < 1001; ++i)
+        wide += "}\n";
+    wide += "MOTION\n";
+    for (int i = 0; i < 3000; ++i)
+        wide += "0 ";
+    for (int i = 0; i < 30000; ++i)
+        wide += "\n1";
     const Row rows[] = {
+        {wide, "3000 channels, but most lines of the motion are much shorter"},
         {"", "HIERARCHY"},
         {"HIERARCHY\n", "ends before MOTION"},
         {"HIERARCHY\nMOTION\n", "no ROOT"},
