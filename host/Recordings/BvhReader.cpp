@@ -42,25 +42,26 @@ struct MotionHeader
 };
 
 /// The roundest rate that gives the frame time as it was written; AssumedRate for one that is no time.
-double RateOfFrameTime(std::string_view i_Cell, std::vector<std::string>& io_rWarnings)
+double RateOfFrameTime(std::string_view i_Cell, VRecording& io_rRecording)
 {
     double time = 0.0;
     if (ReadNumber(i_Cell, false, time) != ECell::Number || !(time > 0.0) || !IsUsableRate(1.0 / time))
     {
-        io_rWarnings.push_back("The frame time \"" + CellText(i_Cell.substr(0, 40)) + "\" is no usable time; " +
-                               NumberText(AssumedRate) + " frames a second are assumed.");
+        io_rRecording.Warnings.push_back("The frame time \"" + CellText(i_Cell.substr(0, 40)) +
+                                         "\" is no usable time; " + NumberText(AssumedRate) +
+                                         " frames a second are assumed.");
         return AssumedRate;
     }
     const double half = 0.5 * std::pow(10.0, -DecimalsOf(i_Cell));
     const double highest = time > half ? 1.0 / (time - half) : 1.0 / time;
     const double rate = RoundRate(1.0 / (time + half), highest, 1.0 / time);
     if (std::abs(rate * time - 1.0) > 1e-9)
-        io_rWarnings.push_back("The frame time " + CellText(i_Cell) + " s is taken as " + NumberText(rate) +
-                               " frames a second.");
+        io_rRecording.Remarks.push_back("The frame time " + CellText(i_Cell) + " s is taken as " + NumberText(rate) +
+                                        " frames a second.");
     return rate;
 }
 
-MotionHeader ReadMotionHeader(VLineScanner& io_rLines, std::vector<std::string>& io_rWarnings)
+MotionHeader ReadMotionHeader(VLineScanner& io_rLines, VRecording& io_rRecording)
 {
     MotionHeader header;
     bool bTime = false;
@@ -76,7 +77,7 @@ MotionHeader ReadMotionHeader(VLineScanner& io_rLines, std::vector<std::string>&
             header.bFrames = ReadCount(line, header.Frames);
         else if (TakeWord(line, "Frame Time:"))
         {
-            header.Rate = RateOfFrameTime(line, io_rWarnings);
+            header.Rate = RateOfFrameTime(line, io_rRecording);
             bTime = true;
         }
         else if (!line.empty())
@@ -86,8 +87,8 @@ MotionHeader ReadMotionHeader(VLineScanner& io_rLines, std::vector<std::string>&
         }
     }
     if (!bTime)
-        io_rWarnings.push_back("The file has no frame time; " + NumberText(AssumedRate) +
-                               " frames a second are assumed.");
+        io_rRecording.Warnings.push_back("The file has no frame time; " + NumberText(AssumedRate) +
+                                         " frames a second are assumed.");
     return header;
 }
 
@@ -308,7 +309,7 @@ TQL::IResult ReadAll(std::span<const std::byte> i_File, const ReadOptions& i_rOp
     BvhHierarchy hierarchy;
     if (const TQL::IResult result = ReadBvhHierarchy(lines, hierarchy, recording.Warnings, o_rError); result.IsError())
         return result;
-    const MotionHeader header = ReadMotionHeader(lines, recording.Warnings);
+    const MotionHeader header = ReadMotionHeader(lines, recording);
     FrameSink sink(
         hierarchy, header.Rate,
         ExpectedFrames(header, text.size() - std::min(lines.GetOffset(), text.size()), hierarchy.ColumnCount),

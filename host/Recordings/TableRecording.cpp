@@ -172,6 +172,8 @@ void LayTable(const TableTimes& i_rTimes, const ReadOptions& i_rOptions, bool i_
         FillTimeChannel(i_rTimes, *i_TimeChannel);
         rChannels.insert(rChannels.begin(), std::move(*i_TimeChannel));
     }
+    if (!grid.Remark.empty())
+        io_rRecording.Remarks.push_back(grid.Remark);
     std::vector<ResampleStep> steps;
     if (bResample)
         grid = ResampleGrid(i_rTimes, grid, steps, io_rRecording.Warnings);

@@ -21,7 +21,8 @@ namespace Recordings
 /// Lays the rows that ReadTableRows gave on their grid of ticks: the samples of all channels, their periods and rates,
 /// the frames and the range of the recording. Channels whose samples come only every n-th row get a rate of their own
 /// when i_bOwnRates. A time channel (name and units are given) is added in front where ticks cannot say the times as
-/// they were written, so that they are not lost. What was guessed goes to the warnings.
+/// they were written, so that they are not lost. What was guessed goes to the warnings, times that
+/// were rounded to the remarks.
 void LayTable(const TableTimes& i_rTimes, const ReadOptions& i_rOptions, bool i_bOwnRates,
               std::optional<RecordedChannel> i_TimeChannel, VRecording& io_rRecording);
 

@@ -288,18 +288,18 @@ void TellGaps(std::size_t i_Rows, std::size_t i_Places, const TimeGrid& i_rGrid,
                                "; there the samples are missing.");
 }
 
-void TellEven(const TableTimes& i_rTimes, const EvenFit& i_rFit, const TimeGrid& i_rGrid, std::size_t i_Rows,
+void TellEven(const TableTimes& i_rTimes, const EvenFit& i_rFit, TimeGrid& io_rGrid, std::size_t i_Rows,
               std::size_t i_Places, std::vector<std::string>& io_rWarnings)
 {
     const bool bAsHinted = i_rFit.Rate == i_rTimes.HintRate;
     if (!bAsHinted && i_rTimes.HintRate > 0.0 && std::abs(i_rFit.Rate / i_rTimes.HintRate - 1.0) > 0.001)
         io_rWarnings.push_back("The head of the file says " + HertzText(i_rTimes.HintRate) + ", its times say " +
-                               HertzText(i_rGrid.Rate) + "; the times are used.");
+                               HertzText(io_rGrid.Rate) + "; the times are used.");
     if (!bAsHinted && i_rFit.Displaced * i_rFit.Rate > 0.01)
-        io_rWarnings.push_back("The times are rounded to " +
-                               Counted(static_cast<std::size_t>(i_rTimes.Digits.Significant), " decimal", " decimals") +
-                               "; the rows stand evenly at " + HertzText(i_rGrid.Rate) + ".");
-    TellGaps(i_Rows, i_Places, i_rGrid, io_rWarnings);
+        io_rGrid.Remark = "The times are rounded to " +
+                          Counted(static_cast<std::size_t>(i_rTimes.Digits.Significant), " decimal", " decimals") +
+                          "; the rows stand evenly at " + HertzText(io_rGrid.Rate) + ".";
+    TellGaps(i_Rows, i_Places, io_rGrid, io_rWarnings);
 }
 
 void PlaceRows(std::size_t i_AllRows, const UsableRows& i_rRows, const std::vector<std::size_t>& i_rPlaces,

@@ -40,6 +40,7 @@ struct TimeGrid
     std::vector<std::size_t> PlaceOfRow; ///< rising; empty when row i stands at place i and no row is left out
     bool bExact = true;                  ///< whether every time is that of its place, to what a double can tell
     bool bUneven = false;                ///< whether the rows do not follow one even rate, gaps aside
+    std::string Remark;                  ///< of what is usual: times that were rounded; empty or one sentence
 
     std::size_t PlaceOf(std::size_t i_Row) const { return PlaceOfRow.empty() ? i_Row : PlaceOfRow[i_Row]; }
 };
@@ -58,7 +59,7 @@ TimeGrid EvenGrid(std::size_t i_Rows, double i_Rate);
 ///   than MostPlacesARow places a row (i_FreePlaces are granted besides); else a coarser one on which each row takes
 ///   the nearest place, and a row that finds it taken is left out;
 /// - a row without a time, or with one that is not later than that before it, is left out.
-/// Without any time the rows follow one another at the hint or at AssumedRate. All of this but the plain even case is
+/// Without any time the rows follow one another at the hint or at AssumedRate. All of this but the even case is
 /// told in io_rWarnings.
 TimeGrid FindTimeGrid(const TableTimes& i_rTimes, std::size_t i_FreePlaces, std::vector<std::string>& io_rWarnings);
 

@@ -58,6 +58,7 @@ struct VRecording
     std::vector<RecordedChannel> Channels;
     std::vector<RecordedEvent> Events;
     std::vector<std::string> Warnings; ///< what the reader had to guess or leave out, one sentence each
+    std::vector<std::string> Remarks;  ///< what is usual of such files and worth a line in a log, one sentence each
 };
 
 /// The tick period nearest to a rate in samples a second. 0 for a rate that is not positive and finite.

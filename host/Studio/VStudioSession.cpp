@@ -42,12 +42,17 @@ std::filesystem::path FindSettingsFolder(const VStudioSession::Options& i_rOptio
     return PathFromText(QStandardPaths::writableLocation(QStandardPaths::AppConfigLocation).toStdString());
 }
 
-/// What a reader had to guess goes to the log.
+/// What a reader had to guess, or found worth a remark, goes to the log.
 void LogWarnings(const Recordings::VRecording& i_rRecording, const std::filesystem::path& i_rPath)
 {
-    for (const std::string& rWarning : i_rRecording.Warnings)
-        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/VStudioSession", __LINE__,
-                         "%1%: %2%", TextFromPath(i_rPath.filename()), rWarning);
+    const auto log = [&i_rPath](TQL::ELogSeverity i_Severity, const std::vector<std::string>& i_rSentences)
+    {
+        for (const std::string& rSentence : i_rSentences)
+            TQL::Log::Format(TQL::Log::GetCategory("Studio"), i_Severity, "Studio/VStudioSession", __LINE__, "%1%: %2%",
+                             TextFromPath(i_rPath.filename()), rSentence);
+    };
+    log(TQL::ELogSeverity::Warning, i_rRecording.Warnings);
+    log(TQL::ELogSeverity::Information, i_rRecording.Remarks);
 }
 
 /// What the selection means in channels, for all types of this host. The manager subscribes to the selection by itself,

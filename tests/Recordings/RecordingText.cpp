@@ -78,6 +78,8 @@ std::string WarningsOf(const Recordings::VRecording& i_rRecording)
     std::string text;
     for (const std::string& rWarning : i_rRecording.Warnings)
         text += "warning: " + rWarning + "\n";
+    for (const std::string& rRemark : i_rRecording.Remarks)
+        text += "remark: " + rRemark + "\n";
     return text;
 }
 

@@ -10,7 +10,7 @@ namespace TestRecordings
 {
 
 /// A recording as text: a line for it, a line a channel (a bar between rows, "-" for a missing value), a line an event,
-/// a line a warning.
+/// a line a warning or remark.
 std::string TextOf(const Recordings::VRecording& i_rRecording);
 
 std::string WarningsOf(const Recordings::VRecording& i_rRecording);

@@ -189,7 +189,7 @@ TEST_P(RealTables, AgreeWithKnownValues)
     ExpectKnownValues(GetParam());
     const bool bRounded = GetParam() == std::string("gait10dof18musc_subject01_walk_grf.mot");
     EXPECT_EQ(WarningsOf(Open(GetParam())),
-              bRounded ? "warning: The times are rounded to 4 decimals; the rows stand evenly at 600 Hz.\n" : "");
+              bRounded ? "remark: The times are rounded to 4 decimals; the rows stand evenly at 600 Hz.\n" : "");
 }
 
 // The frame time of the one file was cut to .0083333 s, which stands for 120 Hz.

@@ -314,7 +314,7 @@ TEST(CsvReader, ChannelsOfTwoRatesAndTimesThatTicksCannotSay)
         "CSV 2250000..11250000 by 2250000\n"
         "column Time (s) [s] 60 Hz, 2250000 by 2250000: 0.0170000009 | 0.0329999998 | 0.0500000007 | 0.0670000017\n"
         "column x [] 60 Hz, 2250000 by 2250000: 1 | 2 | 3 | 4\n"
-        "warning: The times are rounded to 3 decimals; the rows stand evenly at 60 Hz.\n");
+        "remark: The times are rounded to 3 decimals; the rows stand evenly at 60 Hz.\n");
     ReadOptions resample;
     resample.bResample = true;
     EXPECT_EQ(TextOrError(Recordings::ReadCsv, "time,x\n0.0001,1\n0.0096,2\n0.02,\n0.0301,4\n0.0401,5\n", resample),

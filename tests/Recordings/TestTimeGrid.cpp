@@ -57,6 +57,7 @@ std::string TextOf(const TimeGrid& i_rGrid, const std::vector<std::string>& i_rW
     text << (i_rGrid.bExact ? ", exact" : "") << (i_rGrid.bUneven ? ", uneven" : "");
     for (const std::string& rWarning : i_rWarnings)
         text << "\n" << rWarning;
+    text << (i_rGrid.Remark.empty() ? "" : "\nremark: ") << i_rGrid.Remark;
     return text.str();
 }
 
@@ -79,7 +80,7 @@ auto At(double i_Rate, double i_First = 0.0)
 
 TEST(TimeGrid, EvenTimesHoweverTheyAreRounded)
 {
-    const std::string rounded = "The times are rounded to ";
+    const std::string rounded = "remark: The times are rounded to ";
     struct Case
     {
         TableTimes Times;
@@ -121,9 +122,10 @@ TEST(TimeGrid, GapsAndUnevenTimes)
     EXPECT_EQ(Find(Written(4, 2, [](double i_Row) { return i_Row / 100 + (i_Row > 2 ? 0.01 : 0.0); })),
               "100 Hz, 0 by 1350000, 5 places: 0 1 2 4, exact\nThe times leave out 1 of 5 rows at 100 Hz; "
               "there the samples are missing.");
-    EXPECT_EQ(Find(Written(100, 3, [](double i_Row) { return (i_Row < 50 ? i_Row : i_Row + 3) / 120.0; })),
-              "120 Hz, 0 by 1125000, 103 places: 0 1 2 3 4 5 6 7\nThe times are rounded to 3 decimals; the rows stand "
-              "evenly at 120 Hz.\nThe times leave out 3 of 103 rows at 120 Hz; there the samples are missing.");
+    EXPECT_EQ(
+        Find(Written(100, 3, [](double i_Row) { return (i_Row < 50 ? i_Row : i_Row + 3) / 120.0; })),
+        "120 Hz, 0 by 1125000, 103 places: 0 1 2 3 4 5 6 7\nThe times leave out 3 of 103 rows at 120 Hz; there the "
+        "samples are missing.\nremark: The times are rounded to 3 decimals; the rows stand evenly at 120 Hz.");
     EXPECT_EQ(Find(Exactly({0, 0.01, 0.014, 0.02, 0.024})),
               "500 Hz, 0 by 270000, 13 places: 0 5 7 10 12, exact, uneven\nThe times are uneven; the rows stand on a "
               "grid of 500 Hz that holds them all, with gaps.");
