@@ -17,7 +17,8 @@ endif()
 
 add_library(GraphPlotsOptions INTERFACE)
 target_compile_options(GraphPlotsOptions INTERFACE
-    -Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast -Werror)
+    -Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast
+    $<$<BOOL:${GRAPHPLOTS_WARNINGS_AS_ERRORS}>:-Werror>)
 if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
     # Optimising, g++ 12 sees overlaps in std::string's operator+ that there are none of.
     target_compile_options(GraphPlotsOptions INTERFACE -Wno-restrict)

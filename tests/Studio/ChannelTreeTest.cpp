@@ -130,12 +130,13 @@ TEST(ChannelTree, ASelectionFromOutsideIsTakenOverWithoutAnEcho)
 
 TEST(ChannelLeaves, NamesMakeTheBranchesAndPatternsFindThem)
 {
-    const std::vector<Studio::SelectableThing> channels{
+    std::vector<Studio::SelectableThing> channels{
         {"Walker1:LFHD", "Labelled Reconstructions", Marker(0, 0)},
         {"Walker1:Pelvis", "SubjectSegmentPose", {ESelectionKind::Segment, 0, 0, ""}},
         {"RSHO", "Labelled Reconstructions", Marker(1, 0)},
         {"Fz1", "DeviceOutput", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}},
-        {"Walker1", "", {ESelectionKind::Subject, 0, 0, ""}, {}, {"Pelvis"}}};
+        {"Walker1", "", {ESelectionKind::Subject, 0, 0, ""}}};
+    channels.back().Components = {"Pelvis"};
     std::string text;
     for (const ChannelTreeLeaf& rLeaf : Studio::MakeLeaves(channels))
         text += rLeaf.Branches.join("/").toStdString() + "=" + rLeaf.Text.toStdString() + "; ";
