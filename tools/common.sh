@@ -4,6 +4,9 @@ set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 cd "$root"
 
+# What one clone has compiled, another finds: paths below the root count from there.
+export CCACHE_BASEDIR=${CCACHE_BASEDIR:-$root} CCACHE_NOHASHDIR=${CCACHE_NOHASHDIR:-1}
+
 say() { printf '== %s\n' "$*"; }
 
 wanted_packages() { grep -v '^#' "$root/tools/packages.txt"; }
@@ -31,11 +34,11 @@ jobs() {
     if [ "$memory" -lt "$cores" ]; then echo "$memory"; else echo "$cores"; fi
 }
 
-# build PRESET [TARGET...]: configures once, then builds.
+# build PRESET [TARGET...]: configures at first and when the presets have changed, then builds.
 build() {
     local preset=$1
     shift
-    if [ ! -f "build/$preset/build.ninja" ]; then
+    if [ ! -f "build/$preset/build.ninja" ] || [ "build/$preset/build.ninja" -ot CMakePresets.json ]; then
         say "configuring $preset"
         cmake --preset "$preset" >"$(mktemp -t graphplots-configure.XXXXXX)"
     fi
