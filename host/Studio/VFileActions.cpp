@@ -4,6 +4,7 @@
 #include "Channels/VRecordedContext.h"
 #include "Studio/ContextNames.h"
 #include "Studio/Paths.h"
+#include "Studio/PlainLabels.h"
 #include "Studio/VMainActions.h"
 #include "Studio/VNoticeBar.h"
 #include "Studio/VOpenFiles.h"
@@ -68,7 +69,7 @@ void VFileActions::FillRecentMenu(QMenu& o_rMenu)
     int number = 0;
     for (const VRecentFiles::Entry& rEntry : entries)
     {
-        QString path = QString::fromStdString(TextFromPath(rEntry.Path)).replace(QLatin1Char('&'), QLatin1String("&&"));
+        QString path = WithoutMnemonics(QString::fromStdString(TextFromPath(rEntry.Path)));
         if (rEntry.bMissing)
             path = tr("%1 (missing)").arg(path);
         // The first nine have a key.

@@ -3,6 +3,7 @@
 #include "Services/VTimeController.h"
 #include "Services/VUiPostalService.h"
 #include "Studio/Paths.h"
+#include "Studio/PlainLabels.h"
 #include "Studio/PlotStates.h"
 #include "Studio/VChangedFilesBar.h"
 #include "Studio/VChannelPanel.h"
@@ -83,6 +84,7 @@ VMainWindow::VMainWindow(VStudioSession& i_rSession, VLogModel* i_pLog, QWidget*
     setWindowTitle(tr("Graph Plots Studio"));
     setAcceptDrops(true);
     new VWidgetKeys(this);
+    new VPlainLabels(this);
     m_pActions = new VMainActions(this);
     m_pFiles = new VOpenFiles(m_rSession, this);
     m_pTransport = new VTransport(m_rSession, this);

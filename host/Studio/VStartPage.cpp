@@ -1,6 +1,7 @@
 #include "Studio/VStartPage.h"
 
 #include "Studio/Paths.h"
+#include "Studio/PlainLabels.h"
 #include "Studio/VMainActions.h"
 #include "Studio/VRecentFiles.h"
 
@@ -77,7 +78,8 @@ void VStartPage::ShowRecent()
         ++shown;
         m_pRecentTitle->show();
         const QString path = QString::fromStdString(TextFromPath(rEntry.Path));
-        auto* pButton = new QPushButton(QString::fromStdString(TextFromPath(rEntry.Path.filename())), m_pRecent);
+        const QString name = QString::fromStdString(TextFromPath(rEntry.Path.filename()));
+        auto* pButton = new QPushButton(WithoutMnemonics(name), m_pRecent);
         pButton->setToolTip(path);
         pButton->setFlat(true);
         connect(pButton, &QPushButton::clicked, this, [this, path] { Q_EMIT OpenRequested(path); });

@@ -22,6 +22,7 @@
 #include <QtGui/QAction>
 #include <QtGui/QDragEnterEvent>
 #include <QtGui/QDropEvent>
+#include <QtGui/QHelpEvent>
 #include <QtQuickWidgets/QQuickWidget>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
@@ -30,10 +31,12 @@
 #include <QtWidgets/QLineEdit>
 #include <QtWidgets/QMdiArea>
 #include <QtWidgets/QMdiSubWindow>
+#include <QtWidgets/QMessageBox>
 #include <QtWidgets/QPushButton>
 #include <QtWidgets/QSpinBox>
 #include <QtWidgets/QStyle>
 #include <QtWidgets/QStyleOptionViewItem>
+#include <QtWidgets/QToolTip>
 #include <QtWidgets/QTreeView>
 
 #include <filesystem>
@@ -313,6 +316,42 @@ TEST_F(StudioWindow, WhatCannotBeReadAndWhatWasGuessedIsTold)
     const QAbstractItemModel* pLog = Find<QTreeView>("log")->model();
     ASSERT_GT(pLog->rowCount(), 0);
     EXPECT_TRUE(pLog->index(pLog->rowCount() - 1, 3).data().toString().startsWith("table.csv:"));
+}
+
+/// Names come from files: none is ever taken for markup, wherever the window shows it.
+TEST_F(StudioWindow, TextsOfFilesAreShownAsTheyAre)
+{
+    const QString name = QStringLiteral("<img src='/etc/x'>&<b>R&D</b>");
+    std::ofstream(m_Folder / "R&D <b>.csv") << "time," << name.toStdString() << "\n0,1\n0.01,2\n0.02,3\n";
+    Start();
+    Drop(m_Folder / "R&D <b>.csv");
+    auto* pTree = Find<QTreeView>("channelTree");
+    const auto* pModel = pTree->model();
+    ASSERT_TRUE(QTest::qWaitFor([&] { return pModel->rowCount(pModel->index(0, 0)) == 1; }, patience));
+    const QPoint place = pTree->visualRect(pModel->index(0, 0, pModel->index(0, 0))).center();
+    QHelpEvent hover(QEvent::ToolTip, place, pTree->viewport()->mapToGlobal(place));
+    QApplication::sendEvent(pTree->viewport(), &hover);
+    EXPECT_EQ(QToolTip::text(), name);
+    QMessageBox box(QMessageBox::Information, name, name, QMessageBox::Ok, m_pWindow.get());
+    box.setInformativeText(name);
+    box.show();
+    int shown = 0;
+    for (const QWidget* pWidget : QApplication::allWidgets())
+        if (const auto* pLabel = qobject_cast<const QLabel*>(pWidget); pLabel && pLabel->isVisible())
+        {
+            EXPECT_EQ(pLabel->textFormat(), Qt::PlainText) << pLabel->text().toStdString();
+            shown += pLabel->text() == name ? 1 : 0;
+        }
+    EXPECT_EQ(shown, 3) << "tool tip and both texts of the box";
+    QToolTip::hideText();
+    const QStringList buttons = [this]
+    {
+        QStringList texts;
+        for (const auto* pButton : Find<QWidget>("startPage")->findChildren<QPushButton*>())
+            texts.append(pButton->text());
+        return texts;
+    }();
+    EXPECT_TRUE(buttons.contains(QStringLiteral("R&&D <b>.csv"))) << buttons.join(' ').toStdString();
 }
 
 TEST_F(StudioWindow, LiveCanBeReviewedAndFollowedAgain)
