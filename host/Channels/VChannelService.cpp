@@ -141,9 +141,11 @@ std::shared_ptr<ChannelSystem::IChannelContext> VChannelService::GetContextByNam
 
 std::vector<std::string> VChannelService::GetChannelTypes(std::uint64_t i_Mask, std::string_view i_Context) const
 {
-    std::vector<std::shared_ptr<VChannelContext>> contexts = GetContexts();
-    if (!i_Context.empty())
-        std::erase_if(contexts, [&](const auto& i_rpContext) { return i_rpContext->GetName() != i_Context; });
+    std::vector<std::shared_ptr<VChannelContext>> contexts;
+    if (i_Context.empty())
+        contexts = GetContexts();
+    else if (auto pContext = FindContext(i_Context))
+        contexts.push_back(std::move(pContext));
     if (auto pGlobal = GetGlobalChannels())
         contexts.push_back(std::move(pGlobal));
     std::set<std::string, std::less<>> present;

@@ -1,6 +1,6 @@
 #pragma once
 
-#include <set>
+#include <functional>
 #include <string>
 
 namespace Studio
@@ -11,6 +11,7 @@ inline constexpr const char* LiveContextName = "Live";
 
 /// A context name for a recording that nothing bears yet: its own, or with a number behind it. Names with a meaning of
 /// their own ("Live", "GlobalItems", "DataStore", any that begins with # or *) get "Recording " in front.
-std::string MakeContextName(const std::string& i_rRecordingName, const std::set<std::string>& i_rTaken);
+std::string MakeContextName(const std::string& i_rRecordingName,
+                            const std::function<bool(const std::string&)>& i_rIsTaken);
 
 } // namespace Studio

@@ -175,9 +175,17 @@ void VChannelPanel::SetLeaves(std::vector<ChannelTreeLeaf> i_Leaves)
 void VChannelPanel::ShowCurrentContext()
 {
     const auto pContext = m_rSession.CurrentContext();
+    const auto pGlobal = m_rSession.Channels().GetGlobalChannels();
+    std::vector<std::shared_ptr<const void>> from;
+    for (const auto& rpSource : {pContext, pGlobal})
+        if (rpSource)
+            from.insert(from.end(), {rpSource, rpSource->GetChannels()});
+    if (from == m_From) // another context came or went, maybe one of thousands
+        return;
+    m_From = std::move(from);
     if (pContext)
     {
-        const auto things = ListThings(*pContext, m_rSession.Channels().GetGlobalChannels().get());
+        const auto things = ListThings(*pContext, pGlobal.get());
         std::vector<TQL::SelectionItem> known;
         for (const SelectableThing& rThing : things)
             known.push_back(rThing.Item);

@@ -6,6 +6,7 @@
 
 #include <QtWidgets/QWidget>
 
+#include <memory>
 #include <vector>
 
 class QLabel;
@@ -58,7 +59,8 @@ private:
     QLineEdit* m_pSearch = nullptr;
     VChannelTreeView* m_pTree = nullptr;
     QLabel* m_pCount = nullptr;
-    std::vector<ChannelTreeLeaf> m_Leaves; ///< in the tree
+    std::vector<ChannelTreeLeaf> m_Leaves;           ///< in the tree
+    std::vector<std::shared_ptr<const void>> m_From; ///< what they were made from: contexts and lists of channels
     VContextSelection m_Selection;
     Services::VHostSubscriptions m_Subscriptions;
 };

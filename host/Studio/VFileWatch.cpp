@@ -30,7 +30,8 @@ VFileWatch::VFileWatch(std::chrono::milliseconds i_Settle, QObject* i_pParent) :
 
 void VFileWatch::Watch(const std::filesystem::path& i_rPath)
 {
-    m_Files.insert_or_assign(i_rPath, VFileSettling(StampOf(i_rPath)));
+    if (m_Files.insert_or_assign(i_rPath, VFileSettling(StampOf(i_rPath))).second)
+        m_Folders.insert(i_rPath.parent_path());
     Attach(i_rPath);
 }
 
@@ -40,10 +41,9 @@ void VFileWatch::Unwatch(const std::filesystem::path& i_rPath)
         return;
     m_Watcher.removePath(TextOf(i_rPath));
     const auto folder = i_rPath.parent_path();
-    for (const auto& [path, watched] : m_Files)
-        if (path.parent_path() == folder)
-            return;
-    m_Watcher.removePath(TextOf(folder));
+    m_Folders.erase(m_Folders.find(folder));
+    if (!m_Folders.contains(folder))
+        m_Watcher.removePath(TextOf(folder));
 }
 
 /// A file that was replaced or removed has left the watcher; its folder tells when there is one again.

@@ -10,6 +10,7 @@
 #include <chrono>
 #include <filesystem>
 #include <map>
+#include <set>
 
 namespace Studio
 {
@@ -42,6 +43,7 @@ private:
     QFileSystemWatcher m_Watcher;
     QTimer m_Settle;
     std::map<std::filesystem::path, VFileSettling> m_Files;
+    std::multiset<std::filesystem::path> m_Folders; ///< of each of them
 };
 
 } // namespace Studio

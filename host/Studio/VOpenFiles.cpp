@@ -5,8 +5,8 @@
 #include "Studio/Paths.h"
 #include "Studio/VStudioSession.h"
 
-#include <algorithm>
 #include <system_error>
+#include <utility>
 
 namespace Studio
 {
@@ -39,12 +39,18 @@ VOpenFiles::VOpenFiles(VStudioSession& i_rSession, QObject* i_pParent)
     connect(&m_Loader, &VRecordingLoader::Cancelled, this, [this](int i_Number) { End(i_Number, {}); });
 }
 
+VOpenFiles::~VOpenFiles()
+{
+    m_Recent.Add(m_ToRemember);
+}
+
 int VOpenFiles::Open(const std::filesystem::path& i_rPath)
 {
     const auto path = Whole(i_rPath);
     m_Watch.Watch(path); // before it is read: what is written while it is read shall not be missed
     const int number = m_Loader.Open(path);
     m_Reading.emplace(number, path);
+    m_BeingRead.insert(path);
     return number;
 }
 
@@ -55,6 +61,7 @@ void VOpenFiles::Reload(const QString& i_rContextName)
         return;
     m_Watch.Watch(path);
     m_Reading.emplace(m_Loader.Reload(path, i_rContextName.toStdString()), path);
+    m_BeingRead.insert(path);
     Q_EMIT ChangeTaken(i_rContextName);
 }
 
@@ -65,14 +72,23 @@ void VOpenFiles::End(int i_Number, const QString& i_rContextName)
         return;
     const std::filesystem::path path = reading->second;
     m_Reading.erase(reading);
+    m_BeingRead.erase(m_BeingRead.find(path));
     if (!i_rContextName.isEmpty())
-        m_Recent.Add(path);
+        m_ToRemember.push_back(path);
+    Remember();
     if (IsBeingRead(path))
         return;
-    if (ContextsOf(path).empty())
+    if (i_rContextName.isEmpty() && ContextsOf(path).empty())
         m_Watch.Unwatch(path);
     else if (m_ChangedMeanwhile.erase(path) != 0)
         OfferChange(path);
+}
+
+/// The list of recent files is a file: it is written once for all that were opened together.
+void VOpenFiles::Remember()
+{
+    if (m_Loader.IsIdle())
+        m_Recent.Add(std::exchange(m_ToRemember, {}));
 }
 
 void VOpenFiles::OfferChange(const std::filesystem::path& i_rPath)
@@ -94,11 +110,6 @@ std::set<std::string> VOpenFiles::ContextsOf(const std::filesystem::path& i_rPat
         if (m_rSession.FileOf(rpContext->GetName()) == i_rPath)
             names.insert(rpContext->GetName());
     return names;
-}
-
-bool VOpenFiles::IsBeingRead(const std::filesystem::path& i_rPath) const
-{
-    return std::ranges::any_of(m_Reading, [&](const auto& i_rEntry) { return i_rEntry.second == i_rPath; });
 }
 
 } // namespace Studio

@@ -11,6 +11,7 @@
 #include <map>
 #include <set>
 #include <string>
+#include <vector>
 
 namespace Studio
 {
@@ -25,6 +26,7 @@ class VOpenFiles : public QObject
 
 public:
     explicit VOpenFiles(VStudioSession& i_rSession, QObject* i_pParent = nullptr);
+    ~VOpenFiles() override;
 
     VRecordingLoader& Loader() { return m_Loader; }
     VRecentFiles& Recent() { return m_Recent; }
@@ -43,14 +45,17 @@ Q_SIGNALS:
 
 private:
     void End(int i_Number, const QString& i_rContextName);
+    void Remember();
     void OfferChange(const std::filesystem::path& i_rPath);
     std::set<std::string> ContextsOf(const std::filesystem::path& i_rPath) const;
-    bool IsBeingRead(const std::filesystem::path& i_rPath) const;
+    bool IsBeingRead(const std::filesystem::path& i_rPath) const { return m_BeingRead.contains(i_rPath); }
 
     VStudioSession& m_rSession;
     VRecentFiles m_Recent;
     VFileWatch m_Watch;
+    std::vector<std::filesystem::path> m_ToRemember;    ///< read, and not among the recent ones yet
     std::map<int, std::filesystem::path> m_Reading;     ///< by number
+    std::multiset<std::filesystem::path> m_BeingRead;   ///< the same
     std::set<std::filesystem::path> m_ChangedMeanwhile; ///< while they were read
     VRecordingLoader m_Loader;                          ///< the first to go
 };

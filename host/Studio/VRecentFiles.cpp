@@ -55,15 +55,18 @@ std::vector<VRecentFiles::Entry> VRecentFiles::List() const
     return entries;
 }
 
-void VRecentFiles::Add(const std::filesystem::path& i_rPath)
+void VRecentFiles::Add(std::span<const std::filesystem::path> i_Paths)
 {
-    const std::filesystem::path path = Normal(i_rPath);
     Change(
         [&](std::vector<std::filesystem::path>& io_rPaths)
         {
-            std::erase(io_rPaths, path);
-            io_rPaths.insert(io_rPaths.begin(), path);
-            io_rPaths.resize(std::min(io_rPaths.size(), Most));
+            for (const std::filesystem::path& rPath : i_Paths)
+            {
+                const std::filesystem::path path = Normal(rPath);
+                std::erase(io_rPaths, path);
+                io_rPaths.insert(io_rPaths.begin(), path);
+                io_rPaths.resize(std::min(io_rPaths.size(), Most));
+            }
         });
 }
 

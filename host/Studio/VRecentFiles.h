@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <filesystem>
 #include <functional>
+#include <span>
 #include <vector>
 
 namespace Studio
@@ -32,7 +33,8 @@ public:
     /// As it stands now, with a look at each file.
     std::vector<Entry> List() const;
 
-    void Add(const std::filesystem::path& i_rPath); ///< to the front, once
+    void Add(const std::filesystem::path& i_rPath) { Add(std::span(&i_rPath, 1)); } ///< to the front, once
+    void Add(std::span<const std::filesystem::path> i_Paths);                       ///< the last one is the newest
     void Remove(const std::filesystem::path& i_rPath);
     void RemoveMissing();
 

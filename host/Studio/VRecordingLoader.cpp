@@ -5,6 +5,7 @@
 #include "Studio/Paths.h"
 #include "Studio/VStudioSession.h"
 
+#include <QtCore/QElapsedTimer>
 #include <QtCore/QMetaObject>
 
 #include <atomic>
@@ -19,7 +20,16 @@
 namespace Studio
 {
 
-/// One file. The worker writes the outcome before it posts the job back; from then on it belongs to the UI thread.
+namespace
+{
+
+// What is handed over in one turn of the UI thread.
+constexpr int mostInATurn = 32;    // files
+constexpr qint64 longestTurn = 20; // ms
+
+} // namespace
+
+/// One file. The worker writes the outcome before it lays the job down; from then on it belongs to the UI thread.
 struct VRecordingLoader::Job
 {
     int Number = 0;
@@ -64,6 +74,17 @@ public:
         m_Wake.notify_one();
     }
 
+    /// The file that was done first; null when none is left.
+    std::shared_ptr<Job> TakeDone()
+    {
+        const std::lock_guard lock(m_Mutex);
+        if (m_Done.empty())
+            return nullptr;
+        auto pJob = std::move(m_Done.front());
+        m_Done.pop_front();
+        return pJob;
+    }
+
 private:
     void Work()
     {
@@ -98,9 +119,22 @@ private:
                 Recordings::FileMessage(i_pJob->Path, std::string("reading failed: ") + rException.what() + ".");
         }
         if (!i_pJob->bDropped)
+            LayDown(std::move(i_pJob));
+    }
+
+    /// The UI thread is told of the first one that waits, and takes them one by one. A notice for each would keep it
+    /// from painting and from the operator until the last file.
+    void LayDown(std::shared_ptr<Job> i_pJob)
+    {
+        bool bFirst = false;
+        {
+            const std::lock_guard lock(m_Mutex);
+            bFirst = m_Done.empty();
+            m_Done.push_back(std::move(i_pJob));
+        }
+        if (bFirst)
             QMetaObject::invokeMethod(
-                &m_rLoader, [&rLoader = m_rLoader, pJob = std::move(i_pJob)] { rLoader.Deliver(pJob); },
-                Qt::QueuedConnection);
+                &m_rLoader, [&rLoader = m_rLoader] { rLoader.m_Deliveries.start(); }, Qt::QueuedConnection);
     }
 
     /// However often a reader tells its progress, the UI thread never has more than one notice to take.
@@ -120,6 +154,7 @@ private:
     bool m_bStopping = false; // guarded by m_Mutex
     std::condition_variable m_Wake;
     std::deque<std::shared_ptr<Job>> m_Queue; // guarded by m_Mutex
+    std::deque<std::shared_ptr<Job>> m_Done;  // guarded by m_Mutex
     std::thread m_Thread;
 };
 
@@ -142,6 +177,7 @@ VRecordingLoader::VRecordingLoader(VStudioSession& i_rSession, QObject* i_pParen
 VRecordingLoader::VRecordingLoader(Read i_Read, Take i_Take, QObject* i_pParent)
     : QObject(i_pParent), m_Take(std::move(i_Take)), m_pWorker(std::make_unique<Worker>(*this, std::move(i_Read)))
 {
+    connect(&m_Deliveries, &QTimer::timeout, this, &VRecordingLoader::DeliverNext); // at once, after all other events
 }
 
 /// The thread ends first: what it posted until then dies with this object.
@@ -193,6 +229,20 @@ void VRecordingLoader::CancelAll()
     // The newest first, so that none begins because the one before it went.
     for (const int number : std::vector<int>(numbers.rbegin(), numbers.rend()))
         Cancel(number);
+}
+
+/// A few in one turn, for a turn may paint whole plots.
+void VRecordingLoader::DeliverNext()
+{
+    QElapsedTimer turn;
+    turn.start();
+    for (int i = 0; i < mostInATurn && turn.elapsed() < longestTurn; ++i)
+    {
+        const auto pJob = m_pWorker->TakeDone();
+        if (!pJob)
+            return m_Deliveries.stop();
+        Deliver(pJob);
+    }
 }
 
 void VRecordingLoader::Deliver(const std::shared_ptr<Job>& i_rpJob)

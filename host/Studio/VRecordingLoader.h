@@ -7,6 +7,7 @@
 
 #include <QtCore/QObject>
 #include <QtCore/QString>
+#include <QtCore/QTimer>
 
 #include <filesystem>
 #include <functional>
@@ -22,7 +23,8 @@ class VStudioSession;
 /// Reads recordings on a thread of its own, one file after the other, and hands each to the session on the UI thread.
 /// Every number that Open or Reload gave ends with exactly one of Finished, Failed and Cancelled, unless the loader is
 /// destroyed before: then the file that is being read is dropped at its next piece, and nothing is handed over any
-/// more. Owned by a window; the session outlives it. All calls and signals on the UI thread.
+/// more. However many files are read, the window gets its turn between two that are handed over. Owned by a window; the
+/// session outlives it. All calls and signals on the UI thread.
 class VRecordingLoader : public QObject
 {
     Q_OBJECT
@@ -70,6 +72,7 @@ private:
     struct Job;
 
     int Enqueue(const std::filesystem::path& i_rPath, const std::string& i_rContextName);
+    void DeliverNext();
     void Deliver(const std::shared_ptr<Job>& i_rpJob);
     void ShowProgress(const std::shared_ptr<Job>& i_rpJob);
 
@@ -77,6 +80,7 @@ private:
     int m_LastNumber = 0;
     bool m_bResampling = false;
     std::map<int, std::shared_ptr<Job>> m_Jobs; ///< those that have not ended, by number
+    QTimer m_Deliveries;                        ///< runs while the worker has outcomes to hand over
     std::unique_ptr<Worker> m_pWorker;
 };
 

@@ -21,7 +21,6 @@
 
 #include <QtCore/QStandardPaths>
 
-#include <set>
 #include <system_error>
 
 namespace Studio
@@ -116,10 +115,8 @@ TQL::IResult VStudioSession::OpenFile(const std::filesystem::path& i_rPath, std:
 std::string VStudioSession::AddRecording(Recordings::VRecording i_Recording, const std::filesystem::path& i_rPath)
 {
     LogWarnings(i_Recording, i_rPath);
-    std::set<std::string> taken;
-    for (const auto& rpContext : m_pChannels->GetContexts())
-        taken.insert(rpContext->GetName());
-    const std::string name = MakeContextName(i_Recording.Name, taken);
+    const std::string name = MakeContextName(i_Recording.Name, [this](const std::string& i_rName)
+                                             { return m_pChannels->FindContext(i_rName) != nullptr; });
     AddContext(
         std::make_shared<Channels::VRecordedContext>(
             name, m_pChannels->GetSubTypes(), std::make_shared<const Recordings::VRecording>(std::move(i_Recording))),

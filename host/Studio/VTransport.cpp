@@ -6,6 +6,7 @@
 #include "Services/VTimeController.h"
 #include "Services/VTimeSource.h"
 #include "Services/VUiPostalService.h"
+#include "Studio/ContextNames.h"
 #include "Studio/TransportRules.h"
 #include "Studio/VStudioSession.h"
 
@@ -185,21 +186,13 @@ void VTransport::ClearMarks()
 
 bool VTransport::HasCapture() const
 {
-    return std::ranges::any_of(m_rSession.Channels().GetContexts(), [](const auto& i_rpContext)
-                               { return i_rpContext->GetType() == ChannelSystem::EContextType::Live; });
+    return m_rSession.Channels().FindContext(LiveContextName) != nullptr;
 }
 
 void VTransport::SetLive(bool i_bLive)
 {
     if (i_bLive && !State().bLiveData)
-    {
-        for (const auto& rpContext : m_rSession.Channels().GetContexts())
-            if (rpContext->GetType() == ChannelSystem::EContextType::Live)
-            {
-                m_rSession.ShowContext(rpContext->GetName());
-                break;
-            }
-    }
+        m_rSession.ShowContext(LiveContextName);
     if (State().bLiveData)
         if (const auto pSource = m_pController->FindSource(m_rSession.CurrentContextName()))
             pSource->SetMode(i_bLive ? ETimeMode::Live : ETimeMode::Review);

@@ -20,6 +20,7 @@
 #include <QtWidgets/QToolButton>
 
 #include <algorithm>
+#include <chrono>
 #include <limits>
 
 namespace Studio
@@ -27,6 +28,9 @@ namespace Studio
 
 namespace
 {
+
+constexpr std::chrono::milliseconds sourcesPeriod{50};
+constexpr int contextsWidth = 18; // characters; longer names are cut, and whole in the list
 
 int ToInt(std::int64_t i_Value)
 {
@@ -75,7 +79,8 @@ void VTransportBar::BuildSource(QBoxLayout& o_rLayout)
     m_pContexts->setObjectName(QStringLiteral("contexts"));
     m_pContexts->setAccessibleName(tr("What is shown"));
     m_pContexts->setToolTip(tr("What is shown: the live capture or a recording"));
-    m_pContexts->setSizeAdjustPolicy(QComboBox::AdjustToContents);
+    m_pContexts->setSizeAdjustPolicy(QComboBox::AdjustToMinimumContentsLengthWithIcon);
+    m_pContexts->setMinimumContentsLength(contextsWidth);
     o_rLayout.addWidget(m_pContexts);
     AddButtons(o_rLayout, {EAction::Live, EAction::Review});
 }
@@ -143,20 +148,40 @@ void VTransportBar::Connect()
     m_pSlider->SetEvents(m_rTransport.Events());
     const auto& rpController = m_rSession.Host().TimeController();
     const auto& rpUi = m_rSession.Host().Ui();
+    m_SourcesSoon.setSingleShot(true);
+    m_SourcesSoon.setInterval(sourcesPeriod);
+    connect(&m_SourcesSoon, &QTimer::timeout, this, &VTransportBar::RefreshSources);
     m_Subscriptions.Subscribe(
-        rpController->SourceListChanged(), [this] { RefreshSources(); }, rpUi);
+        rpController->SourceListChanged(),
+        [this]
+        {
+            if (!m_SourcesSoon.isActive())
+                m_SourcesSoon.start();
+        },
+        rpUi);
     m_Subscriptions.Subscribe(
-        rpController->CurrentSourceChanged(), [this] { RefreshSources(); }, rpUi);
+        rpController->CurrentSourceChanged(), [this] { ShowCurrentSource(); }, rpUi);
 }
 
 void VTransportBar::RefreshSources()
 {
     const QSignalBlocker blocker(m_pContexts);
-    m_pContexts->clear();
+    QStringList names;
     for (const std::string& rName : m_rSession.Host().TimeController()->GetSourceMap()->GetNames())
-        m_pContexts->addItem(QString::fromStdString(rName));
+        names.append(QString::fromStdString(rName));
+    m_pContexts->clear();
+    m_pContexts->addItems(names);
+    m_pContexts->setEnabled(!names.isEmpty());
     m_pContexts->setCurrentIndex(m_pContexts->findText(QString::fromStdString(m_rSession.CurrentContextName())));
-    m_pContexts->setEnabled(m_pContexts->count() > 0);
+}
+
+void VTransportBar::ShowCurrentSource()
+{
+    const QString name = QString::fromStdString(m_rSession.CurrentContextName());
+    if (!name.isEmpty() && m_pContexts->findText(name) < 0)
+        return RefreshSources(); // it is new
+    const QSignalBlocker blocker(m_pContexts);
+    m_pContexts->setCurrentIndex(m_pContexts->findText(name));
 }
 
 void VTransportBar::Refresh()

@@ -2,6 +2,7 @@
 
 #include "Services/VHostSubscriptions.h"
 
+#include <QtCore/QTimer>
 #include <QtWidgets/QWidget>
 
 #include <initializer_list>
@@ -41,6 +42,7 @@ private:
     void AddButtons(QBoxLayout& o_rLayout, std::initializer_list<EAction> i_Actions);
     void Connect();
     void RefreshSources();
+    void ShowCurrentSource();
     void Refresh();
     void ShowIcons();
     void ShowRunning(bool i_bRunning);
@@ -56,6 +58,7 @@ private:
     QSpinBox* m_pFrame = nullptr;
     QLabel* m_pTime = nullptr;
     QLabel* m_pTimecode = nullptr;
+    QTimer m_SourcesSoon; ///< many files may come in a row
     std::optional<bool> m_bShownRunning;
     Services::VHostSubscriptions m_Subscriptions;
 };

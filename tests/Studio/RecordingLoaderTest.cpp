@@ -4,15 +4,19 @@
 #include <gtest/gtest.h>
 
 #include <QtCore/QCoreApplication>
+#include <QtCore/QTimer>
 #include <QtTest/QTest>
 #include <QtWidgets/QAbstractButton>
+#include <QtWidgets/QLabel>
 #include <QtWidgets/QProgressBar>
 
+#include <algorithm>
 #include <atomic>
 #include <memory>
 #include <new>
 #include <string>
 #include <thread>
+#include <utility>
 
 namespace
 {
@@ -184,6 +188,37 @@ TEST_F(RecordingLoader, ProgressNeverGoesBackAndIsNotQueuedUp)
     m_pLoader->Cancel(1);
     QCoreApplication::processEvents();
     EXPECT_EQ(last, 0.5) << "nothing is told of what has ended";
+}
+
+/// Two thousand files are read before the first is handed over: still the window gets its turns between, and the bar
+/// stays small.
+TEST_F(RecordingLoader, ManyFilesLeaveTheWindowItsTurns)
+{
+    constexpr int many = 2000;
+    Studio::VLoadingBar bar(*m_pLoader);
+    for (int i = 0; i < many; ++i)
+        m_pLoader->Open("/in/one");
+    EXPECT_EQ(bar.findChildren<QProgressBar*>().size(), static_cast<qsizetype>(Studio::VLoadingBar::Most));
+    EXPECT_EQ(bar.findChild<QLabel*>(QStringLiteral("loadingRest"))->text(), "and 1997 more");
+    while (m_Begun < many) // without events, so that nothing is taken
+        std::this_thread::yield();
+    int finished = 0;
+    int mostAtOnce = 0;
+    int turns = 0;
+    QObject::connect(m_pLoader.get(), &VRecordingLoader::Finished, [&] { ++finished; });
+    QTimer window;
+    QObject::connect(&window, &QTimer::timeout,
+                     [&, before = 0]() mutable
+                     {
+                         ++turns;
+                         mostAtOnce = std::max(mostAtOnce, finished - std::exchange(before, finished));
+                     });
+    window.start(0);
+    ASSERT_TRUE(WaitUntilIdle());
+    window.stop();
+    EXPECT_EQ(finished, many);
+    EXPECT_LE(mostAtOnce, 64) << turns << " turns";
+    EXPECT_TRUE(bar.isHidden());
 }
 
 TEST_F(RecordingLoader, TheBarHasARowForEachFileAndItsButtonCancels)

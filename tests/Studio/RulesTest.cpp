@@ -187,7 +187,10 @@ TEST(ContextNames, AreUniqueAndNeverReserved)
                 {"*", "Recording *"},
                 {"", "Recording "}};
     for (const auto& rRow : rows)
-        EXPECT_EQ(Studio::MakeContextName(rRow.pName, taken), rRow.pExpected) << rRow.pName;
+        EXPECT_EQ(
+            Studio::MakeContextName(rRow.pName, [&](const std::string& i_rName) { return taken.contains(i_rName); }),
+            rRow.pExpected)
+            << rRow.pName;
 }
 
 TQL::SelectionItem Item(std::uint64_t i_Number)
