@@ -1,6 +1,7 @@
 #include "Recordings/CsvExport.h"
 
 #include "Recordings/FileMessage.h"
+#include "Recordings/FrameNumbers.h"
 #include "Recordings/NamePattern.h"
 #include "Recordings/VFileReplacement.h"
 #include "TQL/ITick.h"
@@ -73,6 +74,8 @@ void AppendNumber(Number i_Value, std::string& io_rLine)
 class VTable
 {
 public:
+    explicit VTable(std::int64_t i_FramePeriod) : m_FramePeriod(i_FramePeriod) {}
+
     void Add(const RecordedChannel& i_rChannel)
     {
         const auto found = std::find_if(m_Grids.begin(), m_Grids.end(),
@@ -91,7 +94,7 @@ public:
 
     void AppendHead(std::string& io_rText) const
     {
-        io_rText += "time";
+        io_rText += "frame,time";
         for (const Column& rColumn : m_Columns)
             for (const std::string& rComponent : rColumn.pChannel->ComponentNames)
             {
@@ -112,6 +115,8 @@ public:
             return false;
         for (Grid& rGrid : m_Grids)
             rGrid.bInRow = rGrid.NextTick() == tick;
+        AppendNumber(FrameAt(tick, m_FramePeriod), io_rText);
+        io_rText += ',';
         AppendNumber(TQL::ITick{tick}.Seconds(), io_rText);
         for (const Column& rColumn : m_Columns)
             AppendCells(rColumn, io_rText);
@@ -140,6 +145,7 @@ private:
         }
     }
 
+    const std::int64_t m_FramePeriod;
     std::vector<Column> m_Columns;
     std::vector<Grid> m_Grids;
 };
@@ -150,7 +156,7 @@ std::optional<VTable> ChooseChannels(const VRecording& i_rRecording, std::span<c
                                      std::string& o_rError)
 {
     std::vector<bool> used(i_Patterns.size(), false);
-    VTable table;
+    VTable table(std::max<std::int64_t>(1, i_rRecording.FramePeriod));
     for (const RecordedChannel& rChannel : i_rRecording.Channels)
     {
         bool bChosen = i_Patterns.empty();

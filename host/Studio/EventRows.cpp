@@ -1,5 +1,6 @@
 #include "Studio/EventRows.h"
 
+#include "Recordings/FrameNumbers.h"
 #include "Recordings/VRecording.h"
 
 #include <algorithm>
@@ -24,8 +25,8 @@ std::vector<EventRow> ListEvents(const Recordings::VRecording& i_rRecording)
         if (!rEvent.bOn || !(frame >= first && frame < end))
             continue;
         EventRow row;
-        row.Frame = static_cast<std::int64_t>(frame);
-        row.Tick = row.Frame * period;
+        row.Tick = static_cast<std::int64_t>(frame) * period;
+        row.Frame = Recordings::FrameAt(row.Tick, period);
         row.Text = QString::fromStdString(rEvent.Label);
         if (!rEvent.Context.empty() && rEvent.Context != "General")
             row.Text += QStringLiteral(", ") + QString::fromStdString(rEvent.Context);

@@ -16,9 +16,9 @@ namespace Studio
 /// One event of a recording as the operator sees it, at the motion frame nearest to it.
 struct EventRow
 {
-    std::int64_t Frame = 0;
-    std::int64_t Tick = 0; ///< of that frame
-    QString Text;          ///< "Foot Strike, Left"
+    std::int64_t Frame = 0; ///< its number in the file
+    std::int64_t Tick = 0;  ///< of that frame
+    QString Text;           ///< "Foot Strike, Left"
     QString Subject;
 
     friend bool operator==(const EventRow&, const EventRow&) = default;

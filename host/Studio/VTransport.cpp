@@ -2,6 +2,7 @@
 
 #include "Channels/VChannelService.h"
 #include "Channels/VRecordedContext.h"
+#include "Recordings/FrameNumbers.h"
 #include "Services/TimeRules.h"
 #include "Services/VTimeController.h"
 #include "Services/VTimeSource.h"
@@ -22,6 +23,12 @@ namespace
 namespace ETimeMode = OrvanePluginInterface::ETimeMode;
 
 constexpr std::chrono::milliseconds tellPeriod{40};
+
+TQL::TickRange RangeOf(const TransportState& i_rState)
+{
+    return {Recordings::TickOfFrame(i_rState.First, i_rState.FramePeriod),
+            Recordings::TickOfFrame(i_rState.Last + 1, i_rState.FramePeriod)};
+}
 
 } // namespace
 
@@ -94,9 +101,9 @@ TransportState VTransport::State() const
     if (!state.bRange)
         return state;
     state.FramePeriod = time.FramePeriodTicks;
-    state.First = TQL::FloorDivide(time.FirstTick, state.FramePeriod);
+    state.First = Recordings::FrameAt(time.FirstTick, state.FramePeriod);
     state.Last = state.First + std::max<std::int64_t>(1, time.LengthTicks / state.FramePeriod) - 1;
-    state.Frame = TQL::FloorDivide(time.CurrentTick, state.FramePeriod);
+    state.Frame = Recordings::FrameAt(time.CurrentTick, state.FramePeriod);
     state.Tick = time.CurrentTick;
     return state;
 }
@@ -126,7 +133,7 @@ void VTransport::SeekToFrame(std::int64_t i_Frame)
 {
     const TransportState state = State();
     if (state.bRange && !state.bLive)
-        m_pController->SeekTo(i_Frame * state.FramePeriod);
+        m_pController->SeekTo(Recordings::TickOfFrame(i_Frame, state.FramePeriod));
 }
 
 void VTransport::StepBy(std::int64_t i_Frames)
@@ -164,7 +171,7 @@ void VTransport::MarkLoopStart()
     const TransportState state = State();
     if (!state.bRange || state.bLive)
         return;
-    const TQL::TickRange range{state.First * state.FramePeriod, (state.Last + 1) * state.FramePeriod};
+    const TQL::TickRange range = RangeOf(state);
     m_pController->SetMarks(Services::MoveFirstMark(state.Marks, state.Tick, range, state.FramePeriod));
     SetLooping(true);
 }
@@ -174,7 +181,7 @@ void VTransport::MarkLoopEnd()
     const TransportState state = State();
     if (!state.bRange || state.bLive)
         return;
-    const TQL::TickRange range{state.First * state.FramePeriod, (state.Last + 1) * state.FramePeriod};
+    const TQL::TickRange range = RangeOf(state);
     m_pController->SetMarks(Services::MoveLastMark(state.Marks, state.Tick, range, state.FramePeriod));
     SetLooping(true);
 }

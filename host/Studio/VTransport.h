@@ -22,7 +22,8 @@ namespace Studio
 
 class VStudioSession;
 
-/// What the transport shows. Frames are those of the current context; First and Last are both included.
+/// What the transport shows. Frames are those of the current context, by the numbers that its file and the plots give
+/// them; First and Last are both included.
 struct TransportState
 {
     bool bSource = false;   ///< there is a context

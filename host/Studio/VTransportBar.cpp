@@ -1,5 +1,6 @@
 #include "Studio/VTransportBar.h"
 
+#include "Recordings/FrameNumbers.h"
 #include "Services/VTimeController.h"
 #include "Services/VUiPostalService.h"
 #include "Studio/TimeText.h"
@@ -255,8 +256,10 @@ void VTransportBar::RefreshPosition(const TransportState& i_rState)
     m_pSlider->setRange(ToInt(i_rState.First), ToInt(i_rState.Last));
     m_pSlider->setPageStep(std::max(1, ToInt((i_rState.Last - i_rState.First) / 20)));
     const std::int64_t period = i_rState.FramePeriod;
-    m_pSlider->SetLoop(i_rState.bLooping ? TQL::TickRange{i_rState.Marks.First / period, i_rState.Marks.Last / period}
-                                         : TQL::TickRange());
+    m_pSlider->SetLoop(i_rState.bLooping && !i_rState.Marks.IsEmpty()
+                           ? TQL::TickRange{Recordings::FrameAt(i_rState.Marks.First, period),
+                                            Recordings::FrameAt(i_rState.Marks.Last, period)}
+                           : TQL::TickRange());
     m_pFrame->setRange(ToInt(i_rState.First), ToInt(i_rState.Last));
     if (!m_pSlider->isSliderDown())
         m_pSlider->setValue(ToInt(i_rState.Frame));

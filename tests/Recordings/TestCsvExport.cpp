@@ -39,6 +39,7 @@ RecordedChannel MakeChannel(std::string i_Name, std::vector<std::string> i_Compo
 VRecording MakeRecording()
 {
     VRecording recording;
+    recording.FramePeriod = 1350000;
     recording.Channels.push_back(
         MakeChannel("Ann:Head", {"X", "Y", "Z"}, 1350000, 1350000, {0.1f, -2.0f, 3e-40f, NAN, NAN, NAN}));
     recording.Channels.push_back(MakeChannel("Fz", {""}, 0, 675000, {1.0f, 16777216.0f, 3.4028235e38f, -0.0f, 5.5f}));
@@ -61,23 +62,25 @@ std::string Export(const VRecording& i_rRecording, const std::vector<std::string
 TEST(CsvExport, Table)
 {
     EXPECT_EQ(Export(MakeRecording(), {}),
-              "time,Ann:Head.X,Ann:Head.Y,Ann:Head.Z,Fz,\"a \"\"b\"\", c.Q\",Ann:Toe.X,Ann:Toe.Y,Ann:Toe.Z\n"
-              "0,,,,1,,,,\n"
-              "0.005,,,,16777216,,,,\n"
-              "0.007407407407407408,,,,,7,,,\n"
-              "0.01,0.1,-2,3e-40,3.4028235e+38,,1,2,3\n"
-              "0.015,,,,-0,,,,\n"
-              "0.02,,,,5.5,,4,,6\n");
+              "frame,time,Ann:Head.X,Ann:Head.Y,Ann:Head.Z,Fz,\"a \"\"b\"\", c.Q\",Ann:Toe.X,Ann:Toe.Y,Ann:Toe.Z\n"
+              "1,0,,,,1,,,,\n"
+              "1,0.005,,,,16777216,,,,\n"
+              "1,0.007407407407407408,,,,,7,,,\n"
+              "2,0.01,0.1,-2,3e-40,3.4028235e+38,,1,2,3\n"
+              "2,0.015,,,,-0,,,,\n"
+              "3,0.02,,,,5.5,,4,,6\n");
 }
 
 TEST(CsvExport, Patterns)
 {
     const VRecording recording = MakeRecording();
-    EXPECT_EQ(Export(recording, {"Fz"}), "time,Fz\n0,1\n0.005,16777216\n0.01,3.4028235e+38\n0.015,-0\n0.02,5.5\n");
-    EXPECT_EQ(Export(recording, {"*Toe", "a*"}), "time,\"a \"\"b\"\", c.Q\",Ann:Toe.X,Ann:Toe.Y,Ann:Toe.Z\n"
-                                                 "0.007407407407407408,7,,,\n0.01,,1,2,3\n0.02,,4,,6\n");
+    EXPECT_EQ(Export(recording, {"Fz"}),
+              "frame,time,Fz\n1,0,1\n1,0.005,16777216\n2,0.01,3.4028235e+38\n2,0.015,-0\n3,0.02,5.5\n");
+    EXPECT_EQ(Export(recording, {"*Toe", "a*"}), "frame,time,\"a \"\"b\"\", c.Q\",Ann:Toe.X,Ann:Toe.Y,Ann:Toe.Z\n"
+                                                 "1,0.007407407407407408,7,,,\n2,0.01,,1,2,3\n3,0.02,,4,,6\n");
     // Rows where all are missing stay: the recording has a sample there, without a value.
-    EXPECT_EQ(Export(recording, {"Ann:Head"}), "time,Ann:Head.X,Ann:Head.Y,Ann:Head.Z\n0.01,0.1,-2,3e-40\n0.02,,,\n");
+    EXPECT_EQ(Export(recording, {"Ann:Head"}),
+              "frame,time,Ann:Head.X,Ann:Head.Y,Ann:Head.Z\n2,0.01,0.1,-2,3e-40\n3,0.02,,,\n");
     EXPECT_EQ(Export(recording, {"Fz", "toe"}),
               "error: no channel is named like \"toe\". Capitals count; look the names up in the list of channels.");
     EXPECT_EQ(Export({}, {}), "error: the recording holds no channels, so there is nothing to export.");
@@ -92,12 +95,14 @@ TEST(CsvExport, ManyRowsAndAFullDisk)
     recording.Channels.push_back(MakeChannel("a", {""}, 0, 1125000, samples));
     const std::string text = Export(recording, {});
     EXPECT_EQ(std::count(text.begin(), text.end(), '\n'), 300001);
-    EXPECT_TRUE(text.ends_with("\n2499.991666666667,99999.664\n")) << text.substr(text.size() - 60);
+    EXPECT_TRUE(text.ends_with("\n300000,2499.991666666667,99999.664\n")) << text.substr(text.size() - 60);
     std::size_t row = 0;
     for (std::size_t line = text.find('\n') + 1; line < text.size(); line = text.find('\n', line) + 1, ++row)
     {
-        ASSERT_EQ(std::strtof(text.c_str() + text.find(',', line) + 1, nullptr), samples[row]);
-        ASSERT_EQ(std::llround(std::strtod(text.c_str() + line, nullptr) * 135e6),
+        const std::size_t time = text.find(',', line) + 1;
+        ASSERT_EQ(std::strtoull(text.c_str() + line, nullptr, 10), row + 1);
+        ASSERT_EQ(std::strtof(text.c_str() + text.find(',', time) + 1, nullptr), samples[row]);
+        ASSERT_EQ(std::llround(std::strtod(text.c_str() + time, nullptr) * 135e6),
                   static_cast<long long>(row) * 1125000);
     }
 
@@ -119,7 +124,7 @@ TEST(CsvExport, IntoAPipe)
     close(ends[1]);
     char text[200] = {};
     EXPECT_GT(read(ends[0], text, sizeof(text) - 1), 0);
-    EXPECT_STREQ(text, "time,\"a \"\"b\"\", c.Q\"\n0.007407407407407408,7\n");
+    EXPECT_STREQ(text, "frame,time,\"a \"\"b\"\", c.Q\"\n1,0.007407407407407408,7\n");
     close(ends[0]);
 }
 

@@ -81,7 +81,7 @@ TEST_F(StudioProgram, ExportsATable)
     QFile file(Path("o.csv"));
     ASSERT_TRUE(file.open(QIODevice::ReadOnly));
     const QByteArray content = file.readAll();
-    EXPECT_EQ(content.left(content.indexOf('\n')), "time,Walker1:LFHD.X,Walker1:LFHD.Y,Walker1:LFHD.Z,Fz1");
+    EXPECT_EQ(content.left(content.indexOf('\n')), "frame,time,Walker1:LFHD.X,Walker1:LFHD.Y,Walker1:LFHD.Z,Fz1");
     EXPECT_EQ(content.count('\n'), 1 + 600);
 }
 

@@ -131,8 +131,8 @@ TEST(EventRows, EventsLieOnTheNearestFrameOfTheRecording)
                         {"", "For ever", 1e300}};
     const auto rows = Studio::ListEvents(recording);
     ASSERT_EQ(rows.size(), 2u);
-    EXPECT_EQ(rows[0], (Studio::EventRow{10, 10 * P, "Start", ""}));
-    EXPECT_EQ(rows[1], (Studio::EventRow{50, 50 * P, "Foot Off, Left", "Ann"}));
+    EXPECT_EQ(rows[0], (Studio::EventRow{11, 10 * P, "Start", ""}));
+    EXPECT_EQ(rows[1], (Studio::EventRow{51, 50 * P, "Foot Off, Left", "Ann"}));
 }
 
 TEST(WindowLayout, ComesBackFromItsFile)

@@ -143,7 +143,7 @@ protected:
     std::int64_t Frame() const
     {
         const auto pSource = m_pSession->Host().TimeController()->FindSource(m_pSession->CurrentContextName());
-        return pSource ? pSource->CurrentTick() / P : -1;
+        return pSource ? pSource->CurrentTick() / P + 1 : -1; // the first is 1, as in the plots
     }
 
     template <typename T>
@@ -213,21 +213,22 @@ TEST_F(StudioWindow, APersonsWalkByMouseAndKeyboard)
     EXPECT_TRUE(QTest::qWaitFor([&] { return AllPlotsHaveData(); }, patience));
 
     Press(Qt::Key_Space);
-    EXPECT_TRUE(QTest::qWaitFor([&] { return Frame() > 0; }, patience)) << "it plays";
+    EXPECT_TRUE(QTest::qWaitFor([&] { return Frame() > 1; }, patience)) << "it plays";
     Press(Qt::Key_Space);
     EXPECT_FALSE(m_pSession->Host().TimeController()->IsPlaying());
     Press(Qt::Key_Home);
-    EXPECT_EQ(Frame(), 0);
+    EXPECT_EQ(Frame(), 1);
+    EXPECT_TRUE(QTest::qWaitFor([&] { return Find<QSpinBox>("frame")->value() == 1; }, patience));
     Press(Qt::Key_Right);
     Press(Qt::Key_Right, Qt::ShiftModifier);
-    EXPECT_EQ(Frame(), 11);
+    EXPECT_EQ(Frame(), 12);
     Press(Qt::Key_Left);
-    EXPECT_EQ(Frame(), 10);
+    EXPECT_EQ(Frame(), 11);
     Press(Qt::Key_Left, Qt::ShiftModifier);
     Press(Qt::Key_Right, Qt::ControlModifier);
     EXPECT_EQ(Frame(), events.front().Frame);
     Press(Qt::Key_End);
-    EXPECT_EQ(Frame(), frames - 1);
+    EXPECT_EQ(Frame(), frames);
     Press(Qt::Key_Left, Qt::ControlModifier);
     EXPECT_EQ(Frame(), events.back().Frame);
     auto* pEvents = Find<QTreeView>("eventList");
@@ -397,7 +398,7 @@ TEST_F(StudioWindow, KeysThatBelongToAWidgetAreNotTaken)
     Press(Qt::Key_Escape);
     Press(Qt::Key_Escape);
     Press(Qt::Key_Right, Qt::ShiftModifier);
-    EXPECT_EQ(Frame(), 10);
+    EXPECT_EQ(Frame(), 11);
     Press(Qt::Key_I);
     Press(Qt::Key_Right, Qt::ShiftModifier);
     Press(Qt::Key_O);
