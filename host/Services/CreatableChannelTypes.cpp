@@ -27,21 +27,33 @@ struct MeasurementTraits
     std::string_view Name;
     bool bOfPositions;      ///< markers will do
     bool bSupportMagnitude; ///< a vector, or a rotation, with nothing beside it
+    bool bReference;        ///< the first input is what the second is measured against
 };
 
 constexpr std::array<MeasurementTraits, 6> Traits{{
-    {"_DistanceBetween", true, false},
-    {"_DifferenceBetween", true, true},
-    {"_AngleBetween", true, false},
-    {"_RelativePosition", false, true},
-    {"_RelativeRotation", false, true},
-    {"_RelativePose", false, false},
+    {"_DistanceBetween", true, false, false},
+    {"_DifferenceBetween", true, true, true},
+    {"_AngleBetween", true, false, false},
+    {"_RelativePosition", false, true, true},
+    {"_RelativeRotation", false, true, true},
+    {"_RelativePose", false, false, true},
 }};
 
 /// The first input of a measurement is often a pose, of which there is no magnitude; the measurement has its own say.
 void SetMagnitude(VDerivedChannelParameters& io_rRecord, bool i_bSupported)
 {
     io_rRecord.TypeParameters.emplace_back(ChannelSystemUtils::ParameterName::SupportMagnitude, i_bSupported);
+}
+
+/// "Pelvis (reference) ➞ Head": the names say which of the two is which.
+void NameReference(VDerivedChannelParameters& io_rRecord)
+{
+    namespace Names = ChannelSystemUtils::ParameterName;
+    for (auto& [rName, rValue] : io_rRecord.InstanceParameters)
+        if (rName == Names::InstanceDisplayName)
+            rValue = std::string("%1% (reference) \u279E %2%");
+    io_rRecord.Hash =
+        ChannelSystemUtils::HashDerivation(io_rRecord, ChannelSystemUtils::ParameterGroup::AlgebraicOperation);
 }
 
 CreatableChannelType MakePositionAndRotation()
@@ -85,6 +97,8 @@ CreatableChannelType MakeMeasurement(const RelativeMeasurement& i_rMeasurement)
     type.bSupportMagnitude = traits != Traits.end() && traits->bSupportMagnitude;
     type.Record = ChannelSystemUtils::MakeDerivedRecord(i_rMeasurement);
     SetMagnitude(*type.Record, type.bSupportMagnitude);
+    if (traits != Traits.end() && traits->bReference)
+        NameReference(*type.Record);
     return type;
 }
 

@@ -4,7 +4,9 @@
 #include "ChannelSystem/IChannelService.h"
 #include "ChannelSystemUtils/ChannelParameterAccess.h"
 #include "ChannelSystemUtils/ChannelParameterNames.h"
+#include "Channels/ChannelTypes.h"
 #include "Channels/VChannelParameters.h"
+#include "Services/VSelectionSource.h"
 
 #include <algorithm>
 #include <utility>
@@ -31,6 +33,21 @@ std::shared_ptr<TQL::IChannelParameters> MakeParameters(const CreatableChannelTy
     return pParameters;
 }
 
+/// How many things were selected before the one that a channel is about; a subject stands for its root segment. The
+/// number of all for a channel of nothing that is selected.
+std::size_t PlaceIn(const VSelectionSource& i_rSelection, const TQL::IChannelInstanceId& i_rId)
+{
+    const auto item = Channels::SelectionOfChannel(i_rId);
+    const auto isOf = [&](const TQL::SelectionItem& i_rSelected)
+    {
+        return i_rSelected == *item ||
+               (i_rSelected.Kind == TQL::ESelectionKind::Subject && item->Kind == TQL::ESelectionKind::Segment &&
+                i_rSelected.First == item->First && i_rSelection.RootSegment(item->First) == item->Second);
+    };
+    const auto& rItems = i_rSelection.Items();
+    return item ? static_cast<std::size_t>(std::ranges::find_if(rItems, isOf) - rItems.begin()) : rItems.size();
+}
+
 const CreatableChannelType* Find(const std::vector<CreatableChannelType>& i_rTypes, std::string_view i_Name)
 {
     const auto type = std::ranges::find(i_rTypes, i_Name, &CreatableChannelType::Name);
@@ -49,6 +66,23 @@ VChannelTypeRegistry::VChannelTypeRegistry(ThreadCheckPointer i_pCheck)
 void VChannelTypeRegistry::SetChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService)
 {
     m_pService = std::move(i_pService);
+}
+
+void VChannelTypeRegistry::SetSelection(std::shared_ptr<const VSelectionSource> i_pSelection)
+{
+    m_pSelection = std::move(i_pSelection);
+}
+
+/// What is not selected goes last, in the order given.
+std::vector<std::shared_ptr<TQL::IChannel>>
+VChannelTypeRegistry::InOrder(std::vector<std::shared_ptr<TQL::IChannel>> i_Inputs) const
+{
+    if (!m_pSelection || i_Inputs.size() < 2)
+        return i_Inputs;
+    std::ranges::stable_sort(i_Inputs, {},
+                             [&](const std::shared_ptr<TQL::IChannel>& i_rpInput)
+                             { return PlaceIn(*m_pSelection, i_rpInput->GetInstanceId()); });
+    return i_Inputs;
 }
 
 void VChannelTypeRegistry::GetTypes(std::uint64_t, std::vector<std::string>& o_rTypes) const
@@ -88,7 +122,7 @@ TQL::IResult VChannelTypeRegistry::CreateChannels(std::string_view i_Type,
     if (!m_pService)
         return TQL::Result::NotAvailable;
     auto pChannel = m_pService->CreateDerivedChannel(ChannelSystemUtils::OperationName::AlgebraicExpression,
-                                                     *pType->Record, i_rInputs);
+                                                     *pType->Record, InOrder(i_rInputs));
     if (!pChannel)
         return TQL::Result::Failed;
     o_rChannels.push_back(std::move(pChannel));

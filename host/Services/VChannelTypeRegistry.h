@@ -13,9 +13,12 @@ class IChannelService;
 namespace Services
 {
 
+class VSelectionSource;
+
 /// The channel types that an operator can create in this host: what the table of creatable types holds. Channels are
-/// made through the channel service that the plug-in itself has, so that in a checking host they are checked ones.
-/// Owned by the host services. UI thread.
+/// made through the channel service that the plug-in itself has, so that in a checking host they are checked ones. The
+/// inputs of one channel are laid in the order in which they were selected, so that the operator says what is measured
+/// against what. Owned by the host services. UI thread.
 class VChannelTypeRegistry : public TQL::IChannelTypeRegistry
 {
 public:
@@ -23,6 +26,8 @@ public:
 
     /// Without one nothing can be created.
     void SetChannelService(std::shared_ptr<ChannelSystem::IChannelService> i_pService);
+    /// Without one the inputs stay in the order in which they are given.
+    void SetSelection(std::shared_ptr<const VSelectionSource> i_pSelection);
 
     void GetTypes(std::uint64_t i_Mask, std::vector<std::string>& o_rTypes) const override;
     TQL::IResult GetSpecifier(std::string_view i_Type,
@@ -40,10 +45,13 @@ public:
     std::shared_ptr<TQL::IChangeSignal> TypeListChanged() const override;
 
 private:
+    std::vector<std::shared_ptr<TQL::IChannel>> InOrder(std::vector<std::shared_ptr<TQL::IChannel>> i_Inputs) const;
+
     const ThreadCheckPointer m_pCheck;
     const std::shared_ptr<NotificationSystem::VChangeSignal> m_pTypeListChanged;
     const std::vector<CreatableChannelType> m_Types;
     std::shared_ptr<ChannelSystem::IChannelService> m_pService;
+    std::shared_ptr<const VSelectionSource> m_pSelection;
 };
 
 } // namespace Services

@@ -77,6 +77,7 @@ struct VHostServices::Parts
         , Loans(i_rOptions.bChecking)
     {
         pTimeRegistry->Add(VTimeControllerRegistry::DefaultName, pTimeController);
+        pTypes->SetSelection(pSelection);
         if (!i_rOptions.bChecking)
             return;
         pGivenUi = std::make_shared<VCheckedPostalService>(pUi);

@@ -22,7 +22,8 @@ public:
     explicit VSelectionSource(ThreadCheckPointer i_pCheck = nullptr);
 
     std::shared_ptr<const TQL::ISelection> GetSelection() const override;
-    void Set(const std::vector<TQL::SelectionItem>& i_rItems) override; ///< an equal selection raises nothing
+    const std::vector<TQL::SelectionItem>& Items() const { return m_Items; } ///< of all kinds, as they were selected
+    void Set(const std::vector<TQL::SelectionItem>& i_rItems) override;      ///< an equal selection raises nothing
     void Add(const std::vector<TQL::SelectionItem>& i_rItems) override;
     std::shared_ptr<TQL::IMultiCallbackPostal<void(bool)>> Changed() const override;
     std::uint64_t RootSegment(std::uint64_t i_Subject) const override;                 ///< 0 until SetRootSegments

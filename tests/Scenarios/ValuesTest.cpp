@@ -39,8 +39,8 @@ TEST_F(PlotScenario, NumbersAreWhatTheNamesSay)
              {"Force.Fz", "Auto", "d1", 3, "Device Output 1st Derivative - Force.Fz: 1200"},
              {hips, "_DistanceBetween", "", 3, "Distance Between - Anna:LASI ➞ Anna:RASI: 50"},
              {hips, "_DistanceBetween", "", 5, "Distance Between - Anna:LASI ➞ Anna:RASI: -"},
-             {hips, "_DifferenceBetween", "", 3, "Difference Between - Anna:LASI ➞ Anna:RASI: 0 -40 30"},
-             {hips, "_DifferenceBetween", "mag", 3, "Distance Between - Anna:LASI ➞ Anna:RASI: 50"},
+             {hips, "_DifferenceBetween", "", 3, "Difference Between - Anna:LASI (reference) ➞ Anna:RASI: 0 -40 30"},
+             {hips, "_DifferenceBetween", "mag", 3, "Distance Between - Anna:LASI (reference) ➞ Anna:RASI: 50"},
              {corner, "_AngleBetween", "", 3, "Angle Between - Anna:LASI ➞ Anna:RASI ➞ Anna:C7: 90"},
              {"Anna:Pelvis", "Auto", "", 3, "Pose (Helical) - Anna:Pelvis: 0 0 17.1887 100 0 900"},
              {"Anna:Pelvis", "Auto", "f1", 3, "Pose (Axis and Angle) - Anna:Pelvis: 0 0 1 17.1887 100 0 900"},
@@ -53,12 +53,15 @@ TEST_F(PlotScenario, NumbersAreWhatTheNamesSay)
              {"Knee", "Auto", "f8", 3, "Joint Angles (Euler ZXY) - Knee: 13 20 -5"}, // as in the recording
              {"Knee", "Auto", "f8 rad", 3, "Joint Angles (Euler ZXY) - Knee: 0.2269 0.3491 -0.0873"},
              {"Knee", "Auto", "d1", 3, "Joint Angles 1st Derivative - Knee: 0 0 120"}, // about the Z axis of the parent
-             {leg, "_RelativePosition", "", 3, "Relative Position - Anna:Pelvis ➞ Anna:Femur: 0 0 -400"},
-             {leg, "_RelativePosition", "mag", 3, "Relative Distance From Origin - Anna:Pelvis ➞ Anna:Femur: 400"},
-             {leg, "_RelativeRotation", "", 3, "Relative Rotation (Helical) - Anna:Pelvis ➞ Anna:Femur: 0 0 11.4592"},
+             {leg, "_RelativePosition", "", 3, "Relative Position - Anna:Pelvis (reference) ➞ Anna:Femur: 0 0 -400"},
+             {leg, "_RelativePosition", "mag", 3,
+              "Relative Distance From Origin - Anna:Pelvis (reference) ➞ Anna:Femur: 400"},
+             {leg, "_RelativeRotation", "", 3,
+              "Relative Rotation (Helical) - Anna:Pelvis (reference) ➞ Anna:Femur: 0 0 11.4592"},
              {leg, "_RelativeRotation", "mag rad", 3,
-              "Relative Rotation (Helical) (Angle) - Anna:Pelvis ➞ Anna:Femur: 0.2"},
-             {leg, "_RelativePose", "m", 3, "Relative Pose (Helical) - Anna:Pelvis ➞ Anna:Femur: 0 0 11.4592 0 0 -0.4"},
+              "Relative Rotation (Helical) (Angle) - Anna:Pelvis (reference) ➞ Anna:Femur: 0.2"},
+             {leg, "_RelativePose", "m", 3,
+              "Relative Pose (Helical) - Anna:Pelvis (reference) ➞ Anna:Femur: 0 0 11.4592 0 0 -0.4"},
          })
     {
         std::istringstream stream(rCase.pSelected);

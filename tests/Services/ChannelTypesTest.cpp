@@ -1,3 +1,4 @@
+#include "Channels/ChannelTypes.h"
 #include "ChannelSystem/IChannel.h"
 #include "ChannelSystem/IChannelService.h"
 #include "ChannelSystem/IChannelTypeRegistry.h"
@@ -10,6 +11,7 @@
 #include "OrvanePluginInterface/IChannelMigrationService.h"
 #include "Services/VCheckedChannels.h"
 #include "Services/VHostServices.h"
+#include "Services/VSelectionSource.h"
 
 #include <gtest/gtest.h>
 
@@ -182,6 +184,32 @@ TEST_F(ChannelTypes, CreatableTypesMakeWhatTheyAreNamedFor)
     EXPECT_EQ(m_pTypes->CreateChannels("SubjectSegmentPose", {}, none), TQL::Result::NotFound);
     EXPECT_EQ(m_pTypes->CreateGlobalChannels("_RelativePose", "A", none), TQL::Result::InvalidArgument);
     EXPECT_EQ(m_Host.Faults(), std::vector<std::string>());
+}
+
+/// The first of two that were ticked is the reference, whichever id comes first, and the name tells it.
+TEST_F(ChannelTypes, InputsLieInTheOrderOfTicking)
+{
+    const auto itemOf = [this](const char* i_pName)
+    {
+        return *Channels::SelectionOfChannel(Find("A", i_pName)->GetInstanceId());
+    };
+    const auto nameOf = [this](const char* i_pType, const std::vector<std::string>& i_rInputs)
+    {
+        return Text(*Create(i_pType, i_rInputs)[0]->GetParameters(), "InstanceDisplayName");
+    };
+    const std::vector<std::string> segments{"Ann:Pelvis", "Ann:Head"};
+    m_Host.Selection()->Set({itemOf("Ann:Head"), itemOf("Ann:RFHD"), itemOf("Ann:Pelvis"), itemOf("Ann:LFHD")});
+    EXPECT_EQ(nameOf("_RelativePose", segments), "Ann:Head (reference) ➞ Ann:Pelvis");
+    EXPECT_EQ(nameOf("_DifferenceBetween", {"Ann:LFHD", "Ann:Head"}), "Ann:Head (reference) ➞ Ann:LFHD");
+    EXPECT_EQ(nameOf("_DistanceBetween", {"Ann:LFHD", "Ann:RFHD"}), "Ann:RFHD ➞ Ann:LFHD");
+    EXPECT_EQ(nameOf("_DistanceBetween", {"Knee", "Ann:RFHD"}), "Ann:RFHD ➞ Knee") << "not ticked: last";
+    m_Host.Selection()->Set({itemOf("Ann:Pelvis"), itemOf("Ann:Head")});
+    EXPECT_EQ(nameOf("_RelativePose", segments), "Ann:Pelvis (reference) ➞ Ann:Head");
+    // A subject that is ticked stands for its root segment.
+    const std::uint64_t ann = itemOf("Ann:Head").First;
+    m_Host.Selection()->SetRootSegments([root = itemOf("Ann:Pelvis").Second](std::uint64_t) { return root; });
+    m_Host.Selection()->Set({itemOf("Ann:Head"), {TQL::ESelectionKind::Subject, ann, 0, {}}});
+    EXPECT_EQ(nameOf("_RelativePose", segments), "Ann:Head (reference) ➞ Ann:Pelvis");
 }
 
 TEST_F(ChannelTypes, ChannelsMigrateByNameThenByNumber)
