@@ -20,6 +20,8 @@
 #include <QtWidgets/QToolButton>
 #include <QtWidgets/QVBoxLayout>
 
+#include <utility>
+
 namespace Studio
 {
 
@@ -192,6 +194,10 @@ void VChannelPanel::ShowCurrentContext()
         if (pContext->GetChannels()->empty()) // monitors alone are nothing to begin with
             known.clear();
         SetLeaves(MakeLeaves(things));
+        // Words for the channels of another recording would leave nothing of this one.
+        const bool bOther = std::exchange(m_ShownContext, pContext->GetName()) != pContext->GetName();
+        if (bOther && m_pModel->LeafCount() > 0 && m_pShown->AllLeaves().isEmpty())
+            m_pSearch->clear();
         const auto items = m_Selection.Show(pContext->GetName(), known);
         m_pModel->SetTicked(items);
         m_rSession.Host().Selection()->Set(items);

@@ -7,6 +7,7 @@
 #include <QtWidgets/QWidget>
 
 #include <memory>
+#include <string>
 #include <vector>
 
 class QLabel;
@@ -61,6 +62,7 @@ private:
     QLabel* m_pCount = nullptr;
     std::vector<ChannelTreeLeaf> m_Leaves;           ///< in the tree
     std::vector<std::shared_ptr<const void>> m_From; ///< what they were made from: contexts and lists of channels
+    std::string m_ShownContext;                      ///< of the last channels in the tree
     VContextSelection m_Selection;
     Services::VHostSubscriptions m_Subscriptions;
 };

@@ -9,6 +9,7 @@
 #include "Studio/VNoticeBar.h"
 #include "Studio/VOpenFiles.h"
 #include "Studio/VStudioSession.h"
+#include "TQL/Log.h"
 
 #include <QtCore/QCoreApplication>
 #include <QtGui/QAction>
@@ -26,6 +27,8 @@ namespace
 {
 
 constexpr std::uint32_t simulatedSubjects = 2;
+const QString refusedTopic = QStringLiteral("refusedFiles");
+const QString warnedTopic = QStringLiteral("filesWithWarnings");
 
 } // namespace
 
@@ -43,7 +46,7 @@ VFileActions::VFileActions(VStudioSession& i_rSession, VMainActions& i_rActions,
     connect(&rLoader, &VRecordingLoader::Finished, this,
             [this](int, const QString& i_rContextName) { TakeOpened(i_rContextName); });
     connect(&rLoader, &VRecordingLoader::Failed, this,
-            [this](int, const QString& i_rMessage) { m_rNotices.Add(i_rMessage); });
+            [this](int, const QString& i_rMessage) { TellRefused(i_rMessage); });
     // After the last file of a batch nothing waits to be shown any more.
     const auto settle = [this, &rLoader]
     {
@@ -97,6 +100,8 @@ void VFileActions::ChooseFiles()
 
 void VFileActions::Open(std::span<const std::filesystem::path> i_Paths)
 {
+    if (!i_Paths.empty() && m_rFiles.Loader().IsIdle())
+        ForgetNotices();
     m_bShowNext = m_bShowNext || !i_Paths.empty();
     for (const auto& rPath : i_Paths)
         m_rFiles.Open(rPath);
@@ -132,8 +137,31 @@ void VFileActions::TakeOpened(const QString& i_rContextName)
 void VFileActions::TellWarnings(const QString& i_rFile, int i_Count)
 {
     const QString warnings = i_Count == 1 ? tr("a warning") : tr("%1 warnings").arg(i_Count);
-    m_rNotices.Add(tr("%1 was opened with %2: something had to be guessed or repaired.").arg(i_rFile, warnings),
-                   tr("Show in the lo&g"), [this] { Q_EMIT ProblemsRequested(); });
+    const QString opened = ++m_Warned == 1 ? tr("%1 was opened with %2").arg(i_rFile, warnings)
+                                           : tr("%1 files were opened with warnings").arg(m_Warned);
+    m_rNotices.Set(warnedTopic, tr("%1: something had to be guessed or repaired.").arg(opened), tr("Show in the lo&g"),
+                   [this] { Q_EMIT ProblemsRequested(); });
+}
+
+/// One line for them all, and each in the log.
+void VFileActions::TellRefused(const QString& i_rMessage)
+{
+    TQL::Log::Write(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error, i_rMessage.toStdString(),
+                    "Studio/VFileActions", __LINE__);
+    const QString text =
+        ++m_Refused == 1
+            ? i_rMessage
+            : tr("%1 files could not be opened. The last one: %2").arg(QString::number(m_Refused), i_rMessage);
+    m_rNotices.Set(refusedTopic, text, tr("Show in the lo&g"), [this] { Q_EMIT ProblemsRequested(); });
+}
+
+/// What was told of the files before is history.
+void VFileActions::ForgetNotices()
+{
+    m_Refused = 0;
+    m_Warned = 0;
+    m_rNotices.Clear(refusedTopic);
+    m_rNotices.Clear(warnedTopic);
 }
 
 } // namespace Studio

@@ -43,12 +43,16 @@ private:
     void FillRecentMenu(QMenu& o_rMenu);
     void TakeOpened(const QString& i_rContextName);
     void TellWarnings(const QString& i_rFile, int i_Count);
+    void TellRefused(const QString& i_rMessage);
+    void ForgetNotices();
 
     VStudioSession& m_rSession;
     VOpenFiles& m_rFiles;
     VNoticeBar& m_rNotices;
     QWidget& m_rWindow;
     bool m_bShowNext = false; ///< the next file that is read is to be shown
+    int m_Refused = 0;        ///< files, since files were opened last
+    int m_Warned = 0;
 };
 
 } // namespace Studio

@@ -5,6 +5,7 @@
 #include <QtWidgets/QPushButton>
 #include <QtWidgets/QVBoxLayout>
 
+#include <algorithm>
 #include <utility>
 
 namespace Studio
@@ -24,9 +25,12 @@ void VNoticeBar::Add(const QString& i_rText)
     Add(i_rText, {}, {});
 }
 
-void VNoticeBar::Add(const QString& i_rText, const QString& i_rButton, std::function<void()> i_Do)
+void VNoticeBar::Set(const QString& i_rTopic, const QString& i_rText, const QString& i_rButton,
+                     std::function<void()> i_Do)
 {
+    Clear(i_rTopic);
     auto* pRow = new QWidget(this);
+    pRow->setObjectName(i_rTopic);
     auto* pLayout = new QHBoxLayout(pRow);
     pLayout->setContentsMargins(0, 0, 0, 0);
     auto* pText = new QLabel(i_rText, pRow);
@@ -56,6 +60,14 @@ void VNoticeBar::Add(const QString& i_rText, const QString& i_rButton, std::func
     if (m_Rows.size() > Most)
         Remove(m_Rows.front());
     show();
+}
+
+void VNoticeBar::Clear(const QString& i_rTopic)
+{
+    const auto row =
+        std::ranges::find_if(m_Rows, [&](const QWidget* i_pRow) { return i_pRow->objectName() == i_rTopic; });
+    if (!i_rTopic.isEmpty() && row != m_Rows.end())
+        Remove(*row);
 }
 
 void VNoticeBar::Remove(QWidget* i_pRow)

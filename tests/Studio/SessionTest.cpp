@@ -255,6 +255,7 @@ TEST_F(StudioSession, TheWindowFollowsContextTimeAndSelection)
     EXPECT_TRUE(QTest::qWaitFor([&] { return window.findChild<QLabel*>(QStringLiteral("noticeText")) != nullptr; }));
     EXPECT_TRUE(
         window.findChild<QLabel*>(QStringLiteral("noticeText"))->text().contains(QStringLiteral("missing.c3d")));
+    EXPECT_FALSE(m_Log.Take().empty()) << "and it stands in the log";
     EXPECT_EQ(m_Session.CurrentContextName(), "walk");
 }
 

@@ -305,18 +305,48 @@ TEST_F(StudioWindow, WhatCannotBeReadAndWhatWasGuessedIsTold)
     };
     EXPECT_TRUE(notice("letter.c3d"));
     EXPECT_TRUE(Find<QWidget>("startPage")->isVisible()) << "nothing was opened";
+    const auto refused = m_Log.Take();
+    EXPECT_TRUE(std::ranges::any_of(refused, [](const auto& i_rEntry)
+                                    { return i_rEntry.Text.find("letter.c3d") != std::string::npos; }));
 
     // A table without times has to be guessed at.
     std::ofstream(m_Folder / "table.csv") << "a,b\n1,2\n3,4\n5,6\n";
     Drop(m_Folder / "table.csv");
     EXPECT_TRUE(notice("table.csv was opened with"));
     EXPECT_EQ(m_pSession->CurrentContextName(), "table");
+    EXPECT_EQ(m_pWindow->findChildren<QPushButton*>("noticeClose").size(), 1) << "of the file before nothing is told";
     EXPECT_FALSE(Find<QWidget>("logPanel")->isVisible());
     QTest::mouseClick(Find<QPushButton>("noticeButton"), Qt::LeftButton);
     EXPECT_TRUE(Find<QWidget>("logPanel")->isVisible());
     const QAbstractItemModel* pLog = Find<QTreeView>("log")->model();
     ASSERT_GT(pLog->rowCount(), 0);
     EXPECT_TRUE(pLog->index(pLog->rowCount() - 1, 3).data().toString().startsWith("table.csv:"));
+}
+
+TEST_F(StudioWindow, ASearchThatFindsNothingInTheNextRecordingIsCleared)
+{
+    const auto walk = WriteWalk();
+    std::ofstream(m_Folder / "table.csv") << "time,knee,hip\n0,1,2\n0.01,2,3\n";
+    Start();
+    const auto show = [&](const char* i_pFile, const std::string& i_rContext)
+    {
+        m_pWindow->OpenFile(m_Folder / i_pFile);
+        return QTest::qWaitFor(
+            [&]
+            {
+                const auto* pModel = Find<QTreeView>("channelTree")->model();
+                return m_pSession->CurrentContextName() == i_rContext && pModel->rowCount() > 0;
+            },
+            patience);
+    };
+    ASSERT_TRUE(show("walk.c3d", "walk"));
+    auto* pSearch = Find<QLineEdit>("channelSearch");
+    pSearch->setText(QStringLiteral("lfhd"));
+    EXPECT_TRUE(show("table.csv", "table")) << "channels are seen";
+    EXPECT_EQ(pSearch->text(), "");
+    pSearch->setText(QStringLiteral("kne"));
+    EXPECT_TRUE(show("walk.c3d", "walk (2)"));
+    EXPECT_EQ(pSearch->text(), "kne") << "this one finds something there, too";
 }
 
 /// Names come from files: none is ever taken for markup, wherever the window shows it.
