@@ -16,12 +16,12 @@ using TQL::ESelectionKind;
 
 // One type for each kind of thing that is selected: with two, what is selected would not tell which of them to plot.
 constexpr std::array<ChannelType, 7> Types{{
-    {LabelledReconstructionType, EChannelKind::Marker, ESelectionKind::Label, "Position", "Labels", "Position",
+    {LabelledReconstructionType, EChannelKind::Marker, ESelectionKind::Label, "Position", "Markers", "Position",
      "TX,TY,TZ", EUnitUse::AllComponents, true, 0},
     {SegmentPoseType, EChannelKind::SegmentPose, ESelectionKind::Segment, "Pose", "Segments", "Pose",
      "RX,RY,RZ,TX,TY,TZ", EUnitUse::PositionOfPose, false, 0},
-    {DeviceOutputType, EChannelKind::Analog, ESelectionKind::AnalogueDeviceOutput, "Device Output", "Devices", "", "",
-     EUnitUse::AllComponents, false, 0},
+    {DeviceOutputType, EChannelKind::Analog, ESelectionKind::AnalogueDeviceOutput, "Device Output", "Device Outputs",
+     "", "", EUnitUse::AllComponents, false, 0},
     {ModelOutputType, EChannelKind::Column, ESelectionKind::ModelOutput, "Model Output", "Model Outputs", "", "",
      EUnitUse::AllComponents, false, 0},
     {CameraPoseType, std::nullopt, ESelectionKind::Camera, "Camera Pose", "Cameras", "Pose", "RX,RY,RZ,TX,TY,TZ",

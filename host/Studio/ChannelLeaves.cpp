@@ -48,20 +48,25 @@ QStringList Texts(const std::vector<std::string>& i_rTexts)
     return texts;
 }
 
-QString BranchOf(const std::string& i_rTypeName)
+/// What plots call by another name than that of the type stands under that name here too.
+QString BranchOf(const SelectableThing& i_rThing)
 {
+    if (i_rThing.TypeText == "Column")
+        return QCoreApplication::translate("ChannelTree", "Columns");
+    if (i_rThing.TypeText == "Joint Angles")
+        return QCoreApplication::translate("ChannelTree", "Joint angles");
     static constexpr struct
     {
         std::string_view Type;
         const char* pText;
     } rows[] = {{Channels::LabelledReconstructionType, QT_TRANSLATE_NOOP("ChannelTree", "Markers")},
                 {Channels::SegmentPoseType, QT_TRANSLATE_NOOP("ChannelTree", "Segments")},
-                {Channels::DeviceOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Analog outputs")},
+                {Channels::DeviceOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Device outputs")},
                 {Channels::ModelOutputType, QT_TRANSLATE_NOOP("ChannelTree", "Model outputs")},
                 {Channels::CameraPoseType, QT_TRANSLATE_NOOP("ChannelTree", "Cameras")},
                 {Channels::MonitorType, QT_TRANSLATE_NOOP("ChannelTree", "Monitors")}};
     for (const auto& rRow : rows)
-        if (rRow.Type == i_rTypeName)
+        if (rRow.Type == i_rThing.TypeName)
             return QCoreApplication::translate("ChannelTree", rRow.pText);
     return QCoreApplication::translate("ChannelTree", "Other channels");
 }
@@ -74,6 +79,7 @@ void AddThings(const Channels::VChannelContext& i_rContext, std::vector<Selectab
             const Channels::ChannelDefinition& rDefinition = rpChannel->GetDefinition();
             o_rThings.push_back({NameOf(*rpChannel), rpChannel->GetInstanceId().TypeName, std::move(*item),
                                  UnitsOf(rDefinition), Channels::ComponentNamesOf(rDefinition)});
+            o_rThings.back().TypeText = rDefinition.TypeText;
         }
 }
 
@@ -128,7 +134,7 @@ std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableThing> i_Thing
         }
         const QString name = QString::fromStdString(rThing.Name);
         const qsizetype colon = name.indexOf(QLatin1Char(':'));
-        const QString kind = BranchOf(rThing.TypeName);
+        const QString kind = BranchOf(rThing);
         ChannelTreeLeaf leaf{{kind}, name.mid(colon + 1), rThing.Item, {}};
         leaf.Search = {name, kind, Texts(rThing.Units), Texts(rThing.Components)};
         if (colon > 0)

@@ -22,6 +22,7 @@ struct SelectableThing
     TQL::SelectionItem Item;
     std::vector<std::string> Units = {};      ///< of its components, each once
     std::vector<std::string> Components = {}; ///< names; for a subject the name of its root segment
+    std::string TypeText = {};                ///< what plots call its type; empty where that is the type's own name
 };
 
 /// Those of the context's channels in their order, then of the global ones, then the subjects that have segments.

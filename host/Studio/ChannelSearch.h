@@ -10,7 +10,7 @@ namespace Studio
 struct ChannelSearchText
 {
     QString Name; ///< with its subject: "Walker1:LFHD"
-    QString Kind; ///< as the tree calls it: "Analog outputs"
+    QString Kind; ///< as the tree calls it: "Device outputs"
     QStringList Units;
     QStringList Components;
 

@@ -42,6 +42,7 @@ VChannelPanel::VChannelPanel(VStudioSession& i_rSession, VMainActions& i_rAction
     pLayout->addWidget(m_pSearch);
     pLayout->addWidget(m_pTree, 1);
     pLayout->addWidget(MakeFoot(i_rActions));
+    pLayout->addWidget(m_pCount);
     connect(i_rActions.Get(EAction::TickShown), &QAction::triggered, this,
             [this] { m_pShown->Tick(m_pShown->AllLeaves(), true); });
     connect(i_rActions.Get(EAction::UntickAll), &QAction::triggered, this,
@@ -63,7 +64,7 @@ void VChannelPanel::BuildSearch()
     m_pSearch->setAccessibleName(tr("Search channels"));
     m_pSearch->setPlaceholderText(tr("Search channels (Ctrl+F)"));
     m_pSearch->setToolTip(tr("Words of names, kinds, units or components; all of them must fit.\n"
-                             "For example: walker1 knee, or analog V"));
+                             "For example: walker1 knee, or device V"));
     m_pSearch->setClearButtonEnabled(true);
     m_pSearch->setAcceptDrops(false); // a file that is dropped here is to be opened, too
     m_pSearch->installEventFilter(this);
@@ -94,10 +95,10 @@ QWidget* VChannelPanel::MakeFoot(VMainActions& i_rActions)
         pButton->setFocusPolicy(Qt::TabFocus);
         pLayout->addWidget(pButton);
     }
-    m_pCount = new QLabel(pFoot);
+    pLayout->addStretch(1);
+    m_pCount = new QLabel(this);
     m_pCount->setObjectName(QStringLiteral("tickedCount"));
-    m_pCount->setAlignment(Qt::AlignRight | Qt::AlignVCenter);
-    pLayout->addWidget(m_pCount, 1);
+    m_pCount->setSizePolicy(QSizePolicy::Ignored, QSizePolicy::Preferred); // a longer text makes nothing wider
     return pFoot;
 }
 

@@ -40,6 +40,12 @@ VFileActions::VFileActions(VStudioSession& i_rSession, VMainActions& i_rActions,
     connect(i_rActions.Get(EAction::Resample), &QAction::toggled, this,
             [this](bool i_bOn) { m_rFiles.Loader().SetResampling(i_bOn); });
     connect(i_rActions.Get(EAction::OpenSample), &QAction::triggered, this, &VFileActions::OpenSample);
+    connect(i_rActions.Get(EAction::CloseFile), &QAction::triggered, this,
+            [this]
+            {
+                ForgetNotices();
+                m_rFiles.Close(QString::fromStdString(m_rSession.CurrentContextName()));
+            });
     connect(i_rActions.Get(EAction::StartSimulation), &QAction::triggered, this, &VFileActions::StartSimulation);
     connect(i_rActions.Get(EAction::Quit), &QAction::triggered, &i_rWindow, &QWidget::close);
     VRecordingLoader& rLoader = m_rFiles.Loader();

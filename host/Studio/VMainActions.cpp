@@ -18,7 +18,8 @@ namespace
 constexpr ActionRow rows[] = {
     {EAction::OpenFile, EMenu::File, "openFile", QT_TRANSLATE_NOOP("Actions", "&Open…"), "Ctrl+O"},
     {EAction::OpenSample, EMenu::File, "openSample", QT_TRANSLATE_NOOP("Actions", "Open the &sample"), "", false, true},
-    {EAction::StartSimulation, EMenu::File, "startSimulation", QT_TRANSLATE_NOOP("Actions", "Start a si&mulation"), ""},
+    {EAction::CloseFile, EMenu::File, "closeFile", QT_TRANSLATE_NOOP("Actions", "&Close the recording"),
+     "Ctrl+Shift+W"},
     {EAction::Resample, EMenu::File, "resample", QT_TRANSLATE_NOOP("Actions", "&Resample files with uneven times"), "",
      true, true},
     {EAction::Quit, EMenu::File, "quit", QT_TRANSLATE_NOOP("Actions", "&Quit"), "Ctrl+Q", false, true},
@@ -53,6 +54,8 @@ constexpr ActionRow rows[] = {
      "Shift+L"},
     {EAction::Live, EMenu::Playback, "live", QT_TRANSLATE_NOOP("Actions", "Li&ve"), "F6", true, true},
     {EAction::Review, EMenu::Playback, "review", QT_TRANSLATE_NOOP("Actions", "Revie&w"), "F7", true},
+
+    {EAction::StartSimulation, EMenu::Live, "startSimulation", QT_TRANSLATE_NOOP("Actions", "Start a si&mulation"), ""},
 
     {EAction::NewPlot, EMenu::Window, "newPlot", QT_TRANSLATE_NOOP("Actions", "&New Graph Plots window"),
      "Ctrl+T; Ctrl+N"},
@@ -90,6 +93,8 @@ QString MenuText(EMenu i_Menu)
         return VMainActions::tr("&Channels");
     case EMenu::Playback:
         return VMainActions::tr("&Playback");
+    case EMenu::Live:
+        return VMainActions::tr("&Live");
     case EMenu::Window:
         return VMainActions::tr("&Window");
     case EMenu::Help:

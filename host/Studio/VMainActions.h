@@ -19,8 +19,8 @@ enum class EAction
 {
     OpenFile,
     OpenSample,
+    CloseFile,
     Resample,
-    StartSimulation,
     Quit,
     FindChannel,
     TickShown,
@@ -43,6 +43,7 @@ enum class EAction
     ClearLoop,
     Live,
     Review,
+    StartSimulation,
     NewPlot,
     ClosePlot,
     NextPlot,
@@ -62,6 +63,7 @@ enum class EMenu
     File,
     Channels,
     Playback,
+    Live,
     Window,
     Help,
     Count

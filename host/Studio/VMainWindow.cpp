@@ -81,7 +81,6 @@ QSize UsualSize(const QWidget& i_rWindow)
 VMainWindow::VMainWindow(VStudioSession& i_rSession, VLogModel* i_pLog, QWidget* i_pParent)
     : QMainWindow(i_pParent), m_rSession(i_rSession), m_Subscriptions(i_rSession.Host().Ledger())
 {
-    setWindowTitle(tr("Graph Plots Studio"));
     setAcceptDrops(true);
     new VWidgetKeys(this);
     new VPlainLabels(this);
@@ -96,6 +95,7 @@ VMainWindow::VMainWindow(VStudioSession& i_rSession, VLogModel* i_pLog, QWidget*
     ConnectOther();
     resize(UsualSize(*this));
     ShowCentre();
+    ShowTitle();
 }
 
 VMainWindow::~VMainWindow() = default;
@@ -179,9 +179,8 @@ void VMainWindow::ShowWhichPanels()
 void VMainWindow::BuildMenus()
 {
     m_pActions->AddMenus(*menuBar());
-    auto* pLive = new QMenu(tr("&Live"), this);
-    menuBar()->insertMenu(m_pActions->Menu(EMenu::Window)->menuAction(), pLive);
-    new VLiveActions(m_rSession, *pLive, *this, [this](const std::string& i_rText) { ShowMessage(i_rText); });
+    new VLiveActions(m_rSession, *m_pActions->Menu(EMenu::Live), *this,
+                     [this](const std::string& i_rText) { ShowMessage(i_rText); });
     m_pFileActions = new VFileActions(m_rSession, *m_pActions, *m_pFiles, *m_pNotices, *this);
     m_pFileActions->AddRecentMenu(*m_pActions);
     connect(m_pFileActions, &VFileActions::ProblemsRequested, this, &VMainWindow::ShowLogOfProblems);
@@ -233,7 +232,13 @@ void VMainWindow::ConnectOther()
                 dialog.exec();
             });
     m_Subscriptions.Subscribe(
-        m_rSession.Host().TimeController()->CurrentSourceChanged(), [this] { ShowCentre(); }, m_rSession.Host().Ui());
+        m_rSession.Host().TimeController()->CurrentSourceChanged(),
+        [this]
+        {
+            ShowCentre();
+            ShowTitle();
+        },
+        m_rSession.Host().Ui());
 }
 
 bool VMainWindow::Restore(std::string& o_rError)
@@ -304,6 +309,16 @@ void VMainWindow::ShowCentre()
 {
     QWidget* pPage = m_pPlots->Count() > 0 ? static_cast<QWidget*>(m_pPlots) : m_pNoPlots;
     m_pCentre->setCurrentWidget(m_rSession.CurrentContextName().empty() ? m_pStartPage : pPage);
+}
+
+/// The file that is shown, or the context where there is none.
+void VMainWindow::ShowTitle()
+{
+    const std::string context = m_rSession.CurrentContextName();
+    const std::string file = TextFromPath(m_rSession.FileOf(context).filename());
+    QString name = QString::fromStdString(file.empty() ? context : file);
+    name.replace(QLatin1String("[*]"), QLatin1String("[*][*]")); // of the name, not the mark of what is unsaved
+    setWindowTitle(name.isEmpty() ? tr("Graph Plots Studio[*]") : tr("%1[*] – Graph Plots Studio").arg(name));
 }
 
 bool VMainWindow::OpenPlot(std::string& o_rError)

@@ -73,6 +73,7 @@ private:
     void ConnectOther();
     void ShowLogOfProblems();
     void ShowCentre();
+    void ShowTitle();
     void SaveLayout() const;
 
     VStudioSession& m_rSession;

@@ -65,6 +65,16 @@ void VOpenFiles::Reload(const QString& i_rContextName)
     Q_EMIT ChangeTaken(i_rContextName);
 }
 
+void VOpenFiles::Close(const QString& i_rContextName)
+{
+    const auto path = m_rSession.FileOf(i_rContextName.toStdString());
+    if (!m_rSession.CloseRecording(i_rContextName.toStdString()))
+        return;
+    Q_EMIT ChangeTaken(i_rContextName);
+    if (!IsBeingRead(path) && ContextsOf(path).empty())
+        m_Watch.Unwatch(path);
+}
+
 void VOpenFiles::End(int i_Number, const QString& i_rContextName)
 {
     const auto reading = m_Reading.find(i_Number);

@@ -37,10 +37,13 @@ public:
     /// Reads the file of a context again. Nothing happens for a context without a file.
     void Reload(const QString& i_rContextName);
 
+    /// Closes a recording, if that is what the context is. Its file is forgotten where no other context is of it.
+    void Close(const QString& i_rContextName);
+
 Q_SIGNALS:
     /// The file of a context was written again by somebody else since it was read.
     void ChangedOnDisk(const QString& i_rContextName, const QString& i_rFileName);
-    /// What ChangedOnDisk said holds no more: the file is being read again.
+    /// What ChangedOnDisk said holds no more: the file is being read again, or the recording was closed.
     void ChangeTaken(const QString& i_rContextName);
 
 private:

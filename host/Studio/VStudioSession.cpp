@@ -21,6 +21,7 @@
 
 #include <QtCore/QStandardPaths>
 
+#include <iterator>
 #include <system_error>
 
 namespace Studio
@@ -141,6 +142,24 @@ bool VStudioSession::ReplaceRecording(const std::string& i_rContextName, Recordi
     if (pTime)
         m_pHost->TimeController()->FindSource(i_rContextName)->SetCurrentTick(pTime->CurrentTick());
     return true;
+}
+
+bool VStudioSession::CloseRecording(const std::string& i_rContextName)
+{
+    if (!CanReplay(i_rContextName))
+        return false;
+    if (CurrentContextName() == i_rContextName)
+    {
+        const auto names = m_pHost->TimeController()->GetSourceMap()->GetNames();
+        auto next = names.upper_bound(i_rContextName);
+        if (next == names.end() && names.size() > 1)
+            next = std::prev(names.end(), 2);
+        ShowContext(next == names.end() ? std::string() : *next);
+    }
+    m_TimeFeeds.erase(i_rContextName);
+    m_Files.erase(i_rContextName);
+    m_pHost->TimeController()->RemoveSource(i_rContextName);
+    return m_pChannels->RemoveContext(i_rContextName).IsSuccess();
 }
 
 std::filesystem::path VStudioSession::FileOf(const std::string& i_rContextName) const

@@ -69,6 +69,10 @@ public:
     /// and ticks of those that are still there go on; the others are gone.
     bool ReplaceRecording(const std::string& i_rContextName, Recordings::VRecording i_Recording);
 
+    /// Closes a recording: its context, time source and file are forgotten; the one next to it in the order of the
+    /// names becomes the current one if it was. False when no recording bears the name.
+    bool CloseRecording(const std::string& i_rContextName);
+
     /// The file that a context was read from; empty when there is none.
     std::filesystem::path FileOf(const std::string& i_rContextName) const;
 

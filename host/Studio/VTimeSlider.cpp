@@ -25,11 +25,12 @@ void VTimeSlider::SetEvents(const std::vector<EventRow>& i_rEvents)
     update();
 }
 
-void VTimeSlider::SetLoop(const TQL::TickRange& i_rFrames)
+void VTimeSlider::SetLoop(const TQL::TickRange& i_rFrames, bool i_bLooping)
 {
-    if (m_Loop == i_rFrames)
+    if (m_Loop == i_rFrames && m_bLooping == i_bLooping)
         return;
     m_Loop = i_rFrames;
+    m_bLooping = i_bLooping;
     update();
 }
 
@@ -71,8 +72,9 @@ void VTimeSlider::paintEvent(QPaintEvent* i_pEvent)
     {
         const int first = PositionOf(m_Loop.First);
         const int last = PositionOf(m_Loop.Last - 1);
-        painter.fillRect(QRect(first, height() - thick, std::max(thick, last - first), thick),
-                         palette().color(QPalette::Highlight));
+        QColor colour = palette().color(QPalette::Highlight);
+        colour.setAlphaF(m_bLooping ? 1.0F : 0.4F);
+        painter.fillRect(QRect(first, height() - thick, std::max(thick, last - first), thick), colour);
     }
     QColor colour = palette().color(QPalette::WindowText);
     colour.setAlphaF(0.6F);

@@ -20,7 +20,8 @@ public:
     explicit VTimeSlider(QWidget* i_pParent = nullptr);
 
     void SetEvents(const std::vector<EventRow>& i_rEvents);
-    void SetLoop(const TQL::TickRange& i_rFrames); ///< last exclusive; empty for none
+    /// What a loop goes over, last exclusive, empty for none; faint while play does not loop.
+    void SetLoop(const TQL::TickRange& i_rFrames, bool i_bLooping);
 
 protected:
     void mousePressEvent(QMouseEvent* i_pEvent) override;
@@ -32,6 +33,7 @@ private:
 
     std::vector<std::int64_t> m_EventFrames;
     TQL::TickRange m_Loop;
+    bool m_bLooping = false;
 };
 
 } // namespace Studio

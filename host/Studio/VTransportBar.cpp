@@ -60,10 +60,17 @@ VTransportBar::VTransportBar(VStudioSession& i_rSession, VTransport& i_rTranspor
     , m_rActions(i_rActions)
     , m_Subscriptions(i_rSession.Host().Ledger())
 {
-    auto* pLayout = new QHBoxLayout(this);
+    // The slider has a row of its own, as wide as the window: beside the rest a narrow window left nothing of it.
+    auto* pRows = new QVBoxLayout(this);
+    pRows->setSpacing(0);
+    m_pSlider = new VTimeSlider(this);
+    pRows->addWidget(m_pSlider);
+    auto* pLayout = new QHBoxLayout;
+    pRows->addLayout(pLayout);
     BuildSource(*pLayout);
     AddButtons(*pLayout, {EAction::FirstFrame, EAction::PreviousEvent, EAction::PreviousFrame, EAction::Play,
                           EAction::NextFrame, EAction::NextEvent, EAction::LastFrame});
+    pLayout->addStretch(1);
     BuildPosition(*pLayout);
     BuildTime(*pLayout);
     ShowIcons();
@@ -88,8 +95,6 @@ void VTransportBar::BuildSource(QBoxLayout& o_rLayout)
 
 void VTransportBar::BuildPosition(QBoxLayout& o_rLayout)
 {
-    m_pSlider = new VTimeSlider(this);
-    o_rLayout.addWidget(m_pSlider, 1);
     m_pFrame = new QSpinBox(this);
     m_pFrame->setObjectName(QStringLiteral("frame"));
     m_pFrame->setAccessibleName(tr("Frame"));
@@ -223,6 +228,7 @@ void VTransportBar::RefreshActions(const TransportState& i_rState)
 {
     ShowRunning(i_rState.bRunning);
     m_rActions.Get(EAction::Play)->setEnabled(i_rState.bSource);
+    m_rActions.Get(EAction::CloseFile)->setEnabled(i_rState.bSource && !i_rState.bLiveData);
     const bool bReview = i_rState.bRange && !i_rState.bLive;
     for (const EAction action :
          {EAction::NextFrame, EAction::PreviousFrame, EAction::TenFramesOn, EAction::TenFramesBack, EAction::FirstFrame,
@@ -256,10 +262,10 @@ void VTransportBar::RefreshPosition(const TransportState& i_rState)
     m_pSlider->setRange(ToInt(i_rState.First), ToInt(i_rState.Last));
     m_pSlider->setPageStep(std::max(1, ToInt((i_rState.Last - i_rState.First) / 20)));
     const std::int64_t period = i_rState.FramePeriod;
-    m_pSlider->SetLoop(i_rState.bLooping && !i_rState.Marks.IsEmpty()
-                           ? TQL::TickRange{Recordings::FrameAt(i_rState.Marks.First, period),
-                                            Recordings::FrameAt(i_rState.Marks.Last, period)}
-                           : TQL::TickRange());
+    m_pSlider->SetLoop(i_rState.Marks.IsEmpty() ? TQL::TickRange()
+                                                : TQL::TickRange{Recordings::FrameAt(i_rState.Marks.First, period),
+                                                                 Recordings::FrameAt(i_rState.Marks.Last, period)},
+                       i_rState.bLooping);
     m_pFrame->setRange(ToInt(i_rState.First), ToInt(i_rState.Last));
     if (!m_pSlider->isSliderDown())
         m_pSlider->setValue(ToInt(i_rState.Frame));

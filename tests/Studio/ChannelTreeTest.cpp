@@ -28,7 +28,7 @@ std::vector<ChannelTreeLeaf> TwoWalkers()
             {{"A", "Markers"}, "T10", Marker(0, 1)},
             {{"A", "Segments"}, "Pelvis", {ESelectionKind::Segment, 0, 0, ""}},
             {{"B", "Markers"}, "C7", Marker(1, 0)},
-            {{"Analog outputs"}, "Fz1", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}}};
+            {{"Device outputs"}, "Fz1", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}}};
 }
 
 /// The whole tree in one line: [x] ticked, [~] partly, [ ] not; children in braces.
@@ -73,19 +73,19 @@ TEST(ChannelTree, TickingGoesDownAndShowsUpwards)
     } steps[] = {
         {{0, 0, 0},
          true,
-         "[~]A{[~]Markers{[x]C7 [ ]T10} [ ]Segments{[ ]Pelvis}} [ ]B{[ ]Markers{[ ]C7}} [ ]Analog outputs{[ ]Fz1}"},
+         "[~]A{[~]Markers{[x]C7 [ ]T10} [ ]Segments{[ ]Pelvis}} [ ]B{[ ]Markers{[ ]C7}} [ ]Device outputs{[ ]Fz1}"},
         {{0, 0, 1},
          true,
-         "[~]A{[x]Markers{[x]C7 [x]T10} [ ]Segments{[ ]Pelvis}} [ ]B{[ ]Markers{[ ]C7}} [ ]Analog outputs{[ ]Fz1}"},
+         "[~]A{[x]Markers{[x]C7 [x]T10} [ ]Segments{[ ]Pelvis}} [ ]B{[ ]Markers{[ ]C7}} [ ]Device outputs{[ ]Fz1}"},
         {{1},
          true,
-         "[~]A{[x]Markers{[x]C7 [x]T10} [ ]Segments{[ ]Pelvis}} [x]B{[x]Markers{[x]C7}} [ ]Analog outputs{[ ]Fz1}"},
+         "[~]A{[x]Markers{[x]C7 [x]T10} [ ]Segments{[ ]Pelvis}} [x]B{[x]Markers{[x]C7}} [ ]Device outputs{[ ]Fz1}"},
         {{0},
          true,
-         "[x]A{[x]Markers{[x]C7 [x]T10} [x]Segments{[x]Pelvis}} [x]B{[x]Markers{[x]C7}} [ ]Analog outputs{[ ]Fz1}"},
+         "[x]A{[x]Markers{[x]C7 [x]T10} [x]Segments{[x]Pelvis}} [x]B{[x]Markers{[x]C7}} [ ]Device outputs{[ ]Fz1}"},
         {{0, 0},
          false,
-         "[~]A{[ ]Markers{[ ]C7 [ ]T10} [x]Segments{[x]Pelvis}} [x]B{[x]Markers{[x]C7}} [ ]Analog outputs{[ ]Fz1}"},
+         "[~]A{[ ]Markers{[ ]C7 [ ]T10} [x]Segments{[x]Pelvis}} [x]B{[x]Markers{[x]C7}} [ ]Device outputs{[ ]Fz1}"},
     };
     int step = 0;
     for (const auto& rStep : steps)
@@ -135,20 +135,21 @@ TEST(ChannelLeaves, NamesMakeTheBranchesAndPatternsFindThem)
         {"Walker1:Pelvis", "SubjectSegmentPose", {ESelectionKind::Segment, 0, 0, ""}},
         {"RSHO", "Labelled Reconstructions", Marker(1, 0)},
         {"Fz1", "DeviceOutput", {ESelectionKind::AnalogueDeviceOutput, 0, 2, ""}},
-        {"Walker1", "", {ESelectionKind::Subject, 0, 0, ""}}};
-    channels.back().Components = {"Pelvis"};
+        {"Walker1", "", {ESelectionKind::Subject, 0, 0, ""}},
+        {"ax", "ModelOutput", {ESelectionKind::ModelOutput, 0, 0, "ax"}, {}, {}, "Column"}};
+    channels[4].Components = {"Pelvis"};
     std::string text;
     for (const ChannelTreeLeaf& rLeaf : Studio::MakeLeaves(channels))
         text += rLeaf.Branches.join("/").toStdString() + "=" + rLeaf.Text.toStdString() + "; ";
-    EXPECT_EQ(text, "Walker1/Markers=LFHD; Walker1/Segments=Pelvis; Markers=RSHO; Analog outputs=Fz1; "
-                    "Walker1=Subject (root segment Pelvis); ");
+    EXPECT_EQ(text, "Walker1/Markers=LFHD; Walker1/Segments=Pelvis; Markers=RSHO; Device outputs=Fz1; "
+                    "Walker1=Subject (root segment Pelvis); Columns=ax; ");
 
     static const struct
     {
         std::vector<std::string> Patterns;
         std::size_t Count;
         const char* pUnmatched;
-    } rows[] = {{{"Walker1:*"}, 2, ""},     {{"*"}, 5, ""}, {{"Fz?", "*"}, 5, ""}, {{"Walker1"}, 1, ""},
+    } rows[] = {{{"Walker1:*"}, 2, ""},     {{"*"}, 6, ""}, {{"Fz?", "*"}, 6, ""}, {{"Walker1"}, 1, ""},
                 {{"Fz1", "Fx1"}, 0, "Fx1"}, {{}, 0, ""}};
     for (const auto& rRow : rows)
     {

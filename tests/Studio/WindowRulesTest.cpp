@@ -24,7 +24,7 @@ constexpr std::int64_t P = TQL::DefaultFramePeriod;
 TEST(ChannelSearch, EveryWordSaysSomethingOfTheChannel)
 {
     const Studio::ChannelSearchText marker{"Walker1:LKNE", "Markers", {"mm"}, {"X", "Y", "Z"}};
-    const Studio::ChannelSearchText analog{"Force.Fz1", "Analog outputs", {"N"}, {}};
+    const Studio::ChannelSearchText analog{"Force.Fz1", "Device outputs", {"N"}, {}};
     static const struct
     {
         const char* pSearch;
@@ -44,7 +44,7 @@ TEST(ChannelSearch, EveryWordSaysSomethingOfTheChannel)
                 {"n", true, true},  // in the name; a unit
                 {"z knee", false, false},
                 {"z  kne", true, false},
-                {"fz1 n analog", false, true}};
+                {"fz1 n device", false, true}};
     for (const auto& rRow : rows)
     {
         const QStringList words = Studio::SearchWords(QString::fromUtf8(rRow.pSearch));

@@ -1,3 +1,4 @@
+#include "Channels/VChannelService.h"
 #include "Recordings/C3dWriter.h"
 #include "Services/VSelectionSource.h"
 #include "Services/VTimeController.h"
@@ -23,6 +24,7 @@
 #include <QtGui/QDragEnterEvent>
 #include <QtGui/QDropEvent>
 #include <QtGui/QHelpEvent>
+#include <QtGui/QImage>
 #include <QtQuickWidgets/QQuickWidget>
 #include <QtTest/QTest>
 #include <QtWidgets/QApplication>
@@ -33,6 +35,7 @@
 #include <QtWidgets/QMdiSubWindow>
 #include <QtWidgets/QMessageBox>
 #include <QtWidgets/QPushButton>
+#include <QtWidgets/QSlider>
 #include <QtWidgets/QSpinBox>
 #include <QtWidgets/QStyle>
 #include <QtWidgets/QStyleOptionViewItem>
@@ -193,7 +196,10 @@ TEST_F(StudioWindow, APersonsWalkByMouseAndKeyboard)
     EXPECT_EQ(Selected(), 0u);
     Press(Qt::Key_F, Qt::ControlModifier);
     ASSERT_TRUE(pSearch->hasFocus());
+    const int width = Find<QWidget>("channels")->width();
     QTest::keyClicks(pSearch, "hd mark");
+    QCoreApplication::processEvents();
+    EXPECT_EQ(Find<QWidget>("channels")->width(), width) << "a search does not push the plot aside";
     const QModelIndex markers = pTree->model()->index(0, 0, pTree->model()->index(0, 0));
     ASSERT_EQ(pTree->model()->rowCount(markers), 4) << "LFHD, RFHD, LBHD, RBHD";
     ClickTickBox(*pTree, pTree->model()->index(3, 0, markers));
@@ -236,6 +242,27 @@ TEST_F(StudioWindow, APersonsWalkByMouseAndKeyboard)
                       pEvents->visualRect(pEvents->model()->index(1, 1)).center());
     EXPECT_EQ(Frame(), events[1].Frame);
     EXPECT_TRUE(QTest::qWaitFor([&] { return Find<QSpinBox>("frame")->value() == events[1].Frame; }, patience));
+
+    // The marks of a loop stay in sight while play does not loop.
+    const auto marks = [this]
+    {
+        auto* pSlider = Find<QSlider>("position");
+        const QImage image = pSlider->grab().toImage();
+        const QRgb plain = image.pixel(image.width() - 1, image.height() - 1);
+        int marked = 0;
+        for (int x = 0; x < image.width(); ++x)
+            marked += image.pixel(x, image.height() - 1) != plain ? 1 : 0;
+        return marked;
+    };
+    EXPECT_EQ(marks(), 0);
+    QAction* pLoop = m_pWindow->Actions().Get(Studio::EAction::Loop);
+    m_pWindow->Actions().Get(Studio::EAction::LoopStart)->trigger();
+    EXPECT_TRUE(QTest::qWaitFor([&] { return pLoop->isChecked() && marks() > 0; }, patience));
+    pLoop->trigger();
+    ASSERT_FALSE(m_pSession->Host().TimeController()->IsLooping());
+    QTest::qWait(1);
+    EXPECT_GT(marks(), 0);
+    m_pWindow->Actions().Get(Studio::EAction::ClearLoop)->trigger();
 
     // A second window; the first is closed while it plays, and playing goes on.
     Press(Qt::Key_T, Qt::ControlModifier);
@@ -321,6 +348,47 @@ TEST_F(StudioWindow, WhatCannotBeReadAndWhatWasGuessedIsTold)
     const QAbstractItemModel* pLog = Find<QTreeView>("log")->model();
     ASSERT_GT(pLog->rowCount(), 0);
     EXPECT_TRUE(pLog->index(pLog->rowCount() - 1, 3).data().toString().startsWith("table.csv:"));
+}
+
+TEST_F(StudioWindow, ARecordingIsNamedInTheTitleAndCanBeClosed)
+{
+    const auto walk = WriteWalk();
+    std::filesystem::copy_file(walk, m_Folder / "a[*]b.c3d");
+    Start();
+    EXPECT_EQ(m_pWindow->windowTitle(), "Graph Plots Studio[*]");
+    const auto shows = [this](const char* i_pTitle)
+    {
+        return QTest::qWaitFor([&] { return m_pWindow->windowTitle() == QString::fromUtf8(i_pTitle); }, patience);
+    };
+    QAction* pClose = m_pWindow->Actions().Get(Studio::EAction::CloseFile);
+    m_pWindow->OpenFile(m_Folder / "a[*]b.c3d");
+    ASSERT_TRUE(shows("a[*][*]b.c3d[*] – Graph Plots Studio"));
+    m_pWindow->OpenFile(walk);
+    ASSERT_TRUE(shows("walk.c3d[*] – Graph Plots Studio"));
+    ASSERT_TRUE(QTest::qWaitFor([&] { return pClose->isEnabled() && AllPlotsHaveData(); }, patience));
+    pClose->trigger();
+    EXPECT_TRUE(shows("a[*][*]b.c3d[*] – Graph Plots Studio")) << "the one beside it";
+    EXPECT_TRUE(QTest::qWaitFor([&] { return AllPlotsHaveData(); }, patience));
+    EXPECT_EQ(m_pSession->Channels().GetContexts().size(), 1u);
+    pClose->trigger();
+    EXPECT_TRUE(shows("Graph Plots Studio[*]"));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return Find<QWidget>("startPage")->isVisible(); }, patience));
+    EXPECT_FALSE(pClose->isEnabled());
+    EXPECT_EQ(Find<QComboBox>("contexts")->currentText(), "");
+    m_pSession->StartLive(1);
+    m_pSession->ShowContext("Live");
+    EXPECT_TRUE(shows("Live[*] – Graph Plots Studio"));
+    EXPECT_FALSE(m_pSession->CloseRecording("Live"));
+    m_pSession->StopLive();
+}
+
+TEST_F(StudioWindow, TheSliderKeepsItsSizeInANarrowWindow)
+{
+    Start();
+    m_pWindow->resize(640, 500);
+    ASSERT_TRUE(QTest::qWaitFor([&] { return Find<QSlider>("position")->width() < 700; }, patience));
+    EXPECT_TRUE(Find<QSlider>("position")->isVisible());
+    EXPECT_GT(Find<QSlider>("position")->width(), 500);
 }
 
 TEST_F(StudioWindow, ASearchThatFindsNothingInTheNextRecordingIsCleared)
