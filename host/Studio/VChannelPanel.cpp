@@ -17,6 +17,8 @@
 #include <QtWidgets/QHBoxLayout>
 #include <QtWidgets/QLabel>
 #include <QtWidgets/QLineEdit>
+#include <QtWidgets/QMessageBox>
+#include <QtWidgets/QPushButton>
 #include <QtWidgets/QToolButton>
 #include <QtWidgets/QVBoxLayout>
 
@@ -218,8 +220,33 @@ void VChannelPanel::TakeSelection()
     RefreshCount();
 }
 
+/// Thousands of traces take memory and time for each. Who has agreed is asked again at twice as many.
+bool VChannelPanel::MayPlot(std::size_t i_Count)
+{
+    if (i_Count <= MostUnasked)
+        m_PlottedUnasked = MostUnasked;
+    if (i_Count <= m_PlottedUnasked)
+        return true;
+    QMessageBox box(QMessageBox::Question, tr("Plot many channels"), tr("Plot %1 channels?").arg(i_Count),
+                    QMessageBox::Cancel, this);
+    box.setObjectName(QStringLiteral("plotMany"));
+    box.setInformativeText(tr("Each gets a trace of its own. So many need much memory, and the window becomes slow."));
+    const QAbstractButton* pPlot = box.addButton(tr("&Plot all"), QMessageBox::AcceptRole);
+    box.setDefaultButton(QMessageBox::Cancel);
+    box.exec();
+    if (box.clickedButton() != pPlot)
+        return false;
+    m_PlottedUnasked = i_Count * 2;
+    return true;
+}
+
 void VChannelPanel::SetSelection()
 {
+    if (!MayPlot(m_pModel->Ticked().size()))
+    {
+        m_pModel->SetTicked(m_rSession.Host().Selection()->Items());
+        return RefreshCount();
+    }
     m_Selection.Remember(m_pModel->Ticked());
     m_rSession.Host().Selection()->Set(m_pModel->Ticked());
     RefreshCount();

@@ -6,6 +6,7 @@
 
 #include <QtWidgets/QWidget>
 
+#include <cstddef>
 #include <memory>
 #include <string>
 #include <vector>
@@ -29,6 +30,8 @@ class VChannelPanel : public QWidget
     Q_OBJECT
 
 public:
+    static constexpr std::size_t MostUnasked = 1000; ///< channels; the operator is asked whether to plot more
+
     VChannelPanel(VStudioSession& i_rSession, VMainActions& i_rActions, QWidget* i_pParent = nullptr);
     ~VChannelPanel() override;
 
@@ -52,6 +55,7 @@ private:
     void ShowCurrentContext();
     void TakeSelection();
     void SetSelection();
+    bool MayPlot(std::size_t i_Count);
     void RefreshCount();
 
     VStudioSession& m_rSession;
@@ -62,6 +66,7 @@ private:
     QLabel* m_pCount = nullptr;
     std::vector<ChannelTreeLeaf> m_Leaves;           ///< in the tree
     std::vector<std::shared_ptr<const void>> m_From; ///< what they were made from: contexts and lists of channels
+    std::size_t m_PlottedUnasked = MostUnasked;      ///< so many channels are plotted without a question
     std::string m_ShownContext;                      ///< of the last channels in the tree
     VContextSelection m_Selection;
     Services::VHostSubscriptions m_Subscriptions;

@@ -10,7 +10,9 @@
 #include "Studio/ChannelLeaves.h"
 #include "Studio/ContextNames.h"
 #include "Studio/PlotContent.h"
+#include "Studio/VChannelPanel.h"
 #include "Studio/VContextSelection.h"
+#include "Studio/VMainActions.h"
 #include "Studio/VMainWindow.h"
 #include "Studio/VStudioSession.h"
 #include "support/LogGuard.h"
@@ -20,10 +22,15 @@
 #include <QtCore/QCoreApplication>
 #include <QtCore/QFile>
 #include <QtCore/QTemporaryDir>
+#include <QtCore/QTimer>
+#include <QtGui/QAction>
 #include <QtGui/QImage>
 #include <QtTest/QTest>
+#include <QtWidgets/QAbstractButton>
+#include <QtWidgets/QApplication>
 #include <QtWidgets/QComboBox>
 #include <QtWidgets/QLabel>
+#include <QtWidgets/QMessageBox>
 #include <QtWidgets/QSlider>
 #include <QtWidgets/QSpinBox>
 #include <QtWidgets/QTreeView>
@@ -257,6 +264,53 @@ TEST_F(StudioSession, TheWindowFollowsContextTimeAndSelection)
         window.findChild<QLabel*>(QStringLiteral("noticeText"))->text().contains(QStringLiteral("missing.c3d")));
     EXPECT_FALSE(m_Log.Take().empty()) << "and it stands in the log";
     EXPECT_EQ(m_Session.CurrentContextName(), "walk");
+}
+
+TEST_F(StudioSession, ManyChannelsArePlottedOnlyWhenTheOperatorAgrees)
+{
+    constexpr std::size_t many = Studio::VChannelPanel::MostUnasked + 1;
+    Recordings::VRecording recording;
+    recording.Name = "wide";
+    recording.Range = {0, TQL::DefaultFramePeriod};
+    for (std::size_t i = 0; i < many; ++i)
+    {
+        Recordings::RecordedChannel& rChannel = recording.Channels.emplace_back();
+        rChannel.Name = "c" + std::to_string(i);
+        rChannel.ComponentNames = {""};
+        rChannel.Samples = {1.0f};
+    }
+    m_Session.ShowContext(m_Session.AddRecording(recording));
+    Studio::VMainActions actions;
+    const Studio::VChannelPanel panel(m_Session, actions);
+    const auto tickAll = [&](const char* i_pButton)
+    {
+        bool bAsked = false;
+        QTimer::singleShot(0, qApp,
+                           [&]
+                           {
+                               auto* pBox = qobject_cast<QMessageBox*>(QApplication::activeModalWidget());
+                               bAsked = pBox != nullptr;
+                               for (auto* pButton : bAsked ? pBox->buttons() : QList<QAbstractButton*>())
+                                   if (pButton->text().remove('&') == QString::fromLatin1(i_pButton))
+                                       pButton->click();
+                           });
+        actions.Get(Studio::EAction::TickShown)->trigger();
+        QCoreApplication::processEvents();
+        return bAsked;
+    };
+    const auto selected = [this]
+    {
+        return m_Session.Host().Selection()->Items().size();
+    };
+    EXPECT_TRUE(tickAll("Cancel"));
+    EXPECT_EQ(selected(), 1u) << "as before";
+    EXPECT_EQ(panel.findChild<QLabel*>(QStringLiteral("tickedCount"))->text(), "1 of 1001 ticked");
+    EXPECT_TRUE(tickAll("Plot all"));
+    EXPECT_EQ(selected(), many);
+    m_Session.Host().Selection()->Set({m_Session.Host().Selection()->Items().front()});
+    ASSERT_TRUE(QTest::qWaitFor(
+        [&] { return panel.findChild<QLabel*>(QStringLiteral("tickedCount"))->text() == "1 of 1001 ticked"; }));
+    EXPECT_FALSE(tickAll("Plot all")) << "agreed already";
 }
 
 TEST(PlotContent, APictureIsWrittenWholeOrNotAtAll)
