@@ -66,7 +66,8 @@ const ChannelType* FindChannelType(std::string_view i_Name)
 
 const ChannelType& ChannelTypeOf(Recordings::EChannelKind i_Kind)
 {
-    const EChannelKind kind = i_Kind == EChannelKind::JointAngles ? EChannelKind::Column : i_Kind;
+    const bool bModel = i_Kind == EChannelKind::JointAngles || i_Kind == EChannelKind::ModelOutput;
+    const EChannelKind kind = bModel ? EChannelKind::Column : i_Kind;
     const auto type = std::ranges::find(Types, kind, &ChannelType::RecordedKind);
     return type == Types.end() ? Types.front() : *type; // every kind has one
 }

@@ -23,8 +23,13 @@ inline constexpr std::string_view SegmentPoseType = "SubjectSegmentPose";
 inline constexpr std::string_view DeviceOutputType = "DeviceOutput";
 inline constexpr std::string_view CameraPoseType = "CalibratedCameraPose";
 inline constexpr std::string_view SampleCountType = "SampleCount";
-inline constexpr std::string_view ModelOutputType = "ModelSetSamplesOutput"; ///< joint angles and columns of tables
+inline constexpr std::string_view ModelOutputType = "ModelSetSamplesOutput"; ///< model outputs, joint angles, columns
 inline constexpr std::string_view MonitorType = "Monitor";                   ///< from 0 to 1, and so plotted
+
+/// What stands in place of the display name of that type for two of the things that are of it; model outputs of other
+/// kinds are named by their quantity: "Angle", "Force".
+inline constexpr std::string_view JointAnglesText = "Joint Angles";
+inline constexpr std::string_view ColumnText = "Column";
 
 /// The context that the ids of global channels bear: what belongs to no single capture or recording. It is none that
 /// can be shown.

@@ -33,10 +33,13 @@ ChannelDefinition VChannelNumbering::Define(const Recordings::RecordedChannel& i
         definition.Second = NumberOf({i_rChannel.Kind, 0}, i_rChannel.Name);
         break;
     case EChannelKind::JointAngles:
+    case EChannelKind::ModelOutput:
     case EChannelKind::Column:
         definition.First = NumberOf({EChannelKind::Column, 0}, i_rChannel.Name);
         definition.Text = i_rChannel.Name;
-        definition.TypeText = i_rChannel.Kind == EChannelKind::Column ? "Column" : "Joint Angles";
+        definition.TypeText = i_rChannel.Kind == EChannelKind::Column        ? ColumnText
+                              : i_rChannel.Kind == EChannelKind::JointAngles ? JointAnglesText
+                                                                             : std::string_view(i_rChannel.Quantity);
         break;
     }
     return definition;

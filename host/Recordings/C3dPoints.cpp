@@ -1,3 +1,4 @@
+#include "Recordings/C3dQuantities.h"
 #include "Recordings/C3dSamples.h"
 
 #include "Recordings/C3dText.h"
@@ -5,6 +6,7 @@
 #include <algorithm>
 #include <cstddef>
 #include <limits>
+#include <map>
 #include <string>
 #include <utility>
 #include <vector>
@@ -38,6 +40,27 @@ void ConvertPoint(const float* i_pWords, double i_Scale, float* o_pSample)
         o_pSample[i] = static_cast<float>(static_cast<double>(i_pWords[i]) * i_Scale);
 }
 
+/// The quantity of each label that stands in a list of model outputs.
+std::map<std::string, const C3dQuantity*> FindOutputs(const C3dSource& i_rSource)
+{
+    std::map<std::string, const C3dQuantity*> outputs;
+    for (const C3dQuantity& rQuantity : C3dQuantities)
+        for (std::string& rLabel : i_rSource.Parameters.Texts("POINT", rQuantity.List, i_rSource.Layout.Points))
+            if (!rLabel.empty())
+                outputs.emplace(std::move(rLabel), &rQuantity);
+    return outputs;
+}
+
+/// Makes a model output of a marker.
+void SetQuantity(const C3dSource& i_rSource, const C3dQuantity& i_rQuantity, RecordedChannel& io_rChannel)
+{
+    io_rChannel.Kind = EChannelKind::ModelOutput;
+    io_rChannel.Quantity = i_rQuantity.Name;
+    io_rChannel.Units = i_rSource.Parameters.Text("POINT", i_rQuantity.UnitName);
+    if (io_rChannel.Units.empty())
+        io_rChannel.Units = i_rQuantity.Unit;
+}
+
 RecordedChannel MakeMarker(std::string i_Label, const C3dLayout& i_rLayout, const VRecording& i_rRecording)
 {
     RecordedChannel channel;
@@ -58,11 +81,16 @@ void AddC3dPoints(const C3dSource& i_rSource, VRecording& io_rRecording)
 {
     const C3dLayout& rLayout = i_rSource.Layout;
     const std::string units = i_rSource.Parameters.Text("POINT", "UNITS");
-    for (std::string& rLabel :
-         UniqueLabels(i_rSource.Parameters.Texts("POINT", "LABELS", rLayout.Points), rLayout.Points, "Point"))
+    const std::vector<std::string> labels = i_rSource.Parameters.Texts("POINT", "LABELS", rLayout.Points);
+    const std::map<std::string, const C3dQuantity*> outputs = FindOutputs(i_rSource);
+    std::vector<std::string> names = UniqueLabels(labels, rLayout.Points, "Point");
+    for (std::size_t i = 0; i < names.size(); ++i)
     {
-        io_rRecording.Channels.push_back(MakeMarker(std::move(rLabel), rLayout, io_rRecording));
-        io_rRecording.Channels.back().Units = units;
+        RecordedChannel& rChannel =
+            io_rRecording.Channels.emplace_back(MakeMarker(std::move(names[i]), rLayout, io_rRecording));
+        rChannel.Units = units;
+        if (const auto output = i < labels.size() ? outputs.find(labels[i]) : outputs.end(); output != outputs.end())
+            SetQuantity(i_rSource, *output->second, rChannel);
     }
 }
 

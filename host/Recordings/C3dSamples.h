@@ -41,7 +41,7 @@ struct C3dAnalogRules
     std::vector<C3dCalibration> Calibrations; ///< of each channel
 };
 
-/// Adds a Marker channel for each point: its units, its label, room for its samples.
+/// Adds a Marker channel, or a ModelOutput channel, for each point: its units, its label, room for its samples.
 void AddC3dPoints(const C3dSource& i_rSource, VRecording& io_rRecording);
 
 /// Adds an Analog channel for each analog channel, with room for its samples.

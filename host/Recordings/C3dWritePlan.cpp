@@ -17,8 +17,9 @@ void SortChannels(const VRecording& i_rRecording, C3dWritePlan& o_rPlan)
 {
     for (const RecordedChannel& rChannel : i_rRecording.Channels)
     {
-        if (rChannel.Kind == EChannelKind::Marker && rChannel.ComponentCount() == 3)
-            o_rPlan.Markers.push_back(&rChannel);
+        const bool bPoint = rChannel.Kind == EChannelKind::Marker || rChannel.Kind == EChannelKind::ModelOutput;
+        if (bPoint && rChannel.ComponentCount() == 3)
+            o_rPlan.Points.push_back(&rChannel);
         else if (rChannel.Kind == EChannelKind::Analog && rChannel.ComponentCount() == 1)
             o_rPlan.Analog.push_back(&rChannel);
         else
@@ -37,14 +38,14 @@ void FindShape(const VRecording& i_rRecording, C3dWritePlan& o_rPlan)
         o_rPlan.Frames = rAnalog.RowCount() / perFrame;
         o_rPlan.Rate = rAnalog.Rate / static_cast<double>(perFrame);
     }
-    if (!o_rPlan.Markers.empty())
+    if (!o_rPlan.Points.empty())
     {
-        o_rPlan.Frames = o_rPlan.Markers.front()->RowCount();
-        o_rPlan.Rate = o_rPlan.Markers.front()->Rate;
+        o_rPlan.Frames = o_rPlan.Points.front()->RowCount();
+        o_rPlan.Rate = o_rPlan.Points.front()->Rate;
     }
     if (!(o_rPlan.Rate > 0.0))
         o_rPlan.Rate = static_cast<double>(TQL::DefaultTickRate) / static_cast<double>(i_rRecording.FramePeriod);
-    const RecordedChannel* pFirst = !o_rPlan.Markers.empty() ? o_rPlan.Markers.front() : o_rPlan.Analog.front();
+    const RecordedChannel* pFirst = !o_rPlan.Points.empty() ? o_rPlan.Points.front() : o_rPlan.Analog.front();
     o_rPlan.FirstFrame = static_cast<std::uint64_t>(pFirst->FirstTick / i_rRecording.FramePeriod + 1);
 }
 
@@ -73,27 +74,36 @@ C3dWritePlan PlanC3d(const VRecording& i_rRecording)
 {
     C3dWritePlan plan;
     SortChannels(i_rRecording, plan);
-    if (i_rRecording.FramePeriod > 0 && (!plan.Markers.empty() || !plan.Analog.empty()))
+    if (i_rRecording.FramePeriod > 0 && (!plan.Points.empty() || !plan.Analog.empty()))
         FindShape(i_rRecording, plan);
     return plan;
+}
+
+const RecordedChannel* C3dWritePlan::FirstOf(std::string_view i_Quantity) const
+{
+    const auto first =
+        std::find_if(Points.begin(), Points.end(),
+                     [&](const RecordedChannel* i_pChannel) { return i_pChannel->Quantity == i_Quantity; });
+    return first == Points.end() ? nullptr : *first;
 }
 
 const char* FindC3dObstacle(const VRecording& i_rRecording, const C3dWritePlan& i_rPlan)
 {
     if (i_rPlan.Frames == 0)
         return "there are no frames to write. Choose a recording with samples.";
-    if (i_rPlan.LastFrame() > std::numeric_limits<std::uint32_t>::max() || i_rPlan.Markers.size() > LargestC3dWord ||
+    if (i_rPlan.LastFrame() > std::numeric_limits<std::uint32_t>::max() || i_rPlan.Points.size() > LargestC3dWord ||
         i_rPlan.Analog.size() * i_rPlan.AnalogSamplesPerFrame > LargestC3dWord)
         return "a C3D file cannot hold so many frames or channels. Choose fewer.";
     const std::int64_t firstTick = (static_cast<std::int64_t>(i_rPlan.FirstFrame) - 1) * i_rRecording.FramePeriod;
-    const auto isMarkerWrong = [&](const RecordedChannel* i_pChannel)
+    const auto isPointWrong = [&](const RecordedChannel* i_pChannel)
     {
         return !IsOnGrid(*i_pChannel, firstTick, i_rPlan.Frames) ||
                i_pChannel->SamplePeriod != i_rRecording.FramePeriod ||
-               i_pChannel->Units != i_rPlan.Markers.front()->Units;
+               i_pChannel->Units != i_rPlan.FirstOf(i_pChannel->Quantity)->Units;
     };
-    if (std::any_of(i_rPlan.Markers.begin(), i_rPlan.Markers.end(), isMarkerWrong))
-        return "the markers differ in units, rate or length, which a C3D file cannot hold.";
+    if (std::any_of(i_rPlan.Points.begin(), i_rPlan.Points.end(), isPointWrong))
+        return "the markers, or the outputs of one kind, differ in units, rate or length, which a C3D file cannot "
+               "hold.";
     const auto isAnalogWrong = [&](const RecordedChannel* i_pChannel)
     {
         return !IsOnGrid(*i_pChannel, firstTick, i_rPlan.Frames * i_rPlan.AnalogSamplesPerFrame) ||

@@ -4,6 +4,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <string_view>
 #include <vector>
 
 namespace Recordings
@@ -15,7 +16,7 @@ inline constexpr std::size_t LargestC3dWord = 0xFFFF;
 /// it.
 struct C3dWritePlan
 {
-    std::vector<const RecordedChannel*> Markers;
+    std::vector<const RecordedChannel*> Points; ///< markers and model outputs, in the order of the recording
     std::vector<const RecordedChannel*> Analog;
     std::size_t LeftOut = 0; ///< channels that the format has no place for
     std::size_t Frames = 0;
@@ -23,6 +24,8 @@ struct C3dWritePlan
     std::uint64_t FirstFrame = 1; ///< its number, from 1
     double Rate = 0.0;            ///< frames a second
 
+    /// The first point of a quantity, the empty one being that of the markers; null when there is none.
+    const RecordedChannel* FirstOf(std::string_view i_Quantity) const;
     std::uint64_t LastFrame() const { return FirstFrame + Frames - 1; }
     bool IsLong() const { return LastFrame() > LargestC3dWord; } ///< more than the header can say
 };

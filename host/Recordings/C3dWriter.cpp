@@ -2,6 +2,7 @@
 
 #include "Recordings/C3dHeader.h"
 #include "Recordings/C3dParameterWriter.h"
+#include "Recordings/C3dQuantities.h"
 #include "Recordings/C3dWritePlan.h"
 #include "Recordings/FileMessage.h"
 #include "Recordings/VFileReplacement.h"
@@ -48,20 +49,37 @@ std::uint16_t CutToWord(std::uint64_t i_Value)
     return static_cast<std::uint16_t>(std::min<std::uint64_t>(i_Value, LargestC3dWord));
 }
 
+// The list of the points that are of a quantity, and their unit.
+void AddOutputs(const C3dWritePlan& i_rPlan, const C3dQuantity& i_rQuantity, VC3dParameterWriter& o_rWriter)
+{
+    const RecordedChannel* pFirst = i_rPlan.FirstOf(i_rQuantity.Name);
+    if (pFirst == nullptr)
+        return;
+    std::vector<std::string> labels;
+    for (const RecordedChannel* pPoint : i_rPlan.Points)
+        if (pPoint->Quantity == i_rQuantity.Name)
+            labels.push_back(pPoint->Name);
+    o_rWriter.AddTexts(i_rQuantity.List, labels);
+    o_rWriter.AddText(i_rQuantity.UnitName, pFirst->Units);
+}
+
 void AddPointGroup(const C3dWritePlan& i_rPlan, std::uint16_t i_DataBlock, VC3dParameterWriter& o_rWriter)
 {
     o_rWriter.BeginGroup("POINT");
-    o_rWriter.AddInteger("USED", CutToWord(i_rPlan.Markers.size()));
+    o_rWriter.AddInteger("USED", CutToWord(i_rPlan.Points.size()));
     o_rWriter.AddReal("SCALE", -1.0f);
     o_rWriter.AddReal("RATE", static_cast<float>(i_rPlan.Rate));
     o_rWriter.AddInteger("DATA_START", i_DataBlock);
     o_rWriter.AddInteger("FRAMES", CutToWord(i_rPlan.Frames));
     if (i_rPlan.IsLong())
         o_rWriter.AddReal("LONG_FRAMES", static_cast<float>(i_rPlan.Frames));
-    if (i_rPlan.Markers.empty())
+    if (i_rPlan.Points.empty())
         return;
-    o_rWriter.AddText("UNITS", i_rPlan.Markers.front()->Units);
-    o_rWriter.AddTexts("LABELS", Collect(i_rPlan.Markers, NameOf));
+    if (const RecordedChannel* pMarker = i_rPlan.FirstOf(""))
+        o_rWriter.AddText("UNITS", pMarker->Units);
+    o_rWriter.AddTexts("LABELS", Collect(i_rPlan.Points, NameOf));
+    for (const C3dQuantity& rQuantity : C3dQuantities)
+        AddOutputs(i_rPlan, rQuantity, o_rWriter);
 }
 
 void AddAnalogGroup(const C3dWritePlan& i_rPlan, VC3dParameterWriter& o_rWriter)
@@ -129,7 +147,7 @@ std::optional<std::vector<std::byte>> MakeParameters(const VRecording& i_rRecord
 std::vector<std::byte> MakeHeader(const C3dWritePlan& i_rPlan, std::uint16_t i_DataBlock)
 {
     std::vector<std::byte> header{static_cast<std::byte>(FirstParameterBlock), std::byte{0x50}};
-    AppendC3dWord(CutToWord(i_rPlan.Markers.size()), header);
+    AppendC3dWord(CutToWord(i_rPlan.Points.size()), header);
     AppendC3dWord(CutToWord(i_rPlan.Analog.size() * i_rPlan.AnalogSamplesPerFrame), header);
     AppendC3dWord(CutToWord(i_rPlan.FirstFrame), header);
     AppendC3dWord(CutToWord(i_rPlan.LastFrame()), header);
@@ -154,8 +172,8 @@ void AppendPoint(std::span<const float> i_Position, std::vector<std::byte>& o_rB
 
 void AppendFrame(const C3dWritePlan& i_rPlan, std::size_t i_Frame, std::vector<std::byte>& o_rBytes)
 {
-    for (const RecordedChannel* pMarker : i_rPlan.Markers)
-        AppendPoint(std::span(pMarker->Samples).subspan(i_Frame * 3, 3), o_rBytes);
+    for (const RecordedChannel* pPoint : i_rPlan.Points)
+        AppendPoint(std::span(pPoint->Samples).subspan(i_Frame * 3, 3), o_rBytes);
     for (std::size_t sample = 0; sample < i_rPlan.AnalogSamplesPerFrame; ++sample)
         for (const RecordedChannel* pAnalog : i_rPlan.Analog)
             AppendC3dReal(pAnalog->Samples[i_Frame * i_rPlan.AnalogSamplesPerFrame + sample], o_rBytes);
@@ -207,8 +225,9 @@ TQL::IResult WriteC3d(const VRecording& i_rRecording, const std::filesystem::pat
     const TQL::IResult result = WriteFile(i_rRecording, plan, i_rPath, o_rError);
     if (result.IsError() || plan.LeftOut == 0)
         return result;
-    o_rError = FileMessage(i_rPath, std::to_string(plan.LeftOut) +
-                                        " channels are left out: a C3D file holds only markers and analog channels.");
+    o_rError = FileMessage(
+        i_rPath, std::to_string(plan.LeftOut) +
+                     " channels are left out: a C3D file holds only markers, model outputs and analog channels.");
     return TQL::Result::OkButPartial;
 }
 

@@ -136,9 +136,9 @@ constexpr std::array<std::string_view, 10> FirstFrameWords{"#",   "sample", "sam
                                                            "row", "nr",     "no",      "no.",   "item"};
 
 // Names of what has three components and is no position.
-constexpr std::array<std::string_view, 20> OtherQuantities{
-    "acc",    "gyr", "mag", "force", "moment", "torque", "vel",     "angle", "rot", "euler",
-    "orient", "ang", "grf", "emg",   "quat",   "field",  "gravity", "omega", "imu", "angular"};
+constexpr std::array<std::string_view, 23> OtherQuantities{
+    "acc", "gyr", "mag",  "force", "moment",  "torque", "vel", "angle",   "rot",   "euler",    "orient", "ang",
+    "grf", "emg", "quat", "field", "gravity", "omega",  "imu", "angular", "power", "reaction", "scalar"};
 
 template <typename TList>
 bool Contains(const TList& i_rList, std::string_view i_Text)

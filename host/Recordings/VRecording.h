@@ -16,6 +16,7 @@ enum class EChannelKind
     SegmentPose, ///< angle-axis rotation and position of a segment; components RX, RY, RZ, TX, TY, TZ; radians
     Analog,      ///< one output of an analog device; one component
     JointAngles, ///< angles of a joint
+    ModelOutput, ///< what a model computed, and no position; components X, Y, Z
     Column       ///< one column of a table
 };
 
@@ -32,6 +33,7 @@ struct RecordedChannel
     std::int64_t FirstTick = 0; ///< of the first row; row i stands at FirstTick + i x SamplePeriod
     std::vector<float> Samples;
     std::string RotationOrder = {}; ///< of joint angles: the axes in the order of the components, "ZXY"; empty: unknown
+    std::string Quantity = {};      ///< of a model output: "Angle", "Force", "Moment", "Power", "Scalar", "Reaction"
 
     std::size_t ComponentCount() const { return ComponentNames.size(); }
     std::size_t RowCount() const { return ComponentNames.empty() ? 0 : Samples.size() / ComponentNames.size(); }

@@ -33,6 +33,14 @@ EChannelKind KindOf(const std::string& i_rTypeName)
     return pType ? pType->RecordedKind.value_or(EChannelKind::Column) : EChannelKind::Column;
 }
 
+/// Whether it is one of three components that a recording holds as such; other columns stand one beside another.
+bool IsModelOutput(const Channels::ChannelDefinition& i_rDefinition)
+{
+    return i_rDefinition.TypeName == Channels::ModelOutputType &&
+           Channels::ComponentNamesOf(i_rDefinition).size() == 3 && !i_rDefinition.TypeText.empty() &&
+           i_rDefinition.TypeText != Channels::ColumnText && i_rDefinition.TypeText != Channels::JointAnglesText;
+}
+
 /// Reads what the store has of the channel's range. The channel's rows are missing before.
 void ReadRows(const Channels::VSampleStore& i_rSamples, const TQL::TickRange& i_rRange, RecordedChannel& io_rChannel)
 {
@@ -70,6 +78,11 @@ RecordedChannel CopyChannel(const Channels::VSourceChannel& i_rChannel, const TQ
     const Channels::ChannelDefinition& rDefinition = i_rChannel.GetDefinition();
     RecordedChannel channel;
     channel.Kind = rDefinition.RotationOrder.empty() ? KindOf(rDefinition.TypeName) : EChannelKind::JointAngles;
+    if (IsModelOutput(rDefinition))
+    {
+        channel.Kind = EChannelKind::ModelOutput;
+        channel.Quantity = rDefinition.TypeText;
+    }
     channel.Name = rDefinition.Name;
     const std::size_t colon = channel.Name.find(':');
     if (colon != std::string::npos && channel.Kind != EChannelKind::Column)
@@ -164,7 +177,8 @@ struct Changes
         Streaming::Say(Poses, "segment pose was left out: a C3D file has no place for it",
                        "segment poses were left out: a C3D file has no place for them", o_rRemarks);
         Streaming::Say(OtherUnits, "marker was left out: all have to have the unit of the first",
-                       "markers were left out: all have to have the unit of the first", o_rRemarks);
+                       "markers or model outputs were left out: all of a kind have to have the unit of the first",
+                       o_rRemarks);
         Streaming::Say(MisfitRates, "channel was left out: its rate does not fit the others",
                        "channels were left out: their rates do not fit the others", o_rRemarks);
     }
@@ -176,9 +190,11 @@ void FitChannel(RecordedChannel&& i_rChannel, std::int64_t i_FramePeriod, std::i
 {
     if (i_rChannel.Kind == EChannelKind::SegmentPose)
         ++o_rChanges.Poses;
-    else if (i_rChannel.Kind == EChannelKind::Marker)
+    else if (i_rChannel.Kind == EChannelKind::Marker || i_rChannel.Kind == EChannelKind::ModelOutput)
     {
-        const auto first = std::ranges::find(o_rChannels, EChannelKind::Marker, &RecordedChannel::Kind);
+        const auto first = std::ranges::find_if(
+            o_rChannels, [&](const RecordedChannel& i_rBefore)
+            { return i_rBefore.Kind == i_rChannel.Kind && i_rBefore.Quantity == i_rChannel.Quantity; });
         if (first != o_rChannels.end() && first->Units != i_rChannel.Units)
             ++o_rChanges.OtherUnits;
         else if (i_rChannel.SamplePeriod != i_FramePeriod)

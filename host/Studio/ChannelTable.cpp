@@ -20,9 +20,9 @@ using Recordings::RecordedChannel;
 constexpr std::size_t columns = 7;
 using Row = std::array<QString, columns>;
 
-const char* TypeName(Recordings::EChannelKind i_Kind)
+std::string TypeName(const RecordedChannel& i_rChannel)
 {
-    switch (i_Kind)
+    switch (i_rChannel.Kind)
     {
     case Recordings::EChannelKind::Marker:
         return "Marker";
@@ -32,6 +32,8 @@ const char* TypeName(Recordings::EChannelKind i_Kind)
         return "Analog";
     case Recordings::EChannelKind::JointAngles:
         return "JointAngles";
+    case Recordings::EChannelKind::ModelOutput:
+        return i_rChannel.Quantity;
     case Recordings::EChannelKind::Column:
         break;
     }
@@ -53,7 +55,7 @@ Row MakeRow(const RecordedChannel& i_rChannel)
     for (const std::string& rName : i_rChannel.ComponentNames)
         components += (components.empty() ? "" : " ") + rName;
     return {OneLine(i_rChannel.Name),
-            QString::fromLatin1(TypeName(i_rChannel.Kind)),
+            QString::fromStdString(TypeName(i_rChannel)),
             OneLine(components),
             OneLine(i_rChannel.Units),
             QString::number(i_rChannel.Rate, 'g', 10),
@@ -98,7 +100,7 @@ std::string FormatChannelJson(const Recordings::VRecording& i_rRecording)
         for (const std::string& rName : rChannel.ComponentNames)
             components.append(QString::fromStdString(rName));
         channels.append(QJsonObject{{QStringLiteral("name"), QString::fromStdString(rChannel.Name)},
-                                    {QStringLiteral("type"), QString::fromLatin1(TypeName(rChannel.Kind))},
+                                    {QStringLiteral("type"), QString::fromStdString(TypeName(rChannel))},
                                     {QStringLiteral("components"), components},
                                     {QStringLiteral("units"), QString::fromStdString(rChannel.Units)},
                                     {QStringLiteral("rate"), rChannel.Rate},

@@ -18,9 +18,9 @@ using Recordings::RecordedChannel;
 namespace
 {
 
-const char* NameOf(EChannelKind i_Kind)
+std::string NameOf(const RecordedChannel& i_rChannel)
 {
-    switch (i_Kind)
+    switch (i_rChannel.Kind)
     {
     case EChannelKind::Marker:
         return "marker ";
@@ -30,6 +30,8 @@ const char* NameOf(EChannelKind i_Kind)
         return "analog ";
     case EChannelKind::JointAngles:
         return "joint ";
+    case EChannelKind::ModelOutput:
+        return "output " + i_rChannel.Quantity + " ";
     case EChannelKind::Column:
         break;
     }
@@ -58,7 +60,7 @@ std::string TextOf(const Recordings::VRecording& i_rRecording)
          << i_rRecording.FramePeriod << "\n";
     for (const RecordedChannel& rChannel : i_rRecording.Channels)
     {
-        text << NameOf(rChannel.Kind) << rChannel.Name;
+        text << NameOf(rChannel) << rChannel.Name;
         if (!rChannel.Subject.empty())
             text << " of " << rChannel.Subject;
         text << " [" << rChannel.Units << "] " << rChannel.Rate << " Hz, " << rChannel.FirstTick << " by "

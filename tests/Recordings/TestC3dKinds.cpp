@@ -263,6 +263,48 @@ TEST(C3dKinds, Labels)
     }
 }
 
+TEST(C3dKinds, PointsThatAModelComputed)
+{
+    struct Case
+    {
+        std::vector<ParameterSpec> Parameters;
+        std::string Expected;
+    };
+    const std::vector<ParameterSpec> lists = {
+        Texts("POINT", "LABELS", {"LKNE", "LKneeAngles", "F", "M", "P", "S", "R", "LKNE"}),
+        Texts("POINT", "ANGLES", {"LKneeAngles", "gone", ""}),
+        Texts("POINT", "FORCES", {"F", "LKneeAngles"}),
+        Texts("POINT", "MOMENTS", {"M"}),
+        Texts("POINT", "POWERS", {"P"}),
+        Texts("POINT", "SCALARS", {"S"}),
+        Texts("POINT", "REACTIONS", {"R"})};
+    std::vector<ParameterSpec> units = lists;
+    for (const auto& [pName, pUnit] :
+         {std::pair("ANGLE_UNITS", "rad"), std::pair("FORCE_UNITS", "N/kg"), std::pair("MOMENT_UNITS", "Nm"),
+          std::pair("POWER_UNITS", "W/kg"), std::pair("SCALAR_UNITS", "mm"), std::pair("REACTION_UNITS", "kN")})
+        units.push_back(Texts("POINT", pName, {pUnit}));
+    const Case cases[] = {{lists, "marker LKNE [mm]\noutput Angle LKneeAngles [deg]\noutput Force F [N]\n"
+                                  "output Moment M [Nmm]\noutput Power P [W]\noutput Scalar S []\n"
+                                  "output Reaction R []\nmarker LKNE#2 [mm]\n"},
+                          {units, "marker LKNE [mm]\noutput Angle LKneeAngles [rad]\noutput Force F [N/kg]\n"
+                                  "output Moment M [Nm]\noutput Power P [W/kg]\noutput Scalar S [mm]\n"
+                                  "output Reaction R [kN]\nmarker LKNE#2 [mm]\n"}};
+    for (const Case& rCase : cases)
+    {
+        C3dSpec spec;
+        spec.Points = 8;
+        spec.Frames = {std::vector<double>(32, 1.0)};
+        spec.Parameters = {Integers("POINT", "USED", {8}), Reals("POINT", "SCALE", {-1}),
+                           Texts("POINT", "UNITS", {"mm"})};
+        spec.Parameters.insert(spec.Parameters.end(), rCase.Parameters.begin(), rCase.Parameters.end());
+        std::string text = TextOf(Read(spec));
+        text.erase(0, text.find('\n') + 1);
+        for (std::size_t at = 0; (at = text.find("] 100 Hz", at)) != std::string::npos;)
+            text.erase(at + 1, text.find('\n', at) - at - 1);
+        EXPECT_EQ(text, rCase.Expected);
+    }
+}
+
 TEST(C3dKinds, EventsOfGroupAndHeader)
 {
     C3dSpec spec = SmallSpec(EProcessor::Dec, true);

@@ -121,6 +121,18 @@ TEST(C3dWriter, RoundTripIsExact)
     ExpectRoundTrip(MakeRecording(2, 0, 5));
     ExpectRoundTrip(MakeRecording(600, 300, 3)); // labels, units, scales and offsets go on in further parameters
 
+    VRecording outputs = MakeRecording(300, 1, 4); // the list of the angles goes on in a further parameter
+    for (std::size_t i = 1; i < 300; ++i)
+    {
+        constexpr std::pair<const char*, const char*> quantities[] = {
+            {"Angle", "rad"}, {"Force", "N/kg"}, {"Moment", "Nm"}, {"Power", "W"}, {"Scalar", ""}, {"Reaction", "N"}};
+        const auto [pQuantity, pUnits] = quantities[i < 260 ? 0 : i % 6];
+        outputs.Channels[i].Kind = EChannelKind::ModelOutput;
+        outputs.Channels[i].Quantity = pQuantity;
+        outputs.Channels[i].Units = pUnits;
+    }
+    ExpectRoundTrip(outputs);
+
     VRecording partial = MakeRecording(1, 0, 2);
     partial.Channels[0].Samples = {1.0f, Missing, 3.0f, Missing, Missing, Missing};
     ExpectRoundTrip(partial);
@@ -166,6 +178,17 @@ TEST(C3dWriter, SaysWhatItCannotHold)
         {"no grid", [](VRecording& io_r) { io_r.FramePeriod = 0; }, TQL::Result::InvalidArgument, "no frames"},
         {"units differ", [](VRecording& io_r) { io_r.Channels[1].Units = "m"; }, TQL::Result::InvalidArgument,
          "differ in units"},
+        {"outputs differ in units",
+         [](VRecording& io_r)
+         {
+             for (std::size_t i = 0; i < 2; ++i)
+             {
+                 io_r.Channels[i].Kind = EChannelKind::ModelOutput;
+                 io_r.Channels[i].Quantity = "Angle";
+                 io_r.Channels[i].Units = i == 0 ? "deg" : "rad";
+             }
+         },
+         TQL::Result::InvalidArgument, "differ in units"},
         {"lengths differ", [](VRecording& io_r) { io_r.Channels[1].Samples.resize(3); }, TQL::Result::InvalidArgument,
          "rate or length"},
         {"off the grid", [](VRecording& io_r) { MoveTo(io_r, 1000); }, TQL::Result::InvalidArgument, "rate or length"},

@@ -29,7 +29,8 @@ std::string Describe(const VRecording& i_rRecording)
     std::ostringstream text;
     for (const Recordings::RecordedChannel& rChannel : i_rRecording.Channels)
     {
-        text << rChannel.Name << " " << rChannel.Units << " " << rChannel.Rate << " " << rChannel.FirstTick << ":";
+        text << rChannel.Name << " " << rChannel.Quantity << rChannel.Units << " " << rChannel.Rate << " "
+             << rChannel.FirstTick << ":";
         for (const float value : rChannel.Samples)
             text << " " << (std::isnan(value) ? "-" : testing::PrintToString(value));
         text << "\n";
@@ -62,14 +63,15 @@ TEST_F(LiveData, SavedAsC3dReadBackEqualWithGaps)
     const auto marker = Add({"Labelled Reconstructions", 0, 0, "", "W:LFHD", "mm", {}});
     const auto pose = Add({"SubjectSegmentPose", 0, 0, "", "W:Head", "mm", {}});
     const auto odd = Add({"Labelled Reconstructions", 0, 1, "", "W:RFHD", "m", {}});
+    const auto knee = Add({"ModelSetSamplesOutput", 2, 0, "Knee", "Knee", "deg", {"X", "Y", "Z"}, "", "Angle"});
     const auto force = Add({"DeviceOutput", 0, 0, "", "Fz", "N", {""}}, Period / 2);
     const auto column = Add({"ModelSetSamplesOutput", 0, 0, "emg", "emg", "mV", {"1", "2"}});
     const std::vector<float> positions{1, 2, 3, Gap, Gap, Gap, 7, 8, 9};
     const std::vector<float> poses(18, 1.0f);
     const std::vector<float> forces{1, 2, 3, Gap, 5, 6};
     const std::vector<float> columns{10, 20, Gap, Gap, 30, 40};
-    const ChannelRows rows[] = {
-        {marker, positions, 0}, {pose, poses, 0}, {odd, positions, 0}, {force, forces, 0}, {column, columns, 0}};
+    const ChannelRows rows[] = {{marker, positions, 0}, {pose, poses, 0},   {odd, positions, 0},
+                                {knee, positions, 0},   {force, forces, 0}, {column, columns, 0}};
     ASSERT_TRUE(m_pContext->AppendFrames(0, 3, rows).IsSuccess());
     const auto late = Add({"ModelSetSamplesOutput", 1, 0, "late", "late", "", {""}});
     const std::vector<float> one{77};
@@ -88,6 +90,7 @@ TEST_F(LiveData, SavedAsC3dReadBackEqualWithGaps)
     VRecording read;
     ASSERT_TRUE(Recordings::OpenRecording(path, read, error).IsSuccess()) << error;
     EXPECT_EQ(Describe(read), "W:LFHD mm 100 0: 1 2 3 - - - 7 8 9 - - - - - -\n"
+                              "Knee Angledeg 100 0: 1 2 3 - - - 7 8 9 - - - - - -\n"
                               "Fz N 200 0: 1 2 3 - 5 6 - - - -\n"
                               "emg.1 mV 200 0: 10 10 - - 30 30 - - - -\n"
                               "emg.2 mV 200 0: 20 20 - - 40 40 - - - -\n"
