@@ -89,8 +89,10 @@ TQL::ComponentDescription DescribeComponents(const ChannelDefinition& i_rDefinit
     const ChannelType* pType = FindChannelType(i_rDefinition.TypeName);
     const bool bPose = pType && pType->UnitUse == EUnitUse::PositionOfPose && count == 6;
     TQL::ComponentGroup group;
-    if (!i_rDefinition.Units.empty())
-        group.Factors.push_back({i_rSubTypes.IdOfUnit(i_rDefinition.Units), boost::rational<std::int8_t>(1)});
+    const bool bLength = pType && !pType->FormatName.empty();
+    const std::string_view units = i_rDefinition.Units.empty() && bLength ? LengthWithoutUnit : i_rDefinition.Units;
+    if (!units.empty())
+        group.Factors.push_back({i_rSubTypes.IdOfUnit(units), boost::rational<std::int8_t>(1)});
     description.Groups.assign(count, group);
     for (std::size_t i = 0; bPose && i < 3; ++i)
         description.Groups[i].Factors = {{VSubTypeTable::Radian, boost::rational<std::int8_t>(1)}};

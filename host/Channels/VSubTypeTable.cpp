@@ -44,7 +44,7 @@ struct Base
 constexpr double Degrees = std::numbers::pi / 180.0;
 
 /// As above, rows are only ever added at the end.
-constexpr std::array<Base, 38> Bases{{
+constexpr std::array<Base, 40> Bases{{
     {"meter", "m", 0, 1.0, true},
     {"gram", "g", 1, 1e-3, true},
     {"second", "s", 2, 1.0, true},
@@ -83,6 +83,8 @@ constexpr std::array<Base, 38> Bases{{
     {"foot", "ft", 0, 0.3048, false},
     {"percent", "%", 29, 0.01, false},
     {"newton meter", "N·m", 30, 1.0, false},
+    {"frame", "frame", 31, 1.0, false},
+    {"per frame", "1/frame", 32, 1.0, false},
 }};
 
 /// Other ways in which recordings write a unit.

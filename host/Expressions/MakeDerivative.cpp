@@ -47,14 +47,21 @@ TQL::ComponentDescription DescribeSteps(const TQL::ComponentDescription& i_rInpu
     return steps;
 }
 
-/// What is left of it as a power of time alone is told in hertz, if there is such a unit: a text of units needs one to
-/// stand above the line.
-bool DivideByTime(Unit& io_rUnit, int i_Order, std::uint16_t i_Second, const std::optional<std::uint16_t>& i_rHertz)
+/// What rows are apart, and one over it.
+struct StepUnits
 {
-    if (!MultiplyUnit(io_rUnit, i_Second, -i_Order))
+    std::optional<std::uint16_t> Step;
+    std::optional<std::uint16_t> PerStep;
+};
+
+/// What is left of it as a power of the step alone is told in hertz, or per frame, if there is such a unit: a text of
+/// units needs one to stand above the line.
+bool DivideByStep(Unit& io_rUnit, int i_Order, const StepUnits& i_rUnits)
+{
+    if (!MultiplyUnit(io_rUnit, *i_rUnits.Step, -i_Order))
         return false;
-    if (i_rHertz && io_rUnit.size() == 1 && io_rUnit[0].SubTypeId == i_Second && io_rUnit[0].Exponent < 0)
-        io_rUnit[0] = {*i_rHertz, -io_rUnit[0].Exponent};
+    if (i_rUnits.PerStep && io_rUnit.size() == 1 && io_rUnit[0].SubTypeId == *i_rUnits.Step && io_rUnit[0].Exponent < 0)
+        io_rUnit[0] = {*i_rUnits.PerStep, -io_rUnit[0].Exponent};
     return true;
 }
 
@@ -70,9 +77,10 @@ OperationOrError MakeDerivative(int i_Order, bool i_bPerFrame, double i_SecondsP
     if (!i_bPerFrame && !(std::isfinite(i_SecondsPerRow) && i_SecondsPerRow > 0.0))
         return Refuse("A channel without a rate has no derivative by time.");
     const std::optional<std::uint16_t> radian = FindUnit("radian", i_rUnits);
-    const std::optional<std::uint16_t> second = FindUnit("second", i_rUnits);
-    if (!radian || !second)
-        return Refuse("There are no units \"radian\" and \"second\" to give derivatives in.");
+    const StepUnits step = i_bPerFrame ? StepUnits{FindUnit("frame", i_rUnits), FindUnit("per frame", i_rUnits)}
+                                       : StepUnits{FindUnit("second", i_rUnits), FindUnit("hertz", i_rUnits)};
+    if (!radian || !step.Step)
+        return Refuse("There are no units \"radian\" and \"second\" or \"frame\" to give derivatives in.");
     DerivativePlan plan;
     plan.Is = FindShape(i_rInput, i_rUnits);
     plan.Order = i_Order;
@@ -84,7 +92,7 @@ OperationOrError MakeDerivative(int i_Order, bool i_bPerFrame, double i_SecondsP
         plan.Radians =
             *FindRadians(plan.Is.Form.Form, std::span(i_rInput.Groups).first(plan.Is.RotationWidth()), i_rUnits);
     for (TQL::ComponentGroup& rGroup : plan.Description.Groups)
-        if (!i_bPerFrame && !DivideByTime(rGroup.Factors, i_Order, *second, FindUnit("hertz", i_rUnits)))
+        if (!DivideByStep(rGroup.Factors, i_Order, step))
             return Refuse("The unit of the derivative has too high a power of time.");
     return {std::make_shared<const VDerivative>(std::move(plan)), {}};
 }

@@ -9,7 +9,7 @@ namespace Expressions
 
 /// Makes the operation that differentiates one input by time or by frame, or the sentence that says why there is none.
 /// i_Order is 1 or 2. i_SecondsPerRow is the time from one row to the next; by frame it is not used. The unit gains
-/// second^-order by time and stays by frame.
+/// second^-order, or frame^-order by frame.
 ///
 /// Inside a run of samples the differences are central ones over the two neighbours. At the ends of a run the first
 /// derivative is the difference to the one neighbour and the second is missing, as are both for a sample without

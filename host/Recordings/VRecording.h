@@ -5,10 +5,14 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace Recordings
 {
+
+/// The unit of lengths in files whose format knows none.
+inline constexpr std::string_view LengthWithoutUnit = "units";
 
 enum class EChannelKind
 {
@@ -27,7 +31,7 @@ struct RecordedChannel
     std::string Name;    ///< as in the file; one that comes again in the file gets "#2", "#3" behind it
     std::string Subject; ///< the part of the label before the colon, or empty
     std::vector<std::string> ComponentNames; ///< {""} for a channel with one unnamed component
-    std::string Units;                       ///< as in the file: "mm", "m", "V"; empty when the file has none
+    std::string Units;                       ///< "mm", "V" as in the file; lengths of a BVH "units"; empty: none
     double Rate = 0.0;                       ///< samples a second
     std::int64_t SamplePeriod = TQL::DefaultFramePeriod; ///< ticks, nearest to the rate
     std::int64_t FirstTick = 0; ///< of the first row; row i stands at FirstTick + i x SamplePeriod

@@ -41,6 +41,10 @@ std::shared_ptr<Recordings::VRecording> MakeRecording()
     add(EChannelKind::JointAngles, "Hip", "", "deg", {"X", "Y", "Z"});
     pRecording->Channels.back().RotationOrder = "ZXY";
     add(EChannelKind::Column, "ankle", "", "", {""});
+    add(EChannelKind::ModelOutput, "Ann:LKneeAngles", "Ann", "deg", {"X", "Y", "Z"});
+    pRecording->Channels.back().Quantity = "Angle";
+    add(EChannelKind::Marker, "Ann:unit", "Ann", "", {"X", "Y", "Z"});
+    add(EChannelKind::SegmentPose, "Bob:Femur", "Bob", "", {"RX", "RY", "RZ", "TX", "TY", "TZ"});
     return pRecording;
 }
 
@@ -96,9 +100,27 @@ TEST(ChannelService, RecordedChannelsAreFoundByTheirExactId)
          "° ° ° ",
          {ModelOutput, 0, 0, "Hip"}},
         {{"Walk", "ModelSetSamplesOutput", 1, 0, "ankle"}, "ankle", "", "", " ", {ModelOutput, 1, 0, "ankle"}},
+        {{"Walk", "ModelSetSamplesOutput", 2, 0, "Ann:LKneeAngles"},
+         "Ann:LKneeAngles",
+         "X,Y,Z",
+         "",
+         "° ° ° ",
+         {ModelOutput, 2, 0, "Ann:LKneeAngles"}},
+        {{"Walk", "Labelled Reconstructions", 0, 2, ""},
+         "Ann:unit",
+         "TX,TY,TZ",
+         "Position",
+         "units units units ",
+         {Label, 0, 2, ""}},
+        {{"Walk", "SubjectSegmentPose", 1, 1, ""},
+         "Bob:Femur",
+         "RX,RY,RZ,TX,TY,TZ",
+         "Pose",
+         "rad rad rad units units units ",
+         {Segment, 1, 1, ""}},
         {{"Other", "Labelled Reconstructions", 0, 1, ""}, nullptr, "", "", "", {}},
         {{"", "Labelled Reconstructions", 0, 1, ""}, nullptr, "", "", "", {}},
-        {{"Walk", "Labelled Reconstructions", 0, 2, ""}, nullptr, "", "", "", {}},
+        {{"Walk", "Labelled Reconstructions", 0, 3, ""}, nullptr, "", "", "", {}},
         {{"Walk", "Labelled Reconstructions", 0, 1, "x"}, nullptr, "", "", "", {}},
         {{"Walk", "ModelSetSamplesOutput", 0, 0, ""}, nullptr, "", "", "", {}},
     };

@@ -24,7 +24,7 @@ struct Row
 };
 
 constexpr std::uint16_t Unknown = Expressions::IUnitTable::UnknownDimension;
-constexpr std::array<Row, 10> Bases{{
+constexpr std::array<Row, 12> Bases{{
     {"meter", "m", 0, 1.0},
     {"radian", "rad", 7, 1.0},
     {"degree", "deg", 7, std::numbers::pi / 180.0},
@@ -35,6 +35,8 @@ constexpr std::array<Row, 10> Bases{{
     {"inch", "in", 0, 0.0254},
     {"blob", "blob", Unknown, 1.0},
     {"glob", "glob", Unknown, 1.0},
+    {"frame", "frame", 31, 1.0},
+    {"per frame", "1:frame", 32, 1.0},
 }};
 constexpr std::array<Row, 3> Prefixes{{{"", "", 0, 1.0}, {"milli", "m", 0, 1e-3}, {"centi", "c", 0, 1e-2}}};
 

@@ -50,10 +50,10 @@ TEST_F(Names, OfMarkersAndNumbers)
         {marker, Auto, "mag", "Distance From Origin - Anna:LASI |  | mm"},
         {marker, Auto, "d1", "Velocity - Anna:LASI | TX,TY,TZ | mm/s[3]"},
         {marker, Auto, "d1 m", "Velocity - Anna:LASI | TX,TY,TZ | m/s[3]"},
-        {marker, Auto, "d1 frame", "Velocity - Anna:LASI | TX,TY,TZ | mm[3]"},
+        {marker, Auto, "d1 frame", "Velocity - Anna:LASI | TX,TY,TZ | mm/frame[3]"},
         {marker, Auto, "d1 mag", "Speed - Anna:LASI |  | mm/s"},
         {marker, Auto, "d2", "Acceleration - Anna:LASI | TX,TY,TZ | mm/s^2[3] | mm/s<sup>2</sup>"},
-        {marker, Auto, "d2 frame cm", "Acceleration - Anna:LASI | TX,TY,TZ | cm[3]"},
+        {marker, Auto, "d2 frame cm", "Acceleration - Anna:LASI | TX,TY,TZ | cm/frame^2[3] | cm/frame<sup>2</sup>"},
         {marker, Auto, "d2 mag", "Acceleration (Magnitude) - Anna:LASI |  | mm/s^2 | mm/s<sup>2</sup>"},
         // Nothing that an operator chooses fits a force but its derivative; its magnitude is not on offer.
         {"Force.Fz", Auto, "f4 rad m mag", "Device Output - Force.Fz |  | N"},
@@ -62,6 +62,13 @@ TEST_F(Names, OfMarkersAndNumbers)
         {"Torque", Auto, "", "Column - Torque |  | N·m"},
         {"Ratio", Auto, "", "Column - Ratio |  | "},
         {"Ratio", Auto, "d1", "Column 1st Derivative - Ratio |  | Hz"},
+        {"Ratio", Auto, "d1 frame", "Column 1st Derivative - Ratio |  | 1/frame"},
+        {"Anna:KneeAngles", Auto, "", "Angle - Anna:KneeAngles | X,Y,Z | °[3]"},
+        {"Anna:KneeAngles", Auto, "d1 rad", "Angular Velocity - Anna:KneeAngles | X,Y,Z | rad/s[3]"},
+        {"Anna:KneeMoment", Auto, "m", "Moment - Anna:KneeMoment | X,Y,Z | Nmm[3]"},
+        // The file tells no unit of length, so that none can be chosen.
+        {"Root", Auto, "cm", "Pose (Helical) - Root | RX,RY,RZ,TX,TY,TZ | °[3] units[3]"},
+        {"Root", Auto, "d1 cm", "Pose 1st Derivative - Root | RX,RY,RZ,TX,TY,TZ | °/s[3] units/s[3]"},
     });
 }
 
@@ -83,7 +90,9 @@ TEST_F(Names, OfRotationsInEveryFormat)
         {"Anna:Pelvis", Auto, "f8", "Pose (Euler ZXY) - Anna:Pelvis | RX,RY,RZ | °[3]"},
         {"Anna:Pelvis", Auto, "f9 rad", "Pose (Euler XYX) - Anna:Pelvis | RX,RY,RZ | rad[3]"},
         {"Anna:Pelvis", Auto, "d1 f4", "Pose 1st Derivative - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | °/s[3] mm/s[3]"},
-        {"Anna:Pelvis", Auto, "d2 frame rad", "Pose 2nd Derivative - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | rad[3] mm[3]"},
+        {"Anna:Pelvis", Auto, "d2 frame rad",
+         "Pose 2nd Derivative - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | rad/frame^2[3] mm/frame^2[3] | "
+         "rad/frame<sup>2</sup>[3] mm/frame<sup>2</sup>[3]"},
         {"Anna:Pelvis", "SubjectSegmentPose", "", "Pose (Helical) - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | °[3] mm[3]"},
         {"Knee", Auto, "", "Joint Angles (Helical) - Knee | RX,RY,RZ | °[3]"},
         {"Knee", Auto, "f1 rad", "Joint Angles (Axis and Angle) - Knee | X,Y,Z,A | [3] rad"},

@@ -83,6 +83,17 @@ std::shared_ptr<Recordings::VRecording> MakeRecording(const std::string& i_rSubj
     rChannels.push_back(MakeChannel(EChannelKind::Analog, "Force.Fz", "N", {""}, count, 10));
     rChannels.push_back(MakeChannel(EChannelKind::Column, "Torque", "N.m", {""}, count));
     rChannels.push_back(MakeChannel(EChannelKind::Column, "Ratio", "", {""}, count));
+    for (const auto& [rName, pQuantity, pUnits] :
+         {std::tuple{"KneeAngles", "Angle", "deg"}, {"KneeMoment", "Moment", "Nmm"}})
+    {
+        rChannels.push_back(MakeChannel(EChannelKind::ModelOutput, i_rSubject + ":" + rName, pUnits, {"X", "Y", "Z"},
+                                        [](float i_Frame) {
+                                            return Values{i_Frame, 2.0f, 3.0f};
+                                        }));
+        rChannels.back().Quantity = pQuantity;
+    }
+    rChannels.push_back(MakeSegment("Root", 0.0f, 90.0f));
+    rChannels.back().Units.clear();
     return pRecording;
 }
 
