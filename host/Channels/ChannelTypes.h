@@ -79,6 +79,7 @@ struct ChannelDefinition
     std::vector<std::string> ComponentNames; ///< empty: those of the type
     std::string RotationOrder = {};          ///< of joint angles, as far as it is known: "ZXY"
     std::string TypeText = {};               ///< shown in place of the display name of the type, unless it is empty
+    bool bCountsRows = false;                ///< says when or which row, and is the last that anybody wants to see
 };
 
 /// Component names of a definition: its own, or those of its type.

@@ -22,6 +22,7 @@ ChannelDefinition VChannelNumbering::Define(const Recordings::RecordedChannel& i
     definition.Units = i_rChannel.Units;
     definition.ComponentNames = i_rChannel.ComponentNames;
     definition.RotationOrder = i_rChannel.RotationOrder;
+    definition.bCountsRows = i_rChannel.bCountsRows;
     switch (i_rChannel.Kind)
     {
     case EChannelKind::Marker:

@@ -268,6 +268,7 @@ RecordedChannel MakeChannel(const std::vector<ColumnHead>& i_rHeads, std::size_t
     if (AreComponents(i_rHeads, i_First, PoseComponents, false))
         return MakeGroup(i_rHeads[i_First], EChannelKind::SegmentPose, PoseComponents);
     RecordedChannel channel;
+    channel.bCountsRows = CountsRows(i_rHeads[i_First]);
     channel.Name = i_rHeads[i_First].Name;
     channel.ComponentNames = {""};
     channel.Units = i_rHeads[i_First].Units;
@@ -317,6 +318,13 @@ TimeColumn FindTimeColumn(const std::vector<ColumnHead>& i_rHeads)
             return {i, ETimeKind::Frames, 1.0, true};
     }
     return {};
+}
+
+bool CountsRows(const ColumnHead& i_rHead)
+{
+    constexpr std::array<std::string_view, 5> parts{"sub frame", "subframe", "sub_frame", "sub-frame", "sample number"};
+    const std::string name = BareName(i_rHead);
+    return TimeOfName(i_rHead, 1) || Contains(FrameWords, name) || Contains(parts, name);
 }
 
 void GroupColumns(const std::vector<ColumnHead>& i_rHeads, std::size_t i_TimeColumn,

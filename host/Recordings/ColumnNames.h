@@ -44,6 +44,9 @@ struct TimeColumn
 /// short name such as "t" or "#".
 TimeColumn FindTimeColumn(const std::vector<ColumnHead>& i_rHeads);
 
+/// Whether a column of such a name says when or which row: a time, a number of a frame or of a part of one.
+bool CountsRows(const ColumnHead& i_rHead);
+
 /// Groups columns to channels: three neighbours NAME.X, NAME.Y, NAME.Z (or with '_', in small letters) are a marker if
 /// their unit is a length, or if they have none and the name is not that of another quantity or of a quaternion;
 /// NAME.RX to NAME.TZ are a pose; all others are columns. i_TimeColumn feeds nothing. The channels get names that

@@ -109,6 +109,7 @@ std::optional<RecordedChannel> MakeTimeChannel(const CsvLayout& i_rLayout, const
     if (i_rTime.Kind != ETimeKind::Seconds || !i_rLayout.bNamed[i_rTime.Column])
         return std::nullopt;
     RecordedChannel channel;
+    channel.bCountsRows = true;
     channel.Name = i_rLayout.Heads[i_rTime.Column].Name;
     channel.Units = i_rLayout.Heads[i_rTime.Column].Units;
     return channel;

@@ -1,6 +1,7 @@
 #include "Recordings/StorageTableReader.h"
 
 #include "Recordings/C3dText.h"
+#include "Recordings/ColumnNames.h"
 #include "Recordings/TableRecording.h"
 #include "Recordings/TableRows.h"
 #include "Recordings/TextScan.h"
@@ -197,6 +198,7 @@ void AddColumns(const StorageHead& i_rHead, const RowLook& i_rLook, TableBody& i
         channel.ComponentNames = NamesOfParts(parts);
         if (i_rHead.bAngleUnits && parts == 1)
             channel.Units = UnitsOfAngle(names[i], i_rHead.bDegrees);
+        channel.bCountsRows = CountsRows({names[i], {}});
         channel.Name = std::move(names[i]);
         io_rRecording.Channels.push_back(std::move(channel));
     }

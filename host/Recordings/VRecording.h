@@ -37,6 +37,7 @@ struct RecordedChannel
     std::int64_t FirstTick = 0; ///< of the first row; row i stands at FirstTick + i x SamplePeriod
     std::vector<float> Samples;
     std::string RotationOrder = {}; ///< of joint angles: the axes in the order of the components, "ZXY"; empty: unknown
+    bool bCountsRows = false;       ///< a column that says when or which row: a time or a number of a frame
     std::string Quantity = {};      ///< of a model output: "Angle", "Force", "Moment", "Power", "Scalar", "Reaction"
 
     std::size_t ComponentCount() const { return ComponentNames.size(); }

@@ -39,6 +39,34 @@ std::vector<std::string> UnitsOf(const Channels::ChannelDefinition& i_rDefinitio
     return units;
 }
 
+int RankOf(const Channels::ChannelDefinition& i_rDefinition)
+{
+    enum
+    {
+        Marker,
+        Segment,
+        JointAngles,
+        ModelOutput,
+        Device,
+        Column,
+        Other,
+        Count
+    };
+    if (i_rDefinition.bCountsRows)
+        return Count;
+    if (i_rDefinition.TypeName == Channels::LabelledReconstructionType)
+        return Marker;
+    if (i_rDefinition.TypeName == Channels::SegmentPoseType)
+        return Segment;
+    if (i_rDefinition.TypeName == Channels::DeviceOutputType)
+        return Device;
+    if (i_rDefinition.TypeName != Channels::ModelOutputType)
+        return Other;
+    if (i_rDefinition.TypeText == Channels::JointAnglesText)
+        return JointAngles;
+    return i_rDefinition.TypeText.empty() || i_rDefinition.TypeText == Channels::ColumnText ? Column : ModelOutput;
+}
+
 QStringList Texts(const std::vector<std::string>& i_rTexts)
 {
     QStringList texts;
@@ -80,6 +108,7 @@ void AddThings(const Channels::VChannelContext& i_rContext, std::vector<Selectab
             o_rThings.push_back({NameOf(*rpChannel), rpChannel->GetInstanceId().TypeName, std::move(*item),
                                  UnitsOf(rDefinition), Channels::ComponentNamesOf(rDefinition)});
             o_rThings.back().TypeText = rDefinition.TypeText;
+            o_rThings.back().Rank = RankOf(rDefinition);
         }
 }
 
@@ -96,6 +125,7 @@ void AddSubjects(std::vector<SelectableThing>& io_rThings)
             continue;
         subjects.push_back({rThing.Name.substr(0, colon), {}, {ESelectionKind::Subject, rThing.Item.First, 0, {}}});
         subjects.back().Components = {rThing.Name.substr(colon + 1)};
+        subjects.back().Rank = rThing.Rank;
     }
     io_rThings.insert(io_rThings.end(), subjects.begin(), subjects.end());
 }
@@ -120,6 +150,16 @@ std::vector<SelectableThing> ListThings(const Channels::VChannelContext& i_rCont
         AddThings(*i_pGlobal, things);
     AddSubjects(things);
     return things;
+}
+
+std::vector<TQL::SelectionItem> ItemsByRank(std::span<const SelectableThing> i_Things)
+{
+    std::vector<SelectableThing> things(i_Things.begin(), i_Things.end());
+    std::ranges::stable_sort(things, {}, &SelectableThing::Rank);
+    std::vector<TQL::SelectionItem> items;
+    for (SelectableThing& rThing : things)
+        items.push_back(std::move(rThing.Item));
+    return items;
 }
 
 std::vector<ChannelTreeLeaf> MakeLeaves(std::span<const SelectableThing> i_Things)

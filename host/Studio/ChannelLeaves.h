@@ -23,12 +23,17 @@ struct SelectableThing
     std::vector<std::string> Units = {};      ///< of its components, each once
     std::vector<std::string> Components = {}; ///< names; for a subject the name of its root segment
     std::string TypeText = {};                ///< what plots call its type; empty where that is the type's own name
+    int Rank = 0; ///< the lower, the sooner is it what an operator wants to see of a recording at first
 };
 
 /// Those of the context's channels in their order, then of the global ones, then the subjects that have segments.
 /// i_pGlobal may be null.
 std::vector<SelectableThing> ListThings(const Channels::VChannelContext& i_rContext,
                                         const Channels::VChannelContext* i_pGlobal);
+
+/// The items of the things: first the markers, then segments, joint angles, model outputs, devices, columns, all else,
+/// and last what only counts the rows; in their order within those.
+std::vector<TQL::SelectionItem> ItemsByRank(std::span<const SelectableThing> i_Things);
 
 /// The things as leaves of the tree: what stands before the first colon of a name is the subject and the top branch,
 /// then comes the kind. A subject is a leaf of its own branch.

@@ -92,7 +92,7 @@ private:
         const auto things = ListThings(*m_rSession.CurrentContext(), m_rSession.Channels().GetGlobalChannels().get());
         if (things.empty())
             return Fail(m_rCommandLine.Files.front() + " has no channels; there is nothing to show");
-        std::vector<TQL::SelectionItem> items{things.front().Item};
+        std::vector<TQL::SelectionItem> items{ItemsByRank(things).front()};
         if (!m_rCommandLine.Patterns.empty())
         {
             std::string unmatched;

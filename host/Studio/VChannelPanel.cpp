@@ -191,9 +191,7 @@ void VChannelPanel::ShowCurrentContext()
     if (pContext)
     {
         const auto things = ListThings(*pContext, pGlobal.get());
-        std::vector<TQL::SelectionItem> known;
-        for (const SelectableThing& rThing : things)
-            known.push_back(rThing.Item);
+        std::vector<TQL::SelectionItem> known = ItemsByRank(things);
         if (pContext->GetChannels()->empty()) // monitors alone are nothing to begin with
             known.clear();
         SetLeaves(MakeLeaves(things));

@@ -1,3 +1,6 @@
+#include "Channels/VRecordedContext.h"
+#include "Channels/VSubTypeTable.h"
+#include "Recordings/CsvReader.h"
 #include "Studio/ChannelLeaves.h"
 #include "Studio/VChannelTreeModel.h"
 
@@ -6,7 +9,11 @@
 #include <QtCore/QAbstractItemModel>
 #include <QtTest/QAbstractItemModelTester>
 
+#include <algorithm>
+#include <memory>
+#include <span>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace
@@ -126,6 +133,31 @@ TEST(ChannelTree, ASelectionFromOutsideIsTakenOverWithoutAnEcho)
     EXPECT_EQ(Picture(model), "");
     EXPECT_EQ(model.FirstItem().Kind, ESelectionKind::None);
     EXPECT_EQ(ticked, 0);
+}
+
+TEST(ChannelLeaves, WhatCountsRowsIsNeverTheFirstPicture)
+{
+    const std::string text = "time,Sub Frame,Fz,A.X,A.Y,A.Z,Time (ms)\n0,0,1,2,3,4,5\n0.01,1,2,3,4,5,6\n";
+    Recordings::VRecording recording;
+    std::string error;
+    ASSERT_TRUE(Recordings::ReadCsv(std::as_bytes(std::span(text)), {}, recording, error).IsSuccess()) << error;
+    const auto add = [&](Recordings::EChannelKind i_Kind, const char* i_pName, const char* i_pQuantity)
+    {
+        recording.Channels.push_back(recording.Channels[1]);
+        recording.Channels.back().Kind = i_Kind;
+        recording.Channels.back().Name = i_pName;
+        recording.Channels.back().Quantity = i_pQuantity;
+    };
+    add(Recordings::EChannelKind::Analog, "EMG", "");
+    add(Recordings::EChannelKind::ModelOutput, "Power", "Power");
+    add(Recordings::EChannelKind::JointAngles, "Knee", "");
+    const Channels::VRecordedContext context("A", std::make_shared<Channels::VSubTypeTable>(),
+                                             std::make_shared<const Recordings::VRecording>(std::move(recording)));
+    const auto things = Studio::ListThings(context, nullptr);
+    std::string order;
+    for (const SelectionItem& rItem : Studio::ItemsByRank(things))
+        order += std::ranges::find(things, rItem, &Studio::SelectableThing::Item)->Name + "; ";
+    EXPECT_EQ(order, "A; Knee; Power; EMG; Fz; Sub Frame; Time (ms); ");
 }
 
 TEST(ChannelLeaves, NamesMakeTheBranchesAndPatternsFindThem)
