@@ -1,6 +1,7 @@
 #include "C3dBuilder.h"
 #include "RecordingText.h"
 
+#include "Recordings/C3dFrameCount.h"
 #include "Recordings/C3dReader.h"
 
 #include <gtest/gtest.h>
@@ -353,6 +354,54 @@ TEST(C3dKinds, FrameNumbersAndRates)
         EXPECT_EQ(recording.Channels.at(0).FirstTick, rCase.FirstTick);
         EXPECT_EQ(recording.Channels.at(0).SamplePeriod, rCase.AnalogPeriod);
         EXPECT_EQ(recording.Warnings.size(), rCase.Rate < 1.0 ? 1u : 0u);
+    }
+}
+
+TEST(C3dKinds, FramesAsEachPlaceTellsThem)
+{
+    struct Case
+    {
+        const char* pName;
+        std::vector<double> Start; ///< the two words of TRIAL; none: the parameter is absent
+        std::vector<double> End;
+        double Frames;
+        std::uint16_t First;
+        std::uint16_t Last;
+        const char* pSpans;
+    };
+    const Case cases[] = {
+        {"all agree", {1, 0}, {10, 0}, 10, 1, 10, "1+10 1+10 1+10 "},
+        {"a start without an end", {5, 0}, {}, 0, 1, 10, "1+10 "},
+        {"an end without a start", {}, {50, 0}, 0, 1, 10, "1+10 "},
+        {"an end before the start", {9, 0}, {5, 0}, 0, 1, 10, "1+10 "},
+        {"fields of zero", {0, 0}, {0, 0}, 7, 0, 0, "1+7 "},
+        {"a header that runs backwards", {}, {}, 3, 5, 3, "5+3 "},
+        {"the largest header alone", {}, {}, 0, 1, 65535, "1+65535 "},
+        {"a header that has no room", {1, 0}, {4464, 1}, 4464, 1, 65535, "1+70000 "},
+    };
+    for (const Case& rCase : cases)
+    {
+        C3dSpec spec;
+        spec.Points = 1;
+        spec.Frames = {std::vector<double>(4, 1.0)};
+        for (const auto& [pField, rWords] :
+             {std::pair("ACTUAL_START_FIELD", rCase.Start), std::pair("ACTUAL_END_FIELD", rCase.End)})
+            if (!rWords.empty())
+                spec.Parameters.push_back(Integers("TRIAL", pField, rWords));
+        if (rCase.Frames > 0)
+            spec.Parameters.push_back(Integers("POINT", "FRAMES", {rCase.Frames}));
+        const BuiltC3d built = BuildC3d(spec);
+        Recordings::C3dHeader header;
+        Recordings::VC3dParameters parameters;
+        std::string error;
+        ASSERT_TRUE(Recordings::ReadC3dHeader(built.Bytes, header, error).IsSuccess()) << error;
+        ASSERT_TRUE(Recordings::VC3dParameters::Read(built.Bytes, header, parameters, error).IsSuccess()) << error;
+        header.FirstFrame = rCase.First;
+        header.LastFrame = rCase.Last;
+        std::string spans;
+        for (const Recordings::C3dFrameSpan& rSpan : Recordings::C3dFrameSpans(header, parameters))
+            spans += std::to_string(rSpan.First) + "+" + std::to_string(rSpan.Count) + " ";
+        EXPECT_EQ(spans, rCase.pSpans) << rCase.pName;
     }
 }
 

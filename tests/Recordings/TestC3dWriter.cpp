@@ -1,5 +1,7 @@
 #include "RecordingText.h"
 
+#include "Recordings/C3dHeader.h"
+#include "Recordings/C3dParameters.h"
 #include "Recordings/C3dWriter.h"
 #include "Recordings/OpenRecording.h"
 
@@ -14,6 +16,7 @@
 #include <cstring>
 #include <limits>
 #include <random>
+#include <span>
 #include <string>
 #include <vector>
 
@@ -145,6 +148,22 @@ TEST(C3dWriter, RoundTripIsExact)
 TEST(C3dWriter, RoundTripOfALongRecording)
 {
     ExpectRoundTrip(MakeRecording(2, 1, 70000));
+}
+
+TEST(C3dWriter, HeaderAndParametersNameTheSameData)
+{
+    const TemporaryFolder folder;
+    std::string error;
+    ASSERT_EQ(Recordings::WriteC3d(MakeRecording(3, 0, 5), folder / "a.c3d", error), TQL::Result::Ok) << error;
+    const std::string text = ReadText(folder / "a.c3d");
+    const auto file = std::as_bytes(std::span(text));
+    Recordings::C3dHeader header;
+    Recordings::VC3dParameters parameters;
+    ASSERT_TRUE(Recordings::ReadC3dHeader(file, header, error).IsSuccess()) << error;
+    ASSERT_TRUE(Recordings::VC3dParameters::Read(file, header, parameters, error).IsSuccess()) << error;
+    ASSERT_GT(header.DataOffset, 0u);
+    EXPECT_EQ((parameters.Number("POINT", "DATA_START").value_or(0.0) - 1.0) * 512.0,
+              static_cast<double>(header.DataOffset));
 }
 
 TEST(C3dWriter, RoundTripOfEvents)
