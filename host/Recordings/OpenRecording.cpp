@@ -1,23 +1,17 @@
 #include "Recordings/OpenRecording.h"
 
-#include "Recordings/BvhReader.h"
-#include "Recordings/C3dReader.h"
 #include "Recordings/CsvReader.h"
+#include "Recordings/FileFormats.h"
 #include "Recordings/FileMessage.h"
-#include "Recordings/StorageTableReader.h"
 #include "Recordings/TextScan.h"
-#include "Recordings/TrcReader.h"
 #include "Recordings/VFileBytes.h"
 #include "Recordings/VReadProgress.h"
 
 #include <algorithm>
-#include <array>
 #include <cstddef>
 #include <span>
 #include <string>
-#include <string_view>
 #include <utility>
-#include <vector>
 
 namespace Recordings
 {
@@ -27,49 +21,28 @@ namespace
 
 using Bytes = std::span<const std::byte>;
 
-/// One kind of file.
-struct Reader
-{
-    std::span<const std::string_view> Endings; ///< small letters, with the dot
-    bool (*pLooksLike)(Bytes i_File);          ///< null where the content has no mark of its own
-    TQL::IResult (*pRead)(Bytes i_File, const ReadOptions& i_rOptions, VRecording& o_rRecording, std::string& o_rError);
-};
-
-constexpr std::array<std::string_view, 1> C3dEndings{".c3d"};
-constexpr std::array<std::string_view, 1> BvhEndings{".bvh"};
-constexpr std::array<std::string_view, 1> TrcEndings{".trc"};
-constexpr std::array<std::string_view, 2> StorageEndings{".mot", ".sto"};
-constexpr std::array<std::string_view, 4> CsvEndings{".csv", ".tsv", ".txt", ".dat"};
-
-constexpr std::array Readers{Reader{C3dEndings, LooksLikeC3d, ReadC3d}, Reader{BvhEndings, LooksLikeBvh, ReadBvh},
-                             Reader{TrcEndings, LooksLikeTrc, ReadTrc},
-                             Reader{StorageEndings, LooksLikeStorageTable, ReadStorageTable},
-                             Reader{CsvEndings, nullptr, ReadCsv}};
-constexpr std::string_view KnownKinds = "C3D (.c3d), BVH (.bvh), TRC (.trc), MOT (.mot), STO (.sto), "
-                                        "CSV (.csv, .tsv, .txt)";
-
 std::string EndingOf(const std::filesystem::path& i_rPath)
 {
     return SmallLetters(i_rPath.extension().string());
 }
 
-const Reader* ChooseReader(Bytes i_File, const std::string& i_rEnding)
+const FileFormat* ChooseFormat(Bytes i_File, const std::string& i_rEnding)
 {
-    const auto looksLike = [&](const Reader& i_rReader)
+    const std::span<const FileFormat> formats = GetFileFormats();
+    const auto endsLike = [&](const FileFormat& i_rFormat)
     {
-        return i_rReader.pLooksLike && i_rReader.pLooksLike(i_File);
+        return std::ranges::find(i_rFormat.Endings, i_rEnding) != i_rFormat.Endings.end();
     };
-    const auto endsLike = [&](const Reader& i_rReader)
-    {
-        return std::find(i_rReader.Endings.begin(), i_rReader.Endings.end(), i_rEnding) != i_rReader.Endings.end();
-    };
-    const auto byContent = std::find_if(Readers.begin(), Readers.end(), looksLike);
-    if (byContent != Readers.end())
-        return &*byContent;
-    const auto byEnding = std::find_if(Readers.begin(), Readers.end(), endsLike);
-    if (byEnding != Readers.end())
+    const FileFormat* pByContent = nullptr;
+    for (const FileFormat& rFormat : formats)
+        if ((!pByContent || endsLike(rFormat)) && rFormat.pLooksLike && rFormat.pLooksLike(i_File))
+            pByContent = &rFormat;
+    if (pByContent)
+        return pByContent;
+    const auto byEnding = std::ranges::find_if(formats, endsLike);
+    if (byEnding != formats.end())
         return &*byEnding;
-    return LooksLikeCsv(i_File) ? &Readers.back() : nullptr;
+    return LooksLikeCsv(i_File) ? &formats.back() : nullptr;
 }
 
 /// Stands between a reader and the one who waits for its file: gives the memory of what was read back now and then, and
@@ -115,23 +88,21 @@ TQL::IResult ReadAny(const std::filesystem::path& i_rPath, const ReadOptions& i_
     VFileBytes file;
     if (const TQL::IResult result = file.Open(i_rPath, o_rError); result.IsError())
         return result;
-    const std::string ending = EndingOf(i_rPath);
-    if (const Reader* pReader = ChooseReader(file.GetBytes(), ending))
+    if (const FileFormat* pFormat = ChooseFormat(file.GetBytes(), EndingOf(i_rPath)))
     {
         VFileMinder minder(file, i_rOptions.pProgress);
         ReadOptions options = i_rOptions;
         options.pProgress = &minder.Progress();
-        const TQL::IResult result = pReader->pRead(file.GetBytes(), options, o_rRecording, o_rError);
+        const TQL::IResult result = pFormat->pRead(file.GetBytes(), options, o_rRecording, o_rError);
         if (!file.IsWhole())
         {
             o_rError = "the file became shorter while it was read. Wait until it is written, and open it again.";
             return TQL::Result::FileIOFailure;
         }
-        if (o_rRecording.Format == "STO" && ending == ".mot")
-            o_rRecording.Format = "MOT"; // the same format under two names
+        o_rRecording.Format = pFormat->Name; // one format may stand there under two names
         return result;
     }
-    o_rError = "this kind of file is not known. Files that can be opened: " + std::string(KnownKinds) + ".";
+    o_rError = "this kind of file is not known. Files that can be opened: " + ListFormatsWithEndings() + ".";
     return TQL::Result::NotSupported;
 }
 

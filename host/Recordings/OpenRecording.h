@@ -10,7 +10,7 @@
 namespace Recordings
 {
 
-/// Reads a motion file of any kind that is known here: C3D, BVH, TRC, MOT, STO, CSV. The kind is told by the content
+/// Reads a motion file of any kind that FileFormats lists. The kind is told by the content
 /// first, then by the ending of the name; text with rows of numbers and an unknown ending is read as CSV. On failure
 /// o_rError is one line that names the file, says what is wrong and what to do, and o_rRecording is untouched. What a
 /// reader had to guess or leave out stands in the recording's warnings. The options' progress is told how far it is;

@@ -1,5 +1,6 @@
 #include "Studio/CommandLine.h"
 
+#include "Recordings/FileFormats.h"
 #include "Streaming/OscAddress.h"
 
 #include <algorithm>
@@ -354,6 +355,9 @@ std::string HelpText()
            "--loop\n"
            "  --module PATH      the Graph Plots module (default: graphplots.so beside the program)\n"
            "  --check            report at the end where the module broke the rules of its host\n"
+           "\n"
+           "Files that can be opened:\n" +
+           Recordings::DescribeFormats() +
            "\n"
            "check-store prints what a store file (preferences, graphs) holds, and where it has problems.\n"
            "\n"

@@ -2,6 +2,7 @@
 
 #include "Channels/VChannelService.h"
 #include "Channels/VRecordedContext.h"
+#include "Recordings/FileFormats.h"
 #include "Studio/ContextNames.h"
 #include "Studio/Paths.h"
 #include "Studio/PlainLabels.h"
@@ -96,8 +97,7 @@ void VFileActions::ChooseFiles()
 {
     const QStringList texts = QFileDialog::getOpenFileNames(
         &m_rWindow, tr("Open recordings"), QString(),
-        tr("Motion files (*.c3d *.bvh *.trc *.mot *.sto *.csv *.txt *.C3D *.BVH *.TRC *.MOT *.STO *.CSV);;"
-           "All files (*)"));
+        tr("Motion files (%1);;All files (*)").arg(QString::fromStdString(Recordings::ListFilePatterns())));
     std::vector<std::filesystem::path> paths;
     for (const QString& rText : texts)
         paths.push_back(PathFromText(rText.toStdString()));

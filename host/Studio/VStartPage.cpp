@@ -1,5 +1,6 @@
 #include "Studio/VStartPage.h"
 
+#include "Recordings/FileFormats.h"
 #include "Studio/Paths.h"
 #include "Studio/PlainLabels.h"
 #include "Studio/VMainActions.h"
@@ -39,7 +40,7 @@ VStartPage::VStartPage(VMainActions& i_rActions, VRecentFiles& i_rRecent, QWidge
     pTitle->setFont(font);
     pTitle->setAlignment(Qt::AlignCenter);
     pTitle->setWordWrap(true);
-    auto* pKinds = new QLabel(tr("C3D, BVH, TRC, MOT, STO and CSV"), this);
+    auto* pKinds = new QLabel(QString::fromStdString(Recordings::ListFormatNames()), this);
     pKinds->setAlignment(Qt::AlignCenter);
     pKinds->setEnabled(false);
 

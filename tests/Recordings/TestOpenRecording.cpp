@@ -2,6 +2,7 @@
 #include "RecordingText.h"
 
 #include "Recordings/C3dReader.h"
+#include "Recordings/FileFormats.h"
 #include "Recordings/OpenRecording.h"
 
 #include <gtest/gtest.h>
@@ -58,6 +59,8 @@ TEST(OpenRecording, ContentComesBeforeTheEnding)
 
 TEST(OpenRecording, KindsOfText)
 {
+    EXPECT_EQ(Recordings::ListFilePatterns(), "*.c3d *.C3D *.bvh *.BVH *.trc *.TRC *.sto *.STO *.mot *.MOT *.csv *.CSV "
+                                              "*.tsv *.TSV *.txt *.TXT *.dat *.DAT");
     const char* const pTrc = "PathFileType\t4\nFrame#\tTime\tA\n1\t0\t1\t2\t3\n";
     const char* const pStorage = "x\nendheader\ntime\tb\n0\t1\n";
     const char* const pTable = "time,x\n0,1\n";
@@ -106,7 +109,7 @@ TEST(OpenRecording, BadInputIsOneClearLine)
               "wide.csv: the file is written in 16-bit characters. Save it as UTF-8 text and open that.");
     EXPECT_EQ(ErrorOf(folder / "likely.gps", TQL::Result::NotSupported),
               "likely.gps: this kind of file is not known. Files that can be opened: C3D (.c3d), BVH (.bvh), "
-              "TRC (.trc), MOT (.mot), STO (.sto), CSV (.csv, .tsv, .txt).");
+              "TRC (.trc), STO (.sto), MOT (.mot), CSV (.csv, .tsv, .txt, .dat).");
     EXPECT_EQ(ErrorOf(folder / "none.c3d", TQL::Result::FileNotFound),
               "none.c3d: there is no such file. Check the name and the folder.");
     EXPECT_TRUE(ErrorOf(folder / "new\nline.c3d", TQL::Result::InvalidFormat).starts_with("new line.c3d: "));
