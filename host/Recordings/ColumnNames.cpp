@@ -2,6 +2,7 @@
 
 #include "Recordings/C3dText.h"
 #include "Recordings/TextScan.h"
+#include "Recordings/UnitTable.h"
 
 #include <algorithm>
 #include <array>
@@ -12,120 +13,6 @@ namespace Recordings
 
 namespace
 {
-
-constexpr std::array<std::string_view, 6> Lengths{"mm", "cm", "m", "in", "inch", "ft"};
-
-// In small letters.
-constexpr std::array<std::string_view, 74> Units{"s",
-                                                 "ms",
-                                                 "us",
-                                                 "\xC2\xB5s",
-                                                 "ns",
-                                                 "sec",
-                                                 "secs",
-                                                 "seconds",
-                                                 "min",
-                                                 "hz",
-                                                 "khz",
-                                                 "mm",
-                                                 "cm",
-                                                 "m",
-                                                 "in",
-                                                 "ft",
-                                                 "um",
-                                                 "n",
-                                                 "kn",
-                                                 "nm",
-                                                 "n.m",
-                                                 "n*m",
-                                                 "nmm",
-                                                 "n.mm",
-                                                 "n*mm",
-                                                 "n-m",
-                                                 "kg",
-                                                 "g",
-                                                 "v",
-                                                 "mv",
-                                                 "uv",
-                                                 "\xC2\xB5v",
-                                                 "volt",
-                                                 "volts",
-                                                 "a",
-                                                 "ma",
-                                                 "deg",
-                                                 "degree",
-                                                 "degrees",
-                                                 "\xC2\xB0",
-                                                 "rad",
-                                                 "radians",
-                                                 "deg/s",
-                                                 "rad/s",
-                                                 "\xC2\xB0/s",
-                                                 "dps",
-                                                 "deg/s^2",
-                                                 "rad/s^2",
-                                                 "m/s",
-                                                 "mm/s",
-                                                 "m/s^2",
-                                                 "m/s2",
-                                                 "m/s\xC2\xB2",
-                                                 "m/s/s",
-                                                 "mm/s^2",
-                                                 "ut",
-                                                 "\xC2\xB5t",
-                                                 "t",
-                                                 "gauss",
-                                                 "pa",
-                                                 "kpa",
-                                                 "mmhg",
-                                                 "%",
-                                                 "w",
-                                                 "j",
-                                                 "deg c",
-                                                 "\xC2\xB0"
-                                                 "c",
-                                                 "degc",
-                                                 "bpm",
-                                                 "count",
-                                                 "counts",
-                                                 "frames",
-                                                 "px",
-                                                 "pixels"};
-
-struct TimeUnit
-{
-    std::string_view Name;
-    double Seconds;
-};
-
-constexpr std::array<TimeUnit, 28> TimeUnits{{{"s", 1.0},
-                                              {"sec", 1.0},
-                                              {"secs", 1.0},
-                                              {"second", 1.0},
-                                              {"seconds", 1.0},
-                                              {"ms", 1e-3},
-                                              {"msec", 1e-3},
-                                              {"msecs", 1e-3},
-                                              {"millis", 1e-3},
-                                              {"millisecond", 1e-3},
-                                              {"milliseconds", 1e-3},
-                                              {"us", 1e-6},
-                                              {"\xC2\xB5s", 1e-6},
-                                              {"\xCE\xBCs", 1e-6},
-                                              {"usec", 1e-6},
-                                              {"microsecond", 1e-6},
-                                              {"microseconds", 1e-6},
-                                              {"ns", 1e-9},
-                                              {"nanosecond", 1e-9},
-                                              {"nanoseconds", 1e-9},
-                                              {"min", 60.0},
-                                              {"mins", 60.0},
-                                              {"minutes", 60.0},
-                                              {"h", 3600.0},
-                                              {"hr", 3600.0},
-                                              {"hour", 3600.0},
-                                              {"hours", 3600.0},
-                                              {"minute", 60.0}}};
 
 constexpr std::array<std::string_view, 9> TimeWords{"time", "times",        "timestamp",    "timestamps", "time stamp",
                                                     "zeit", "elapsed time", "time elapsed", "elapsed"};
@@ -148,9 +35,7 @@ bool Contains(const TList& i_rList, std::string_view i_Text)
 
 std::optional<double> SecondsOf(std::string_view i_Unit)
 {
-    const auto found = std::find_if(TimeUnits.begin(), TimeUnits.end(),
-                                    [&](const TimeUnit& i_rUnit) { return i_rUnit.Name == i_Unit; });
-    return found == TimeUnits.end() ? std::nullopt : std::optional<double>(found->Seconds);
+    return ScaleOfUnitWord(i_Unit, UnitBase::Time);
 }
 
 bool IsTimeWord(std::string_view i_Name)
@@ -244,7 +129,7 @@ bool IsMarker(const std::vector<ColumnHead>& i_rHeads, std::size_t i_First)
         (i_First + 3 < i_rHeads.size() && isQuaternionPart(i_First + 3)))
         return false;
     if (!units.empty())
-        return Contains(Lengths, units);
+        return ScaleOfUnitWord(units, UnitBase::Length).has_value();
     return std::none_of(OtherQuantities.begin(), OtherQuantities.end(),
                         [&](std::string_view i_Word) { return stem.find(i_Word) != std::string::npos; });
 }
@@ -279,7 +164,8 @@ RecordedChannel MakeChannel(const std::vector<ColumnHead>& i_rHeads, std::size_t
 
 bool IsUnit(std::string_view i_Text)
 {
-    return Contains(Units, SmallLetters(BareUnit(i_Text)));
+    const UnitWord* pWord = FindUnitWord(BareUnit(i_Text));
+    return pWord && pWord->Base != "hour"; // "Height (h)" is no time, only "Time (h)" is one
 }
 
 std::string BareUnit(std::string_view i_Text)
@@ -301,7 +187,6 @@ std::string UnitInName(std::string_view i_Name)
     if (name.back() != (name[open] == '[' ? ']' : ')'))
         return {};
     const std::string unit = BareUnit(name.substr(open));
-    // "Height (h)" is no time, "Time (h)" is one.
     const bool bOfTime = SecondsOf(SmallLetters(unit)) && IsTimeWord(SmallLetters(TrimBlanks(name.substr(0, open))));
     return name[open] == '[' || IsUnit(unit) || bOfTime ? unit : std::string();
 }

@@ -279,6 +279,11 @@ TEST(ChannelService, UnitsOfRecordingsFindTheirSubtype)
         {"Hz", "hertz", "Hz", 9, 1.0},
         {"min", "minute", "min", 2, 60.0},
         {"cd", "candela", "cd", 6, 1.0},
+        {"MM", "millimeter", "mm", 0, 1e-3},
+        {"N*m", "newton meter", "N·m", 30, 1.0},
+        {"\xCE\xBCs", "microsecond", "µs", 2, 1e-6},
+        {"deg/s", "deg/s", "deg/s", 0xffff, 1.0},
+        {"units", "units", "units", 0xffff, 1.0},
         {"Nmm", "Nmm", "Nmm", 0xffff, 1.0},
     };
     Channels::VSubTypeTable table;
