@@ -34,14 +34,18 @@ jobs() {
     if [ "$memory" -lt "$cores" ]; then echo "$memory"; else echo "$cores"; fi
 }
 
-# build PRESET [TARGET...]: configures at first and when the presets have changed, then builds.
+# configure PRESET: at first, and when the presets have changed.
+configure() {
+    if [ -f "build/$1/build.ninja" ] && [ ! "build/$1/build.ninja" -ot CMakePresets.json ]; then return 0; fi
+    say "configuring $1"
+    cmake --preset "$1" >"$(mktemp -t graphplots-configure.XXXXXX)"
+}
+
+# build PRESET [TARGET...]
 build() {
     local preset=$1
     shift
-    if [ ! -f "build/$preset/build.ninja" ] || [ "build/$preset/build.ninja" -ot CMakePresets.json ]; then
-        say "configuring $preset"
-        cmake --preset "$preset" >"$(mktemp -t graphplots-configure.XXXXXX)"
-    fi
+    configure "$preset"
     say "building $preset"
     local targets=()
     for target in "$@"; do targets+=(--target "$target"); done
