@@ -72,7 +72,7 @@ void VActiveChannelModel::Restore(const ChannelList& i_rPinned)
     m_Rows.Clear();
     endResetModel();
     for (const std::shared_ptr<IChannel>& rpChannel : i_rPinned)
-        AddChannel(rpChannel, true);
+        AddChannel(FindChannelAnew(rpChannel, m_pMigrationService.get()), true);
     if (SetChannels({}) == TQL::Result::OkButNoEffect)
         NotifyChanged(); // of the rows from before
 }

@@ -37,7 +37,8 @@ struct VContextSwitchPlan;
 
 /// The channels that are plotted now, sorted by name. An unpinned row stays as long as the builder delivers its
 /// channel, a pinned one until the operator removes it; a change of the data context finds what stands for a channel in
-/// the new one. Owned by the graph plot context and living as long as the plot. UI thread.
+/// the new one, and each notice of the contexts what stands now for a channel that was read again. Owned by the graph
+/// plot context and living as long as the plot. UI thread.
 class VActiveChannelModel : public QAbstractListModel
 {
     Q_OBJECT
@@ -47,7 +48,7 @@ class VActiveChannelModel : public QAbstractListModel
 public:
     using ChannelList = std::vector<std::shared_ptr<TQL::IChannel>>;
 
-    /// i_pMigrationService may be null: then no channel follows a change of context.
+    /// i_pMigrationService may be null: then no channel follows a change of context, and none comes back by itself.
     VActiveChannelModel(std::shared_ptr<TQL::IPostalService> i_pUiPostalService,
                         std::shared_ptr<TQL::IChannelTextProvider> i_pTextProvider,
                         std::shared_ptr<OrvanePluginInterface::IChannelMigrationService> i_pMigrationService,
@@ -60,10 +61,11 @@ public:
     /// The channels to plot, from the builder. OkButNoEffect when nothing changed.
     TQL::IResult SetChannels(ChannelList i_Channels);
 
-    /// The pinned channels of a stored plot; every row from before goes.
+    /// The pinned channels of a stored plot, as they stand now; every row from before goes.
     void Restore(const ChannelList& i_rPinned);
 
-    /// Takes the rows to another data context: a row follows through the migration service, stays, or goes.
+    /// Takes the rows to another data context, or to the same one after a notice: a row follows through the migration
+    /// service, stays, or goes. One that stays without data goes on with the channel that stands for it now, if any.
     /// i_rPresentContexts: the contexts that exist now. OkButPartial when some rows followed and some could not, the
     /// first failure when none could.
     TQL::IResult SwitchContext(const std::string& i_rNewContext, const std::set<std::string>& i_rPresentContexts);

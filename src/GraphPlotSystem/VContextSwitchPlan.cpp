@@ -61,7 +61,29 @@ void PlanMigration(const VActiveChannelData& i_rRow, const std::string& i_rConte
     io_rPlan.Changes.emplace(i_rRow.pChannel.get(), std::move(pSuccessor));
 }
 
+void PlanRenewal(const VActiveChannelData& i_rRow, const std::string& i_rContext,
+                 OrvanePluginInterface::IChannelMigrationService* i_pMigrationService, VContextSwitchPlan& io_rPlan)
+{
+    std::shared_ptr<TQL::IChannel> pAnew = FindChannelAnew(i_rRow.pChannel, i_pMigrationService);
+    if (pAnew == i_rRow.pChannel)
+        return;
+    LogDetail(__LINE__, "Found channel %1% again in context '%2%'", i_rRow.Name.toStdString(), i_rContext);
+    io_rPlan.Changes.emplace(i_rRow.pChannel.get(), std::move(pAnew));
+}
+
 } // namespace
+
+std::shared_ptr<TQL::IChannel> FindChannelAnew(const std::shared_ptr<TQL::IChannel>& i_rpChannel,
+                                               OrvanePluginInterface::IChannelMigrationService* i_pMigrationService)
+{
+    if (!i_pMigrationService || !i_rpChannel || i_rpChannel->GetOutput())
+        return i_rpChannel;
+    ChannelList same;
+    ChannelList alike; // no substitute: the operator pinned this very thing
+    const TQL::IResult result = i_pMigrationService->Migrate(i_rpChannel, FindDataContext(i_rpChannel), same, alike);
+    const bool bFound = result.IsSuccess() && !same.empty() && same.front() && same.front()->GetOutput();
+    return bFound ? same.front() : i_rpChannel;
+}
 
 TQL::IResult VContextSwitchPlan::GetResult() const
 {
@@ -79,6 +101,7 @@ VContextSwitchPlan PlanContextSwitch(const VActiveChannelRows::RowList& i_rRows,
         switch (DecideContextSwitch(context, i_rNewContext, i_rPresentContexts))
         {
         case EContextSwitchFate::Stay:
+            PlanRenewal(*rpRow, context, i_pMigrationService, plan);
             break;
         case EContextSwitchFate::Migrate:
             PlanMigration(*rpRow, context, i_rNewContext, i_pMigrationService, plan);

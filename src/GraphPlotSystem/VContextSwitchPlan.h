@@ -28,8 +28,14 @@ struct VContextSwitchPlan
     TQL::IResult GetResult() const;
 };
 
-/// Asks the migration service, which may be null, for every row that has to follow, and logs what becomes of the rows.
-/// UI thread.
+/// What stands for a channel now that has lost its data because its context was read again: the same thing there, or
+/// the same derivation of it. The channel itself while it has data, while nothing stands for it, or without a migration
+/// service. UI thread.
+std::shared_ptr<TQL::IChannel> FindChannelAnew(const std::shared_ptr<TQL::IChannel>& i_rpChannel,
+                                               OrvanePluginInterface::IChannelMigrationService* i_pMigrationService);
+
+/// Asks the migration service, which may be null, for every row that has to follow and for what stands now for a row
+/// that stays without data, and logs what becomes of the rows. UI thread.
 VContextSwitchPlan PlanContextSwitch(const VActiveChannelRows::RowList& i_rRows, const std::string& i_rNewContext,
                                      const std::set<std::string>& i_rPresentContexts,
                                      OrvanePluginInterface::IChannelMigrationService* i_pMigrationService);

@@ -14,7 +14,8 @@ class IChannel;
 namespace OrvanePluginInterface
 {
 
-/// Finds what stands for a channel in another data context: the same marker of another recording. UI thread.
+/// Finds what stands for a channel in another data context: the same marker of another recording. Asked for the context
+/// that the channel is of, it finds what stands there since the context was replaced. UI thread.
 class IChannelMigrationService
 {
 public:

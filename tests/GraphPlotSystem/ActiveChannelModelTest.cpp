@@ -234,6 +234,27 @@ TEST_F(Rows, FollowTheContext)
     });
 }
 
+TEST_F(Rows, ComeBackWhenTheirContextWasReadAgain)
+{
+    Run("set a b x y z");
+    const auto pBefore = Get("a");
+    Expect({
+        {"pinall", "a+ b+ x+ y+ z+ | pins"},
+        {"set b", "a+ b+ x+ y+ z+ | Ok changed"},
+    });
+    for (const char* pName : {"a", "x", "y", "z"})
+    {
+        Get(pName)->SetData(false);
+        Run(std::string("new ") + pName);
+    }
+    // Nothing else takes the place of the three that cannot be found.
+    Expect({{"switch Live Live", "a+ b+ x+? y+? z+? | Ok changed"}});
+    Model.Restore({pBefore, Get("b")});
+    EXPECT_EQ(RowsText(), "a+ b+") << "a stored plot of what was there before";
+    Get("a")->SetData(false); // and nothing new in its place
+    EXPECT_EQ(Run("switch Live Live"), "a+? b+ | Ok changed");
+}
+
 TEST_F(Rows, MergeWhenTwoBecomeOne)
 {
     Expect({
