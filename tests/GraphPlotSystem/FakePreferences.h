@@ -30,6 +30,7 @@ public:
     {
         return m_Changed[i_Index].Remove(i_Token) != 0 ? TQL::Result::Ok : TQL::Result::NotFound;
     }
+    std::size_t CountCallbacks(int i_Index) const { return m_Changed.at(i_Index).Count(); }
 
 private:
     std::map<int, Value> m_Values{{TraceColourSet, 0}, {EnableRotationUnwrapping, true}, {ShowPanZoomGraphic, true}};

@@ -271,6 +271,8 @@ TEST_F(SubplotManager, LateNoticesFindNobody)
     ASSERT_TRUE(pPreferences->SetValue(IGraphPlotPreferences::TraceColourSet, 1).IsSuccess());
     EXPECT_NE(pUi->Pending(), 0u);
     pManager.reset();
+    for (const int index : {IGraphPlotPreferences::TraceColourSet, IGraphPlotPreferences::ShowPanZoomGraphic})
+        EXPECT_EQ(pPreferences->CountCallbacks(index), 0u) << index << ": taken back, not left to the next notice";
     pUi->RunAll();
     EXPECT_EQ(pStorage->DataChanged()->Count(), 0u);
     EXPECT_EQ(pStorage->ColoursChanged()->Count(), 0u);
