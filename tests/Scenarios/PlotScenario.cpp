@@ -11,6 +11,7 @@
 #include "GraphPlotSystem/VOrvaneGraphPlotTime.h"
 #include "GraphPlotSystem/VSubplotManager.h"
 #include "GraphPlotSystem/VTraceDataProvider.h"
+#include "GraphPlotSystem/VViewFollower.h"
 #include "Scenarios/SmallTake.h"
 #include "Services/VChannelMigrationService.h"
 #include "Services/VChannelTypeRegistry.h"
@@ -43,6 +44,7 @@ PlotScenario::~PlotScenario()
 {
     if (m_Gl.isValid())
         m_pStorage->ReleaseTextures();
+    m_pViewFollower.reset();
     pSystem.reset();
     pUi->RunAll(); // notices for models that are gone
 }
@@ -70,6 +72,7 @@ void PlotScenario::MakeSystem()
     pTraceManager->SetSubplotWidth(400);
     pSystem = TQL::MakeShared<VExtendedGraphPlotSystem>(std::move(pContext), pTraceManager, pPlotTime,
                                                         std::move(models), pUi);
+    m_pViewFollower = TQL::MakeShared<VViewFollower>(pUi, pService, pTime, pSystem);
 }
 
 void PlotScenario::AddContext(std::shared_ptr<Channels::VChannelContext> i_pContext, int i_TimeMode)
@@ -104,8 +107,6 @@ void PlotScenario::Show(const std::string& i_rContext)
 {
     m_Shown = i_rContext;
     ASSERT_TRUE(pTime->SetCurrentSource(i_rContext)) << i_rContext;
-    (void)Rows().SwitchContext(i_rContext, pTime->GetSourceMap()->GetNames()); // the rows tell what came of it
-    pSystem->SetContext(i_rContext);
     SettleUi();
 }
 

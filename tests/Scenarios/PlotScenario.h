@@ -31,6 +31,11 @@ class VChannelTypeRegistry;
 class VTimeController;
 } // namespace Services
 
+namespace GraphPlotUI
+{
+class VViewFollower;
+}
+
 /// One plot window without its picture, in a host: the real channels, types, selection, migration and time, and all
 /// managers and models of the plot, put together as for a window. Only the queue of the user interface, the workers and
 /// the renderer are run by the test, within the functions below. What the window shows is read as text.
@@ -45,7 +50,7 @@ protected:
     void AddRecording(const std::string& i_rContext, std::shared_ptr<Recordings::VRecording> i_pRecording);
     void AddCapture(const std::string& i_rContext);
     void RemoveContext(const std::string& i_rContext);
-    /// The window goes to a context, as it does when the host chooses another.
+    /// The host chooses a context, and the window goes there as it does in the program: in the state of that view.
     void Show(const std::string& i_rContext);
     /// Selects what is meant by channels, named as in the file, of the context that is shown.
     void Select(const std::vector<std::string>& i_rNames);
@@ -106,6 +111,7 @@ private:
     std::shared_ptr<GraphPlotUI::VBaseChannelTextProvider> m_pTexts;
     std::shared_ptr<TQL::IChannelComponentControls> m_pControls;
     std::shared_ptr<TQL::ITraceDataStorage> m_pStorage;
+    std::shared_ptr<GraphPlotUI::VViewFollower> m_pViewFollower;
     std::string m_Shown; ///< name of a context
     QOffscreenSurface m_Surface;
     QOpenGLContext m_Gl;
