@@ -1,0 +1,26 @@
+# Reads Arrows.txt, which says what may include what.
+#   GRAPHPLOTS_ROOMS        the rooms to build, from the bottom up, as "folder/Room"
+#   GRAPHPLOTS_BELOW_<Room> the rooms that a room links, and so may include with all below them
+
+set(GRAPHPLOTS_ARROWS "${CMAKE_CURRENT_LIST_DIR}/Arrows.txt")
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS "${GRAPHPLOTS_ARROWS}")
+file(STRINGS "${GRAPHPLOTS_ARROWS}" lines REGEX "^[a-z]+/")
+foreach(line IN LISTS lines)
+    if(NOT line MATCHES "^([a-z]+/([A-Za-z]+))( Qt)?:(.*)$")
+        message(FATAL_ERROR "${GRAPHPLOTS_ARROWS}: not understood: ${line}")
+    endif()
+    set(path "${CMAKE_MATCH_1}")
+    set(room "${CMAKE_MATCH_2}")
+    set(qt "${CMAKE_MATCH_3}")
+    string(STRIP "${CMAKE_MATCH_4}" below)
+    string(REPLACE " " ";" below "${below}")
+    if(GRAPHPLOTS_WITH_QT OR NOT qt)
+        foreach(other IN LISTS below)
+            if(NOT DEFINED GRAPHPLOTS_BELOW_${other})
+                message(FATAL_ERROR "${GRAPHPLOTS_ARROWS}: ${room} may include ${other}, which stands in no line above it")
+            endif()
+        endforeach()
+        list(APPEND GRAPHPLOTS_ROOMS "${path}")
+        set(GRAPHPLOTS_BELOW_${room} "${below}")
+    endif()
+endforeach()
