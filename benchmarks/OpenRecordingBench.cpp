@@ -1,7 +1,7 @@
 #include "Bench.h"
-#include "Channels/VRecordedContext.h"
-#include "Channels/VSampleStore.h"
-#include "Recordings/C3dWriter.h"
+#include "Channels/Contexts/VRecordedContext.h"
+#include "Channels/Samples/VSampleStore.h"
+#include "Recordings/C3d/C3dWriter.h"
 #include "Recordings/OpenRecording.h"
 
 #include <algorithm>

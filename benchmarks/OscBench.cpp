@@ -1,7 +1,7 @@
 #include "Bench.h"
 
-#include "Channels/VLiveContext.h"
-#include "Channels/VSubTypeTable.h"
+#include "Channels/Common/VSubTypeTable.h"
+#include "Channels/Contexts/VLiveContext.h"
 #include "Streaming/VOscInput.h"
 
 #include <atomic>

@@ -1,12 +1,12 @@
 #include "Bench.h"
-#include "Channels/VSampleBlock.h"
-#include "Channels/VSampleStore.h"
+#include "Channels/Blocks/VSampleBlock.h"
+#include "Channels/Samples/VSampleStore.h"
 #include "CoreGraphics/RenderContext.h"
 #include "CoreGraphics/Resources.h"
-#include "GraphPlotSystem/TraceLevelChoice.h"
-#include "GraphPlotSystem/VTraceDataProvider.h"
+#include "GraphPlotSystem/Traces/TraceLevelChoice.h"
+#include "GraphPlotSystem/Traces/VTraceDataProvider.h"
 #include "GraphPlotUI/RegisterResources.h"
-#include "GraphPlotUI/VSubplotRenderType.h"
+#include "GraphPlotUI/Traces/VSubplotRenderType.h"
 
 #include <QtGui/QColor>
 #include <QtGui/QOffscreenSurface>

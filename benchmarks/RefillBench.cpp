@@ -1,7 +1,7 @@
 #include "Bench.h"
-#include "Channels/VSampleBlock.h"
-#include "Channels/VSampleStore.h"
-#include "GraphPlotSystem/TraceRingFill.h"
+#include "Channels/Blocks/VSampleBlock.h"
+#include "Channels/Samples/VSampleStore.h"
+#include "GraphPlotSystem/Traces/TraceRingFill.h"
 
 #include <algorithm>
 #include <cmath>

@@ -1,6 +1,6 @@
 #include "Bench.h"
 
-#include "Channels/Summary.h"
+#include "Channels/Samples/Summary.h"
 
 #include <array>
 #include <cmath>

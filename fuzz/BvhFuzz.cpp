@@ -2,7 +2,7 @@
 
 #include "RecordingChecks.h"
 
-#include "Recordings/BvhReader.h"
+#include "Recordings/Bvh/BvhReader.h"
 
 #include <cstddef>
 #include <cstdint>

@@ -2,7 +2,7 @@
 
 #include "RecordingChecks.h"
 
-#include "Recordings/C3dReader.h"
+#include "Recordings/C3d/C3dReader.h"
 
 #include <cstddef>
 #include <cstdint>

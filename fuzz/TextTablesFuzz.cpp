@@ -4,9 +4,9 @@
 
 #include "RecordingChecks.h"
 
-#include "Recordings/CsvReader.h"
-#include "Recordings/StorageTableReader.h"
-#include "Recordings/TrcReader.h"
+#include "Recordings/Tables/CsvReader.h"
+#include "Recordings/Tables/StorageTableReader.h"
+#include "Recordings/Tables/TrcReader.h"
 
 #include <cstddef>
 #include <cstdint>

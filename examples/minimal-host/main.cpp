@@ -5,17 +5,17 @@
 // With --frames it looks at what it draws and quits: status 0 when N frames were drawn, the sine was among them, and
 // the module kept the rules of its host. docs/hosting.md tells the same story in words.
 #include "ChannelSystemSelection/VChannelSelectionManager.h"
-#include "Channels/ChannelTypes.h"
+#include "Channels/Common/ChannelTypes.h"
+#include "Channels/Contexts/VRecordedContext.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VRecordedContext.h"
 #include "OrvanePluginInterface/ITimeController.h"
-#include "Services/VContextTimeFeed.h"
+#include "Services/Common/VHostSubscriptions.h"
+#include "Services/Selection/VSelectionSource.h"
+#include "Services/Time/VContextTimeFeed.h"
+#include "Services/Time/VTimeController.h"
 #include "Services/VGlobalLogSink.h"
 #include "Services/VHostServices.h"
-#include "Services/VHostSubscriptions.h"
 #include "Services/VPluginHost.h"
-#include "Services/VSelectionSource.h"
-#include "Services/VTimeController.h"
 
 #include <QtCore/QTimer>
 #include <QtQuick/QQuickWindow>

@@ -1,8 +1,8 @@
 #include "Channels/VChannelService.h"
 
-#include "Channels/VCacheChannel.h"
-#include "Channels/VDerivedChannel.h"
-#include "Channels/VOperationTable.h"
+#include "Channels/Blocks/VCacheChannel.h"
+#include "Channels/Derived/VDerivedChannel.h"
+#include "Channels/Derived/VOperationTable.h"
 #include "TQL/HashMix.h"
 
 #include <algorithm>

@@ -1,8 +1,8 @@
 #pragma once
 
 #include "ChannelSystem/IChannelService.h"
-#include "Channels/VChannelContext.h"
-#include "Channels/VSubTypeTable.h"
+#include "Channels/Common/VSubTypeTable.h"
+#include "Channels/Contexts/VChannelContext.h"
 #include "NotificationSystem/VMultiCallbackPostal.h"
 
 #include <map>

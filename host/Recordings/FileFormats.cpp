@@ -1,11 +1,11 @@
 #include "Recordings/FileFormats.h"
 
-#include "Recordings/BvhReader.h"
-#include "Recordings/C3dReader.h"
-#include "Recordings/C3dText.h"
-#include "Recordings/CsvReader.h"
-#include "Recordings/StorageTableReader.h"
-#include "Recordings/TrcReader.h"
+#include "Recordings/Bvh/BvhReader.h"
+#include "Recordings/C3d/C3dReader.h"
+#include "Recordings/Tables/CsvReader.h"
+#include "Recordings/Tables/StorageTableReader.h"
+#include "Recordings/Tables/TrcReader.h"
+#include "Recordings/Text/C3dText.h"
 
 #include <algorithm>
 #include <array>

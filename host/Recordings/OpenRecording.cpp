@@ -1,11 +1,11 @@
 #include "Recordings/OpenRecording.h"
 
-#include "Recordings/CsvReader.h"
+#include "Recordings/Common/FileMessage.h"
+#include "Recordings/Common/VReadProgress.h"
 #include "Recordings/FileFormats.h"
-#include "Recordings/FileMessage.h"
-#include "Recordings/TextScan.h"
-#include "Recordings/VFileBytes.h"
-#include "Recordings/VReadProgress.h"
+#include "Recordings/Tables/CsvReader.h"
+#include "Recordings/Text/TextScan.h"
+#include "Recordings/Text/VFileBytes.h"
 
 #include <algorithm>
 #include <cstddef>

@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Recordings/ReadOptions.h"
-#include "Recordings/VRecording.h"
+#include "Recordings/Common/ReadOptions.h"
+#include "Recordings/Common/VRecording.h"
 #include "TQL/IResult.h"
 
 #include <filesystem>

@@ -2,9 +2,9 @@
 
 #include "ChannelSystem/IChannel.h"
 #include "ChannelSystem/IChannelService.h"
+#include "Channels/Derived/VDerivedChannel.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VDerivedChannel.h"
-#include "Services/VCheckedChannels.h"
+#include "Services/Checking/VCheckedChannels.h"
 
 #include <utility>
 

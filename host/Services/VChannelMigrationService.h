@@ -1,7 +1,7 @@
 #pragma once
 
 #include "OrvanePluginInterface/IChannelMigrationService.h"
-#include "Services/VThreadCheck.h"
+#include "Services/Common/VThreadCheck.h"
 
 #include <memory>
 #include <string>

@@ -1,6 +1,6 @@
 #include "Services/VGlobalLogSink.h"
 
-#include "Services/VDeferredSignal.h"
+#include "Services/Postal/VDeferredSignal.h"
 
 #include <optional>
 

@@ -1,7 +1,7 @@
 #pragma once
 
 #include "OrvanePluginInterface/IHostCoreServices.h"
-#include "Services/VThreadCheck.h"
+#include "Services/Common/VThreadCheck.h"
 
 namespace Services
 {

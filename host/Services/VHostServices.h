@@ -2,7 +2,7 @@
 
 #include "OrvanePluginInterface/IHostCoreServices.h"
 #include "OrvanePluginInterface/IHostUiServices.h"
-#include "Services/VThreadCheck.h"
+#include "Services/Common/VThreadCheck.h"
 
 #include <chrono>
 #include <cstddef>

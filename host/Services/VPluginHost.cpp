@@ -2,14 +2,14 @@
 
 #include "CoreGraphics/Resources.h"
 #include "OrvanePluginInterface/IWorkspaceContent.h"
-#include "Services/VContentRegistry.h"
-#include "Services/VFaultList.h"
-#include "Services/VGraphicsAudit.h"
-#include "Services/VHandlerAudit.h"
+#include "Services/Checking/VGraphicsAudit.h"
+#include "Services/Checking/VHandlerAudit.h"
+#include "Services/Checking/VSubscriptionAudit.h"
+#include "Services/Common/VFaultList.h"
+#include "Services/Time/VTimeController.h"
+#include "Services/Ui/VContentRegistry.h"
+#include "Services/Ui/VQmlEngineHost.h"
 #include "Services/VHostServices.h"
-#include "Services/VQmlEngineHost.h"
-#include "Services/VSubscriptionAudit.h"
-#include "Services/VTimeController.h"
 #include "TQL/Log.h"
 
 #include <algorithm>

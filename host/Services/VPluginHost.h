@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Services/VLifeCycleCheck.h"
+#include "Services/Checking/VLifeCycleCheck.h"
 #include "Services/VModuleLibrary.h"
 
 #include <QtCore/QPointer>

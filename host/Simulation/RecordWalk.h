@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Recordings/VRecording.h"
+#include "Recordings/Common/VRecording.h"
 
 #include <cstdint>
 

@@ -1,6 +1,6 @@
 // Writes a recording of the simulated capture: graphplots-simulate OUT.c3d [--seconds N] [--subjects N] [--seed N]
 
-#include "Recordings/C3dWriter.h"
+#include "Recordings/C3d/C3dWriter.h"
 #include "Simulation/RecordWalk.h"
 #include "Simulation/VWalkSimulator.h"
 

@@ -1,6 +1,6 @@
 #include "Streaming/LiveRecording.h"
 
-#include "Channels/VChannelContext.h"
+#include "Channels/Contexts/VChannelContext.h"
 
 #include <algorithm>
 #include <limits>

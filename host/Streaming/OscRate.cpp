@@ -1,6 +1,6 @@
 #include "Streaming/OscRate.h"
 
-#include "Recordings/TimeGrid.h"
+#include "Recordings/Time/TimeGrid.h"
 
 #include <algorithm>
 

@@ -1,7 +1,7 @@
 #include "Streaming/SaveLive.h"
 
-#include "Channels/VChannelContext.h"
-#include "Recordings/C3dWriter.h"
+#include "Channels/Contexts/VChannelContext.h"
+#include "Recordings/C3d/C3dWriter.h"
 #include "Streaming/LiveRecording.h"
 
 namespace Streaming

@@ -1,7 +1,7 @@
 #include "Streaming/VOscFeed.h"
 
-#include "Channels/ChannelTypes.h"
-#include "Channels/VLiveContext.h"
+#include "Channels/Common/ChannelTypes.h"
+#include "Channels/Contexts/VLiveContext.h"
 
 #include <algorithm>
 #include <cmath>

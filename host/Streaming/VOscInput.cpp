@@ -1,8 +1,8 @@
 #include "Streaming/VOscInput.h"
 
-#include "Channels/VLiveContext.h"
-#include "Recordings/TimeGrid.h"
-#include "Recordings/VRecording.h"
+#include "Channels/Contexts/VLiveContext.h"
+#include "Recordings/Common/VRecording.h"
+#include "Recordings/Time/TimeGrid.h"
 #include "Streaming/OscRate.h"
 
 #include <cstdio>

@@ -1,6 +1,6 @@
 #include "Streaming/VReplayFeed.h"
 
-#include "Channels/VChannelNumbering.h"
+#include "Channels/Contexts/VChannelNumbering.h"
 
 #include <algorithm>
 #include <limits>

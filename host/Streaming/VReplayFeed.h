@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Channels/VLiveContext.h"
-#include "Recordings/VRecording.h"
+#include "Channels/Contexts/VLiveContext.h"
+#include "Recordings/Common/VRecording.h"
 #include "TQL/IResult.h"
 
 #include <cstddef>

@@ -1,7 +1,7 @@
 #include "Services/VGlobalLogSink.h"
-#include "Studio/CommandLine.h"
-#include "Studio/Commands.h"
-#include "Studio/QtMessages.h"
+#include "Studio/Commands/CommandLine.h"
+#include "Studio/Commands/Commands.h"
+#include "Studio/Commands/QtMessages.h"
 
 #include <QtCore/QCoreApplication>
 #include <QtQuick/QQuickWindow>

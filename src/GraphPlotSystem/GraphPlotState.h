@@ -1,8 +1,8 @@
 #pragma once
 
-#include "GraphPlotSystem/ActiveChannelState.h"
-#include "GraphPlotSystem/SubplotState.h"
-#include "GraphPlotSystem/TraceState.h"
+#include "GraphPlotSystem/Channels/ActiveChannelState.h"
+#include "GraphPlotSystem/Subplots/SubplotState.h"
+#include "GraphPlotSystem/Traces/TraceState.h"
 
 #include <memory>
 #include <vector>

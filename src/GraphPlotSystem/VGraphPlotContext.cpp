@@ -1,6 +1,6 @@
 #include "GraphPlotSystem/VGraphPlotContext.h"
 
-#include "GraphPlotSystem/ITraceDataProvider.h"
+#include "GraphPlotSystem/Traces/ITraceDataProvider.h"
 
 #include <utility>
 

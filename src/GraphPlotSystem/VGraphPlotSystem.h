@@ -1,9 +1,9 @@
 #pragma once
 
 #include "GraphPlotSystem/GraphPlotState.h"
-#include "GraphPlotSystem/VBaseGraphPlotTime.h"
+#include "GraphPlotSystem/Time/VBaseGraphPlotTime.h"
+#include "GraphPlotSystem/Traces/VTraceManager.h"
 #include "GraphPlotSystem/VGraphPlotContext.h"
-#include "GraphPlotSystem/VTraceManager.h"
 #include "TQL/IResult.h"
 
 #include <memory>

@@ -2,7 +2,7 @@
 
 #include "ChannelSystem/IChannelContext.h"
 #include "ChannelSystem/IChannelService.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
 #include "GraphPlotSystem/VExtendedGraphPlotSystem.h"
 #include "NotificationSystem/VDispatchCollapsers.h"
 #include "NotificationSystem/WeakCallback.h"

@@ -1,11 +1,11 @@
 #include "GraphPlotUI/VGraphPlotWidget.h"
 
-#include "GraphPlotSystem/VActiveChannelManager.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
-#include "GraphPlotSystem/VChannelComponentModel.h"
+#include "GraphPlotSystem/Channels/VActiveChannelManager.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
+#include "GraphPlotSystem/Subplots/VKeyModel.h"
+#include "GraphPlotSystem/Subplots/VSubplotManager.h"
+#include "GraphPlotSystem/Texts/VChannelComponentModel.h"
 #include "GraphPlotSystem/VExtendedGraphPlotSystem.h"
-#include "GraphPlotSystem/VKeyModel.h"
-#include "GraphPlotSystem/VSubplotManager.h"
 
 namespace GraphPlotUI
 {

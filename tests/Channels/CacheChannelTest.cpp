@@ -1,7 +1,7 @@
-#include "Channels/VCacheChannel.h"
+#include "Channels/Blocks/VCacheChannel.h"
+#include "Channels/Contexts/VLiveContext.h"
+#include "Channels/Contexts/VRecordedContext.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VLiveContext.h"
-#include "Channels/VRecordedContext.h"
 #include "Reference.h"
 
 #include <numbers>

@@ -1,4 +1,4 @@
-#include "Channels/VChannelNumbering.h"
+#include "Channels/Contexts/VChannelNumbering.h"
 
 #include <gtest/gtest.h>
 

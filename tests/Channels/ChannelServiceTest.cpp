@@ -1,6 +1,6 @@
+#include "Channels/Contexts/VLiveContext.h"
+#include "Channels/Contexts/VRecordedContext.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VLiveContext.h"
-#include "Channels/VRecordedContext.h"
 #include "Reference.h"
 #include "support/LogGuard.h"
 

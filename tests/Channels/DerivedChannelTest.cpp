@@ -1,8 +1,8 @@
-#include "Channels/VCacheChannel.h"
+#include "Channels/Blocks/VCacheChannel.h"
+#include "Channels/Blocks/VSampleBlock.h"
+#include "Channels/Contexts/VLiveContext.h"
+#include "Channels/Contexts/VRecordedContext.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VLiveContext.h"
-#include "Channels/VRecordedContext.h"
-#include "Channels/VSampleBlock.h"
 #include "Reference.h"
 #include "support/LogGuard.h"
 

@@ -1,5 +1,5 @@
+#include "Channels/Contexts/VLiveContext.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VLiveContext.h"
 #include "Reference.h"
 
 #include <array>

@@ -1,6 +1,6 @@
+#include "Channels/Contexts/VLiveContext.h"
+#include "Channels/Contexts/VLiveMonitors.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VLiveContext.h"
-#include "Channels/VLiveMonitors.h"
 #include "Reference.h"
 
 #include <array>

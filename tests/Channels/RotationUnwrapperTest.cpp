@@ -1,5 +1,5 @@
-#include "Channels/VRotationUnwrapper.h"
-#include "Channels/VSubTypeTable.h"
+#include "Channels/Blocks/VRotationUnwrapper.h"
+#include "Channels/Common/VSubTypeTable.h"
 #include "Reference.h"
 
 #include <array>

@@ -1,5 +1,5 @@
-#include "Channels/VSampleBlock.h"
-#include "Channels/VSampleStore.h"
+#include "Channels/Blocks/VSampleBlock.h"
+#include "Channels/Samples/VSampleStore.h"
 #include "Reference.h"
 
 #include <algorithm>

@@ -1,4 +1,4 @@
-#include "Channels/VSampleStore.h"
+#include "Channels/Samples/VSampleStore.h"
 #include "Reference.h"
 
 #include <atomic>

@@ -1,5 +1,5 @@
-#include "Channels/Summary.h"
-#include "Channels/PackedRecords.h"
+#include "Channels/Samples/Summary.h"
+#include "Channels/Samples/PackedRecords.h"
 #include "Reference.h"
 
 #include <algorithm>

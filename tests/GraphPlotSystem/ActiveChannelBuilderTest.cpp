@@ -1,6 +1,6 @@
 #include "GraphPlotSystem/ActiveChannelHost.h"
-#include "GraphPlotSystem/VActiveChannelBuilder.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
+#include "GraphPlotSystem/Channels/VActiveChannelBuilder.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
 

@@ -1,6 +1,6 @@
 #include "GraphPlotSystem/ActiveChannelHost.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
-#include "GraphPlotSystem/VActiveChannelModelFiltered.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModelFiltered.h"
 #include "support/ManualPostalService.h"
 
 #include <QtTest/QAbstractItemModelTester>

@@ -1,5 +1,5 @@
 #include "GraphPlotSystem/FakeHost.h"
-#include "GraphPlotSystem/VBaseChannelTextProvider.h"
+#include "GraphPlotSystem/Texts/VBaseChannelTextProvider.h"
 #include "TQL/ITraceId.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"

@@ -1,10 +1,10 @@
 #include "GraphPlotSystem/ChannelTypeHost.h"
-#include "GraphPlotSystem/EChannelTypeModelRoles.h"
+#include "GraphPlotSystem/Channels/EChannelTypeModelRoles.h"
+#include "GraphPlotSystem/Channels/PrimaryChannelType.h"
+#include "GraphPlotSystem/Channels/SelectionHelpTexts.h"
+#include "GraphPlotSystem/Channels/VChannelSelectionHelp.h"
+#include "GraphPlotSystem/Channels/VChannelTypeModel.h"
 #include "GraphPlotSystem/ModelJournal.h"
-#include "GraphPlotSystem/PrimaryChannelType.h"
-#include "GraphPlotSystem/SelectionHelpTexts.h"
-#include "GraphPlotSystem/VChannelSelectionHelp.h"
-#include "GraphPlotSystem/VChannelTypeModel.h"
 
 #include <gtest/gtest.h>
 

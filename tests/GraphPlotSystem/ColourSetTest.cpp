@@ -1,4 +1,4 @@
-#include "GraphPlotSystem/TracePalette.h"
+#include "GraphPlotSystem/Traces/TracePalette.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "GraphPlotSystem/IGraphPlotPreferences.h"
+#include "GraphPlotSystem/Common/IGraphPlotPreferences.h"
 #include "NotificationSystem/VMultiCallbackPostal.h"
 
 #include <map>

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "GraphPlotSystem/IChannelTextProvider.h"
+#include "GraphPlotSystem/Texts/IChannelTextProvider.h"
 #include "NotificationSystem/VMultiCallbackPostal.h"
 #include "TQL/ITraceId.h"
 

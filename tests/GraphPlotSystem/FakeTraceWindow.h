@@ -1,9 +1,9 @@
 #pragma once
 
 #include "GraphPlotSystem/FakeHost.h"
-#include "GraphPlotSystem/ITraceDataStorage.h"
-#include "GraphPlotSystem/VBaseChannelTextProvider.h"
-#include "GraphPlotSystem/VBaseGraphPlotTime.h"
+#include "GraphPlotSystem/Texts/VBaseChannelTextProvider.h"
+#include "GraphPlotSystem/Time/VBaseGraphPlotTime.h"
+#include "GraphPlotSystem/Traces/ITraceDataStorage.h"
 
 /// What stands around the updater and the manager inside one window: storage, plot time and texts.
 namespace FakeTraceWindow

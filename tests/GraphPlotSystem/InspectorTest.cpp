@@ -1,6 +1,6 @@
 #include "GraphPlotSystem/MemoryBlock.h"
 
-#include "GraphPlotSystem/VTraceInspector.h"
+#include "GraphPlotSystem/Traces/VTraceInspector.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
 #include "GraphPlotSystem/FakeHost.h"
 #include "GraphPlotSystem/SubplotFixture.h"
-#include "GraphPlotSystem/VKeyModel.h"
+#include "GraphPlotSystem/Subplots/VKeyModel.h"
 
 #include <QtGui/QColor>
 

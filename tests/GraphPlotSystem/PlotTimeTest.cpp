@@ -1,6 +1,6 @@
-#include "GraphPlotSystem/PlotTimeRules.h"
-#include "GraphPlotSystem/SharedObject.h"
-#include "GraphPlotSystem/VOrvaneGraphPlotTime.h"
+#include "GraphPlotSystem/Common/SharedObject.h"
+#include "GraphPlotSystem/Time/PlotTimeRules.h"
+#include "GraphPlotSystem/Time/VOrvaneGraphPlotTime.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
 

@@ -2,7 +2,7 @@
 #include "support/ManualPostalService.h"
 
 #include "CoreGraphics/RenderContext.h"
-#include "GraphPlotSystem/VTraceDataProvider.h"
+#include "GraphPlotSystem/Traces/VTraceDataProvider.h"
 
 #include <gtest/gtest.h>
 

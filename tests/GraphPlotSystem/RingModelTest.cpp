@@ -1,7 +1,7 @@
 #include "GraphPlotSystem/MemoryBlock.h"
 #include "GraphPlotSystem/RingText.h"
 
-#include "GraphPlotSystem/TraceRingFill.h"
+#include "GraphPlotSystem/Traces/TraceRingFill.h"
 
 #include <gtest/gtest.h>
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "GraphPlotSystem/TraceTexelRing.h"
+#include "GraphPlotSystem/Traces/TraceTexelRing.h"
 
 #include <cmath>
 #include <sstream>

@@ -1,4 +1,4 @@
-#include "GraphPlotSystem/SharedObject.h"
+#include "GraphPlotSystem/Common/SharedObject.h"
 
 #include <QtCore/QCoreApplication>
 #include <QtCore/QEvent>

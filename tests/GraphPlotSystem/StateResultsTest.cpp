@@ -1,4 +1,4 @@
-#include "GraphPlotSystem/StateResults.h"
+#include "GraphPlotSystem/Common/StateResults.h"
 
 #include <gtest/gtest.h>
 

@@ -1,13 +1,13 @@
 #pragma once
 
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
 #include "GraphPlotSystem/FakePreferences.h"
 #include "GraphPlotSystem/FakeTexts.h"
 #include "GraphPlotSystem/MemoryBlock.h"
 #include "GraphPlotSystem/ModelJournal.h"
-#include "GraphPlotSystem/TracePalette.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
-#include "GraphPlotSystem/VChannelComponentControls.h"
-#include "GraphPlotSystem/VTraceDataProvider.h"
+#include "GraphPlotSystem/Texts/VChannelComponentControls.h"
+#include "GraphPlotSystem/Traces/TracePalette.h"
+#include "GraphPlotSystem/Traces/VTraceDataProvider.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
 

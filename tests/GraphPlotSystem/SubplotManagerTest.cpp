@@ -1,11 +1,11 @@
+#include "GraphPlotSystem/Channels/VActiveChannelModelFiltered.h"
+#include "GraphPlotSystem/Common/SharedObject.h"
 #include "GraphPlotSystem/FakeTraceWindow.h"
-#include "GraphPlotSystem/SharedObject.h"
 #include "GraphPlotSystem/SubplotFixture.h"
-#include "GraphPlotSystem/VActiveChannelModelFiltered.h"
-#include "GraphPlotSystem/VSubplotManager.h"
-#include "GraphPlotSystem/VSubplotModel.h"
-#include "GraphPlotSystem/VTraceManager.h"
-#include "GraphPlotSystem/VTraceModel.h"
+#include "GraphPlotSystem/Subplots/VSubplotManager.h"
+#include "GraphPlotSystem/Subplots/VSubplotModel.h"
+#include "GraphPlotSystem/Subplots/VTraceModel.h"
+#include "GraphPlotSystem/Traces/VTraceManager.h"
 #include "IOInterfaceQt/VEnumListModel.h"
 
 #include <QtCore/QCoreApplication>

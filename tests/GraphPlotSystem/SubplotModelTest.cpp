@@ -1,8 +1,8 @@
+#include "GraphPlotSystem/Channels/VActiveChannelModelFiltered.h"
 #include "GraphPlotSystem/SubplotFixture.h"
-#include "GraphPlotSystem/VActiveChannelModelFiltered.h"
-#include "GraphPlotSystem/VSubplotData.h"
-#include "GraphPlotSystem/VSubplotModel.h"
-#include "GraphPlotSystem/VTraceModel.h"
+#include "GraphPlotSystem/Subplots/VSubplotData.h"
+#include "GraphPlotSystem/Subplots/VSubplotModel.h"
+#include "GraphPlotSystem/Subplots/VTraceModel.h"
 
 #include <QtCore/QPointF>
 

@@ -1,10 +1,10 @@
-#include "GraphPlotSystem/SubplotRules.h"
+#include "GraphPlotSystem/Subplots/SubplotRules.h"
+#include "GraphPlotSystem/Common/ModelRoleNames.h"
 #include "GraphPlotSystem/FakeTexts.h"
-#include "GraphPlotSystem/KeyRows.h"
-#include "GraphPlotSystem/ModelRoleNames.h"
-#include "GraphPlotSystem/SubplotGroups.h"
-#include "GraphPlotSystem/SubplotToolTip.h"
-#include "GraphPlotSystem/VChannelComponentControls.h"
+#include "GraphPlotSystem/Subplots/KeyRows.h"
+#include "GraphPlotSystem/Subplots/SubplotGroups.h"
+#include "GraphPlotSystem/Subplots/SubplotToolTip.h"
+#include "GraphPlotSystem/Texts/VChannelComponentControls.h"
 
 #include <gtest/gtest.h>
 

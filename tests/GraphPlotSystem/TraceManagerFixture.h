@@ -1,10 +1,10 @@
 #pragma once
 
+#include "GraphPlotSystem/Common/SharedObject.h"
 #include "GraphPlotSystem/FakePreferences.h"
 #include "GraphPlotSystem/FakeTraceWindow.h"
-#include "GraphPlotSystem/SharedObject.h"
-#include "GraphPlotSystem/VChannelComponentControls.h"
-#include "GraphPlotSystem/VTraceManager.h"
+#include "GraphPlotSystem/Texts/VChannelComponentControls.h"
+#include "GraphPlotSystem/Traces/VTraceManager.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
 

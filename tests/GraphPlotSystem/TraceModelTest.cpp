@@ -1,5 +1,5 @@
 #include "GraphPlotSystem/SubplotFixture.h"
-#include "GraphPlotSystem/VTraceModel.h"
+#include "GraphPlotSystem/Subplots/VTraceModel.h"
 
 #include <QtCore/QTimer>
 #include <QtGui/QColor>

@@ -1,5 +1,5 @@
-#include "GraphPlotSystem/TraceLevelChoice.h"
-#include "GraphPlotSystem/TraceTimeRules.h"
+#include "GraphPlotSystem/Traces/TraceLevelChoice.h"
+#include "GraphPlotSystem/Traces/TraceTimeRules.h"
 
 #include <gtest/gtest.h>
 

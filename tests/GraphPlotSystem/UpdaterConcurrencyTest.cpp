@@ -1,6 +1,6 @@
 #include "GraphPlotSystem/FakeTraceWindow.h"
-#include "GraphPlotSystem/VChannelComponentControls.h"
-#include "GraphPlotSystem/VTraceDataUpdater.h"
+#include "GraphPlotSystem/Texts/VChannelComponentControls.h"
+#include "GraphPlotSystem/Traces/VTraceDataUpdater.h"
 #include "support/LogGuard.h"
 
 #include <thread>

@@ -1,4 +1,4 @@
-#include "GraphPlotUI/AxisRange.h"
+#include "GraphPlotUI/Geometry/AxisRange.h"
 
 #include <gtest/gtest.h>
 

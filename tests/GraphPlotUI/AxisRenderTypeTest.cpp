@@ -1,5 +1,5 @@
-#include "GraphPlotUI/VTimeAxisRenderType.h"
-#include "GraphPlotUI/VValueAxisRenderType.h"
+#include "GraphPlotUI/Axes/VTimeAxisRenderType.h"
+#include "GraphPlotUI/Axes/VValueAxisRenderType.h"
 #include "PlotFixture.h"
 
 #include <gtest/gtest.h>

@@ -1,9 +1,9 @@
 #include "CoreGraphics/RenderContext.h"
 #include "CoreGraphics/Resources.h"
-#include "GraphPlotSystem/ITraceDataProvider.h"
+#include "GraphPlotSystem/Traces/ITraceDataProvider.h"
 #include "GraphPlotSystem/VGraphPlotContext.h"
-#include "GraphPlotUI/VBaseGraphRenderType.h"
-#include "GraphPlotUI/VGraphPlotFBO.h"
+#include "GraphPlotUI/Frame/VBaseGraphRenderType.h"
+#include "GraphPlotUI/Frame/VGraphPlotFBO.h"
 #include "support/LogGuard.h"
 
 #include <gtest/gtest.h>

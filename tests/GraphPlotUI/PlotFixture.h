@@ -2,8 +2,8 @@
 
 #include "CoreGraphics/RenderContext.h"
 #include "CoreGraphics/Resources.h"
+#include "GraphPlotUI/Frame/VBaseGraphRenderType.h"
 #include "GraphPlotUI/RegisterResources.h"
-#include "GraphPlotUI/VBaseGraphRenderType.h"
 #include "RingProvider.h"
 #include "support/LogGuard.h"
 

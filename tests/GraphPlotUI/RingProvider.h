@@ -2,7 +2,7 @@
 
 #include "CoreGraphics/RenderContext.h"
 #include "CoreGraphics/Texture2D.h"
-#include "GraphPlotSystem/ITraceDataProvider.h"
+#include "GraphPlotSystem/Traces/ITraceDataProvider.h"
 
 #include <cmath>
 #include <limits>

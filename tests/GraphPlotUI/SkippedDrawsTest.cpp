@@ -1,4 +1,4 @@
-#include "GraphPlotUI/VSubplotRenderType.h"
+#include "GraphPlotUI/Traces/VSubplotRenderType.h"
 #include "PlotFixture.h"
 
 #include <gtest/gtest.h>

@@ -1,4 +1,4 @@
-#include "GraphPlotUI/SubplotGeometry.h"
+#include "GraphPlotUI/Geometry/SubplotGeometry.h"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>

@@ -1,4 +1,4 @@
-#include "GraphPlotUI/VSubplotRenderType.h"
+#include "GraphPlotUI/Traces/VSubplotRenderType.h"
 #include "RingProvider.h"
 
 #include <gtest/gtest.h>

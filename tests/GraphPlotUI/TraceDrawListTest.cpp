@@ -1,4 +1,4 @@
-#include "GraphPlotUI/TraceDrawList.h"
+#include "GraphPlotUI/Traces/TraceDrawList.h"
 #include "RingProvider.h"
 
 #include <gtest/gtest.h>

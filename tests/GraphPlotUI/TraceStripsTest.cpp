@@ -1,4 +1,4 @@
-#include "GraphPlotUI/TraceStrips.h"
+#include "GraphPlotUI/Traces/TraceStrips.h"
 
 #include <gtest/gtest.h>
 

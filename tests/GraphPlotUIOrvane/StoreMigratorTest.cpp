@@ -1,4 +1,4 @@
-#include "GraphPlotUIOrvane/VGraphPlotStoreMigrator.h"
+#include "GraphPlotUIOrvane/Files/VGraphPlotStoreMigrator.h"
 #include "StoreIO/StoreDocuments.h"
 #include "StoreIO/VStoreVersionedIO.h"
 #include "StoreInterface/TypedValue.h"

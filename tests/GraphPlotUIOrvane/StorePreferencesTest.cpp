@@ -1,4 +1,4 @@
-#include "GraphPlotUIOrvane/VGraphPlotStorePreferences.h"
+#include "GraphPlotUIOrvane/Preferences/VGraphPlotStorePreferences.h"
 
 #include "Store/VStore.h"
 #include "StoreInterface/IHandlerCallback.h"

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Recordings/ByteDecoder.h"
+#include "Recordings/Text/ByteDecoder.h"
 
 #include <array>
 #include <cstddef>

@@ -1,4 +1,4 @@
-#include "Recordings/BvhReader.h"
+#include "Recordings/Bvh/BvhReader.h"
 
 #include <gtest/gtest.h>
 

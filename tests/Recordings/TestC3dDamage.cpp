@@ -1,7 +1,7 @@
 #include "C3dBuilder.h"
 #include "RecordingText.h"
 
-#include "Recordings/C3dReader.h"
+#include "Recordings/C3d/C3dReader.h"
 
 #include <gtest/gtest.h>
 

@@ -1,8 +1,8 @@
 #include "C3dBuilder.h"
 #include "RecordingText.h"
 
-#include "Recordings/C3dFrameCount.h"
-#include "Recordings/C3dReader.h"
+#include "Recordings/C3d/C3dFrameCount.h"
+#include "Recordings/C3d/C3dReader.h"
 
 #include <gtest/gtest.h>
 

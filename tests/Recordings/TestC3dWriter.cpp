@@ -1,8 +1,8 @@
 #include "RecordingText.h"
 
-#include "Recordings/C3dHeader.h"
-#include "Recordings/C3dParameters.h"
-#include "Recordings/C3dWriter.h"
+#include "Recordings/C3d/C3dHeader.h"
+#include "Recordings/C3d/C3dParameters.h"
+#include "Recordings/C3d/C3dWriter.h"
 #include "Recordings/OpenRecording.h"
 
 #include <gtest/gtest.h>

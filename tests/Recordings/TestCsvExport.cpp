@@ -1,7 +1,7 @@
 #include "RecordingText.h"
 
-#include "Recordings/CsvExport.h"
-#include "Recordings/NamePattern.h"
+#include "Recordings/Common/NamePattern.h"
+#include "Recordings/Tables/CsvExport.h"
 
 #include <gtest/gtest.h>
 

@@ -1,9 +1,9 @@
 #include "C3dBuilder.h"
 #include "RecordingText.h"
 
-#include "Recordings/C3dWriter.h"
+#include "Recordings/C3d/C3dWriter.h"
+#include "Recordings/Common/VReadProgress.h"
 #include "Recordings/OpenRecording.h"
-#include "Recordings/VReadProgress.h"
 
 #include <gtest/gtest.h>
 

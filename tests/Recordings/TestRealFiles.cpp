@@ -1,9 +1,9 @@
 #include "RecordingText.h"
 
-#include "Recordings/C3dReader.h"
-#include "Recordings/C3dWriter.h"
-#include "Recordings/CsvExport.h"
+#include "Recordings/C3d/C3dReader.h"
+#include "Recordings/C3d/C3dWriter.h"
 #include "Recordings/OpenRecording.h"
+#include "Recordings/Tables/CsvExport.h"
 
 #include <gtest/gtest.h>
 

@@ -1,11 +1,11 @@
 #include "RecordingText.h"
 
-#include "Recordings/ColumnNames.h"
-#include "Recordings/CsvReader.h"
-#include "Recordings/StorageTableReader.h"
-#include "Recordings/TextScan.h"
-#include "Recordings/TrcReader.h"
-#include "Recordings/VReadProgress.h"
+#include "Recordings/Common/VReadProgress.h"
+#include "Recordings/Tables/ColumnNames.h"
+#include "Recordings/Tables/CsvReader.h"
+#include "Recordings/Tables/StorageTableReader.h"
+#include "Recordings/Tables/TrcReader.h"
+#include "Recordings/Text/TextScan.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "Recordings/TimeGrid.h"
+#include "Recordings/Time/TimeGrid.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "GraphPlotSystem/VSubplotManager.h"
+#include "GraphPlotSystem/Subplots/VSubplotManager.h"
 #include "Scenarios/PlotScenario.h"
 #include "Scenarios/SmallTake.h"
 

@@ -1,17 +1,17 @@
 #pragma once
 
 #include "ChannelSystemSelection/VChannelSelectionManager.h"
+#include "Channels/Contexts/VRecordedContext.h"
 #include "Channels/VChannelService.h"
-#include "Channels/VRecordedContext.h"
 #include "CoreGraphics/RenderContext.h"
+#include "GraphPlotSystem/Channels/VActiveChannelManager.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
 #include "GraphPlotSystem/FakeHost.h"
 #include "GraphPlotSystem/FakePreferences.h"
 #include "GraphPlotSystem/GraphPlotState.h"
-#include "GraphPlotSystem/VActiveChannelManager.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
-#include "GraphPlotSystem/VBaseChannelTextProvider.h"
+#include "GraphPlotSystem/Texts/VBaseChannelTextProvider.h"
 #include "GraphPlotSystem/VExtendedGraphPlotSystem.h"
-#include "Services/VSelectionSource.h"
+#include "Services/Selection/VSelectionSource.h"
 #include "support/LogGuard.h"
 #include "support/ManualPostalService.h"
 

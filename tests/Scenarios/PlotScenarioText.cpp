@@ -1,15 +1,15 @@
 // What a window shows, as text.
 
 #include "ChannelSystem/IChannelBlock.h"
-#include "GraphPlotSystem/IChannelComponentControls.h"
-#include "GraphPlotSystem/ITraceDataStorage.h"
-#include "GraphPlotSystem/TracePalette.h"
-#include "GraphPlotSystem/VActiveChannelModel.h"
-#include "GraphPlotSystem/VBaseChannelTextProvider.h"
-#include "GraphPlotSystem/VKeyModel.h"
-#include "GraphPlotSystem/VSubplotManager.h"
-#include "GraphPlotSystem/VSubplotModel.h"
-#include "GraphPlotSystem/VTraceModel.h"
+#include "GraphPlotSystem/Channels/VActiveChannelModel.h"
+#include "GraphPlotSystem/Subplots/VKeyModel.h"
+#include "GraphPlotSystem/Subplots/VSubplotManager.h"
+#include "GraphPlotSystem/Subplots/VSubplotModel.h"
+#include "GraphPlotSystem/Subplots/VTraceModel.h"
+#include "GraphPlotSystem/Texts/IChannelComponentControls.h"
+#include "GraphPlotSystem/Texts/VBaseChannelTextProvider.h"
+#include "GraphPlotSystem/Traces/ITraceDataStorage.h"
+#include "GraphPlotSystem/Traces/TracePalette.h"
 #include "Scenarios/PlotScenario.h"
 
 #include <algorithm>

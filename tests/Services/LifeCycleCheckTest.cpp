@@ -1,4 +1,4 @@
-#include "Services/VLifeCycleCheck.h"
+#include "Services/Checking/VLifeCycleCheck.h"
 
 #include <gtest/gtest.h>
 

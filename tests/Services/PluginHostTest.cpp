@@ -1,11 +1,11 @@
 #include "FakeChannels.h"
-#include "Services/VContentRegistry.h"
+#include "Services/Common/VHostSubscriptions.h"
+#include "Services/Postal/VUiPostalService.h"
+#include "Services/Time/VTimeController.h"
+#include "Services/Ui/VContentRegistry.h"
+#include "Services/Ui/VQmlEngineHost.h"
 #include "Services/VHostServices.h"
-#include "Services/VHostSubscriptions.h"
 #include "Services/VPluginHost.h"
-#include "Services/VQmlEngineHost.h"
-#include "Services/VTimeController.h"
-#include "Services/VUiPostalService.h"
 #include "support/LogGuard.h"
 
 #include <gmock/gmock.h>

@@ -1,8 +1,8 @@
 #include "NotificationSystem/VAsioPostalServiceStrand.h"
 #include "NotificationSystem/VDelayedPostalService.h"
 #include "NotificationSystem/VDispatchCollapsers.h"
-#include "Services/VUiPostalService.h"
-#include "Services/VWorkerPostalService.h"
+#include "Services/Postal/VUiPostalService.h"
+#include "Services/Postal/VWorkerPostalService.h"
 #include "TQL/IMultiCallback.h"
 #include "support/LogGuard.h"
 

@@ -4,12 +4,12 @@
 #include "FakeChannels.h"
 #include "OrvanePluginInterface/IChannelMigrationService.h"
 #include "OrvanePluginInterface/ITimeController.h"
-#include "Services/HostOperations.h"
-#include "Services/VContentRegistry.h"
+#include "Services/Common/HostOperations.h"
+#include "Services/Selection/VSelectionSource.h"
+#include "Services/Time/VTimeController.h"
+#include "Services/Ui/VContentRegistry.h"
+#include "Services/Ui/VQmlEngineHost.h"
 #include "Services/VHostServices.h"
-#include "Services/VQmlEngineHost.h"
-#include "Services/VSelectionSource.h"
-#include "Services/VTimeController.h"
 #include "support/LogGuard.h"
 
 #include <gmock/gmock.h>

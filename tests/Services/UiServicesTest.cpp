@@ -1,9 +1,9 @@
 #include "OrvanePluginInterface/IQuickWidget.h"
 #include "OrvanePluginInterface/IWorkspaceContent.h"
-#include "Services/VContentRegistry.h"
-#include "Services/VQmlEngineHost.h"
-#include "Services/VQuickWidgetPersistence.h"
-#include "Services/VSelectionSource.h"
+#include "Services/Selection/VSelectionSource.h"
+#include "Services/Ui/VContentRegistry.h"
+#include "Services/Ui/VQmlEngineHost.h"
+#include "Services/Ui/VQuickWidgetPersistence.h"
 #include "support/LogGuard.h"
 
 #include <gmock/gmock.h>

@@ -1,6 +1,6 @@
 #include "Streaming/LiveRecording.h"
 #include "OscSupport.h"
-#include "Recordings/C3dReader.h"
+#include "Recordings/C3d/C3dReader.h"
 #include "Recordings/OpenRecording.h"
 #include "Streaming/SaveLive.h"
 

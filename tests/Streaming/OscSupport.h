@@ -1,7 +1,7 @@
 #pragma once
 
-#include "Channels/VLiveContext.h"
-#include "Channels/VSubTypeTable.h"
+#include "Channels/Common/VSubTypeTable.h"
+#include "Channels/Contexts/VLiveContext.h"
 #include "Streaming/VOscReceiver.h"
 
 #include <gtest/gtest.h>

@@ -1,4 +1,4 @@
-#include "Channels/VRecordedContext.h"
+#include "Channels/Contexts/VRecordedContext.h"
 #include "OscSupport.h"
 #include "Simulation/RecordWalk.h"
 #include "Simulation/VWalkSimulator.h"

@@ -1,8 +1,8 @@
-#include "Channels/VRecordedContext.h"
-#include "Channels/VSubTypeTable.h"
-#include "Recordings/CsvReader.h"
-#include "Studio/ChannelLeaves.h"
-#include "Studio/VChannelTreeModel.h"
+#include "Channels/Common/VSubTypeTable.h"
+#include "Channels/Contexts/VRecordedContext.h"
+#include "Recordings/Tables/CsvReader.h"
+#include "Studio/Tree/ChannelLeaves.h"
+#include "Studio/Tree/VChannelTreeModel.h"
 
 #include <gtest/gtest.h>
 

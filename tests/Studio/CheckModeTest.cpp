@@ -1,7 +1,7 @@
-#include "Studio/CommandLine.h"
-#include "Studio/CommandSession.h"
-#include "Studio/Commands.h"
-#include "Studio/VStudioSession.h"
+#include "Studio/Commands/CommandLine.h"
+#include "Studio/Commands/CommandSession.h"
+#include "Studio/Commands/Commands.h"
+#include "Studio/Session/VStudioSession.h"
 #include "support/LogGuard.h"
 
 #include <gtest/gtest.h>

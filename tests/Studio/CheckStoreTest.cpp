@@ -1,6 +1,6 @@
 #include "Services/VGlobalLogSink.h"
-#include "Studio/CheckStoreReport.h"
-#include "Studio/StoreFileLint.h"
+#include "Studio/StoreLint/CheckStoreReport.h"
+#include "Studio/StoreLint/StoreFileLint.h"
 
 #include <gtest/gtest.h>
 

@@ -1,4 +1,4 @@
-#include "Studio/CommandLine.h"
+#include "Studio/Commands/CommandLine.h"
 
 #include <gtest/gtest.h>
 

@@ -7,7 +7,7 @@
 #include <QtCore/QProcessEnvironment>
 #include <QtCore/QTemporaryDir>
 
-#include "Recordings/C3dWriter.h"
+#include "Recordings/C3d/C3dWriter.h"
 #include "Simulation/RecordWalk.h"
 #include "Simulation/VWalkSimulator.h"
 

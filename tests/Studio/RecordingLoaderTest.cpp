@@ -1,5 +1,5 @@
-#include "Studio/VLoadingBar.h"
-#include "Studio/VRecordingLoader.h"
+#include "Studio/Files/VLoadingBar.h"
+#include "Studio/Files/VRecordingLoader.h"
 
 #include <gtest/gtest.h>
 

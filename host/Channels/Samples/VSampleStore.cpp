@@ -1,0 +1,203 @@
+#include "Channels/Samples/VSampleStore.h"
+
+#include <algorithm>
+#include <utility>
+
+namespace Channels
+{
+
+VSampleStore::VSampleStore(std::int64_t i_Period, std::int64_t i_FirstTick, std::uint32_t i_Components)
+    : m_Period(i_Period)
+    , m_Offset(i_FirstTick - TQL::AlignDown(i_FirstTick, i_Period))
+    , m_Components(i_Components)
+    , m_Rows(i_Components)
+    , m_First(RowAtOrAfter(i_FirstTick))
+    , m_End(m_First.load())
+    , m_Token(NewToken())
+{
+}
+
+std::uint64_t VSampleStore::NewToken()
+{
+    static std::atomic<std::uint64_t> s_Last{0};
+    return s_Last.fetch_add(1, std::memory_order_relaxed) + 1;
+}
+
+std::int64_t VSampleStore::RowAtOrAfter(std::int64_t i_Tick) const
+{
+    return TQL::FloorDivide(i_Tick - m_Offset + m_Period - 1, m_Period);
+}
+
+/// Memory for the rows [i_From, i_To) and the records that they complete, while [i_First, i_End) exist.
+void VSampleStore::MakeRoom(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End)
+{
+    const bool bRows = !m_Rows.IsShared() && m_Rows.Covers(i_From, i_To);
+    if (bRows && (!m_pPyramid || m_pPyramid->Covers(i_From, i_To, i_First, i_End)))
+        return;
+    const std::unique_lock lock(m_TableMutex);
+    if (m_Rows.IsShared())
+        m_Rows.TakeOver(m_First.load(), m_End.load());
+    m_Rows.Ensure(i_From, i_To);
+    if (m_pPyramid)
+        m_pPyramid->Ensure(i_From, i_To, i_First, i_End);
+}
+
+template <typename TWrite>
+void VSampleStore::AppendRows(std::int64_t i_Rows, const TWrite& i_rWrite)
+{
+    if (i_Rows <= 0)
+        return;
+    const std::lock_guard lock(m_WriterMutex);
+    const std::int64_t first = m_First.load(std::memory_order_relaxed);
+    const std::int64_t from = m_End.load(std::memory_order_relaxed);
+    const std::int64_t to = from + i_Rows;
+    MakeRoom(from, to, first, to);
+    i_rWrite(from);
+    if (m_pPyramid)
+        m_pPyramid->Build(m_Rows, from, to, first, to);
+    m_End.store(to, std::memory_order_release);
+}
+
+void VSampleStore::Append(std::span<const float> i_Values, std::size_t i_Stride)
+{
+    const std::size_t stride = i_Stride == 0 ? m_Components : i_Stride;
+    const std::size_t rows = i_Values.size() < m_Components ? 0 : (i_Values.size() - m_Components) / stride + 1;
+    const auto count = static_cast<std::int64_t>(rows);
+    AppendRows(count, [&](std::int64_t i_Row) { m_Rows.Write(i_Row, count, i_Values.data(), stride); });
+}
+
+void VSampleStore::AppendMissing(std::int64_t i_Rows)
+{
+    AppendRows(i_Rows, [&](std::int64_t i_Row) { m_Rows.WriteMissing(i_Row, i_Rows); });
+}
+
+void VSampleStore::Prepend(std::span<const float> i_Values)
+{
+    const auto count = static_cast<std::int64_t>(i_Values.size() / m_Components);
+    if (count == 0)
+        return;
+    const std::lock_guard lock(m_WriterMutex);
+    const std::int64_t oldFirst = m_First.load(std::memory_order_relaxed);
+    const std::int64_t first = oldFirst - count;
+    const std::int64_t end = m_End.load(std::memory_order_relaxed);
+    MakeRoom(first, oldFirst, first, end);
+    const std::unique_lock table(m_TableMutex); // a border bin that readers gather becomes a record
+    m_Rows.Write(first, count, i_Values.data(), m_Components);
+    if (m_pPyramid)
+        m_pPyramid->Build(m_Rows, first, oldFirst, first, end);
+    m_First.store(first, std::memory_order_release);
+}
+
+void VSampleStore::TrimBefore(std::int64_t i_Tick)
+{
+    const std::lock_guard lock(m_WriterMutex);
+    const std::int64_t first = std::min(RowAtOrAfter(i_Tick), m_End.load(std::memory_order_relaxed));
+    if (first <= m_First.load(std::memory_order_relaxed))
+        return;
+    m_First.store(first, std::memory_order_release);
+    if (!m_Rows.CanFreeBefore(first) && !(m_pPyramid && m_pPyramid->CanFreeBefore(first)))
+        return;
+    const std::unique_lock table(m_TableMutex);
+    m_Rows.FreeBefore(first);
+    if (m_pPyramid)
+        m_pPyramid->FreeBefore(first);
+}
+
+void VSampleStore::StartAt(std::int64_t i_Tick)
+{
+    const std::lock_guard lock(m_WriterMutex);
+    const std::unique_lock table(m_TableMutex);
+    if (m_First.load(std::memory_order_relaxed) != m_End.load(std::memory_order_relaxed))
+        return;
+    const std::int64_t row = RowAtOrAfter(i_Tick);
+    m_Rows.Clear();
+    if (m_pPyramid)
+        m_pPyramid->Clear();
+    m_First.store(row, std::memory_order_release);
+    m_End.store(row, std::memory_order_release);
+}
+
+/// Empties the store and gives it a new token. Under both mutexes.
+void VSampleStore::Reset(std::int64_t i_FirstRow)
+{
+    m_Rows.Clear();
+    if (m_pPyramid)
+        m_pPyramid->Clear();
+    m_First.store(i_FirstRow, std::memory_order_release);
+    m_End.store(i_FirstRow, std::memory_order_release);
+    m_Token.store(NewToken(), std::memory_order_release);
+}
+
+TQL::IResult VSampleStore::ReplaceAll(std::int64_t i_FirstTick, std::span<const float> i_Values)
+{
+    if (!IsOnGrid(i_FirstTick))
+        return TQL::Result::InvalidArgument;
+    const std::lock_guard lock(m_WriterMutex);
+    const std::unique_lock table(m_TableMutex);
+    const std::int64_t first = RowAtOrAfter(i_FirstTick);
+    const std::int64_t end = first + static_cast<std::int64_t>(i_Values.size() / m_Components);
+    Reset(first);
+    m_Rows.Ensure(first, end);
+    m_Rows.Write(first, end - first, i_Values.data(), m_Components);
+    BuildAll(end);
+    return TQL::Result::Ok;
+}
+
+TQL::IResult VSampleStore::ReplaceShared(std::int64_t i_FirstTick, std::shared_ptr<const void> i_pOwner,
+                                         std::span<const float> i_Values)
+{
+    if (!IsOnGrid(i_FirstTick) || !i_pOwner)
+        return TQL::Result::InvalidArgument;
+    const std::lock_guard lock(m_WriterMutex);
+    const std::unique_lock table(m_TableMutex);
+    const std::int64_t first = RowAtOrAfter(i_FirstTick);
+    Reset(first);
+    m_Rows.Share(first, std::move(i_pOwner), i_Values);
+    BuildAll(first + static_cast<std::int64_t>(i_Values.size() / m_Components));
+    return TQL::Result::Ok;
+}
+
+/// Makes the rows up to i_End, which are written, visible with their records. Under both mutexes.
+void VSampleStore::BuildAll(std::int64_t i_End)
+{
+    const std::int64_t first = m_First.load(std::memory_order_relaxed);
+    if (m_pPyramid)
+    {
+        m_pPyramid->Ensure(first, i_End, first, i_End);
+        m_pPyramid->Build(m_Rows, first, i_End, first, i_End);
+    }
+    m_End.store(i_End, std::memory_order_release);
+}
+
+void VSampleStore::EnableSummaries()
+{
+    const std::lock_guard lock(m_WriterMutex);
+    if (m_pPyramid)
+        return;
+    // Readers go on meanwhile: nobody else knows the new pyramid, and rows that exist do not change.
+    auto pPyramid = std::make_unique<VSummaryPyramid>(m_Components);
+    const std::int64_t first = m_First.load(std::memory_order_relaxed);
+    const std::int64_t end = m_End.load(std::memory_order_relaxed);
+    pPyramid->Ensure(first, end, first, end);
+    pPyramid->Build(m_Rows, first, end, first, end);
+    const std::unique_lock table(m_TableMutex);
+    m_pPyramid = std::move(pPyramid);
+}
+
+std::size_t VSampleStore::ByteCount() const
+{
+    const std::shared_lock lock(m_TableMutex);
+    return m_Rows.ByteCount() + (m_pPyramid ? m_pPyramid->ByteCount() : 0);
+}
+
+std::uint64_t VSampleStore::AcquireLease(std::int64_t)
+{
+    return GetToken();
+}
+
+void VSampleStore::ReleaseLease(std::uint64_t)
+{
+    // The token only names the contents; nothing is held for the one who took it.
+}
+
+} // namespace Channels
