@@ -78,12 +78,6 @@ struct FillJob
     std::int64_t HeadOf(const RingExtent& i_rExtent) const { return std::max(i_rExtent.FirstTick, Block.First); }
 };
 
-/// Makes the ring's texels fit its source. Here only, when new rows have been read: a failed read must leave all.
-void FitTexels(TraceTexelRing& i_rRing)
-{
-    i_rRing.Texels.resize(std::size_t{i_rRing.Source.ComponentCount} * TraceTexelRing::Capacity);
-}
-
 /// Room for so many values in a scratch that keeps its size: what is read next overwrites it.
 template <typename T>
 std::span<T> Room(std::vector<T>& i_rScratch, std::size_t i_Values)
@@ -104,10 +98,15 @@ bool ReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, const TickRange& i
     return i_rJob.rBlock.ReadSummary(i_rRange, rSource.Level - 1u, Room(i_rJob.rScratch.Records, values)) >= values;
 }
 
-/// Writes the rows that were read last.
+/// Moves the first row by so many texture rows.
+void MoveStart(TraceTexelRing& i_rRing, std::int64_t i_Rows)
+{
+    i_rRing.Extent.Start = (i_rRing.Extent.Start + static_cast<std::uint32_t>(i_Rows)) & (i_rRing.Size - 1);
+}
+
+/// Writes the rows that were read last, for which there is room.
 void WriteReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t i_Rows, std::int64_t i_RowOffset)
 {
-    FitTexels(i_rRing);
     const auto values = static_cast<std::size_t>(i_Rows) * i_rRing.Source.ComponentCount;
     const auto offset = static_cast<std::uint32_t>(i_RowOffset);
     if (i_rRing.Source.Level == 0)
@@ -117,45 +116,47 @@ void WriteReadRows(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t 
 }
 
 /// Drops the rows at either end that the block no longer has or the limit forbids.
-void TrimRing(RingExtent& i_rExtent, const FillJob& i_rJob)
+void TrimRing(TraceTexelRing& i_rRing, const FillJob& i_rJob)
 {
+    RingExtent& rExtent = i_rRing.Extent;
     const std::int64_t stride = i_rJob.Stride;
     const std::int64_t first = AlignDown(i_rJob.Allowed.First, stride, i_rJob.GridOffset);
-    if (i_rExtent.FirstTick < first)
+    if (rExtent.FirstTick < first)
     {
-        const std::int64_t dropped = std::min((first - i_rExtent.FirstTick) / stride, std::int64_t{i_rExtent.RowCount});
-        i_rExtent.Start = (i_rExtent.Start + static_cast<std::uint32_t>(dropped)) & TraceTexelRing::RowMask;
-        i_rExtent.RowCount -= static_cast<std::uint32_t>(dropped);
-        i_rExtent.FirstTick += dropped * stride;
-        i_rExtent.HeadTick = i_rExtent.FirstTick;
-        i_rExtent.ValidFirstTick = i_rExtent.FirstTick;
-        i_rExtent.EndTick = std::max(i_rExtent.EndTick, i_rExtent.FirstTick);
+        const std::int64_t dropped = std::min((first - rExtent.FirstTick) / stride, std::int64_t{rExtent.RowCount});
+        MoveStart(i_rRing, dropped);
+        rExtent.RowCount -= static_cast<std::uint32_t>(dropped);
+        rExtent.FirstTick += dropped * stride;
+        rExtent.HeadTick = rExtent.FirstTick;
+        rExtent.ValidFirstTick = rExtent.FirstTick;
+        rExtent.EndTick = std::max(rExtent.EndTick, rExtent.FirstTick);
     }
     // A row that summarises ticks which the block has lost goes with them; a whole row across the limit stays.
     const std::int64_t last =
-        i_rJob.Block.Last < i_rExtent.EndTick
+        i_rJob.Block.Last < rExtent.EndTick
             ? AlignDown(std::min(i_rJob.Block.Last, i_rJob.Allowed.Last), stride, i_rJob.GridOffset)
             : AlignUp(i_rJob.Allowed.Last, stride, i_rJob.GridOffset);
-    if (i_rExtent.EndTick > last)
+    if (rExtent.EndTick > last)
     {
-        const std::int64_t kept = std::max(std::int64_t{0}, (last - i_rExtent.FirstTick) / stride);
-        i_rExtent.RowCount = static_cast<std::uint32_t>(std::min(kept, std::int64_t{i_rExtent.RowCount}));
-        i_rExtent.EndTick = i_rExtent.FirstTick + i_rExtent.RowCount * stride;
-        i_rExtent.ValidEndTick = i_rExtent.EndTick;
+        const std::int64_t kept = std::max(std::int64_t{0}, (last - rExtent.FirstTick) / stride);
+        rExtent.RowCount = static_cast<std::uint32_t>(std::min(kept, std::int64_t{rExtent.RowCount}));
+        rExtent.EndTick = rExtent.FirstTick + rExtent.RowCount * stride;
+        rExtent.ValidEndTick = rExtent.EndTick;
     }
 }
 
 /// Drops a first row that summarises other samples than the block has of it now: the block began inside that row and
 /// has got older samples since, or has lost some of them. Where the request reaches that far it is read again. False
 /// when no row is left.
-bool DropChangedHead(RingExtent& i_rExtent, const FillJob& i_rJob)
+bool DropChangedHead(TraceTexelRing& i_rRing, const FillJob& i_rJob)
 {
-    if (i_rExtent.RowCount == 0 || i_rExtent.HeadTick == i_rJob.HeadOf(i_rExtent))
+    RingExtent& rExtent = i_rRing.Extent;
+    if (rExtent.RowCount == 0 || rExtent.HeadTick == i_rJob.HeadOf(rExtent))
         return true;
-    i_rExtent.Start = (i_rExtent.Start + 1) & TraceTexelRing::RowMask;
-    --i_rExtent.RowCount;
-    i_rExtent.FirstTick += i_rJob.Stride;
-    return i_rExtent.RowCount > 0;
+    MoveStart(i_rRing, 1);
+    --rExtent.RowCount;
+    rExtent.FirstTick += i_rJob.Stride;
+    return rExtent.RowCount > 0;
 }
 
 enum class EFill
@@ -193,7 +194,8 @@ EFill Prepend(TraceTexelRing& i_rRing, const FillJob& i_rJob)
         rExtent.EndTick = rExtent.FirstTick + rExtent.RowCount * stride;
         rExtent.ValidEndTick = std::min(rExtent.ValidEndTick, rExtent.EndTick);
     }
-    rExtent.Start = (rExtent.Start - static_cast<std::uint32_t>(rows)) & TraceTexelRing::RowMask;
+    Reserve(i_rRing, rExtent.RowCount + static_cast<std::uint32_t>(rows));
+    MoveStart(i_rRing, -rows);
     rExtent.FirstTick = first;
     WriteReadRows(i_rRing, i_rJob, rows, 0);
     return EFill::Done;
@@ -207,7 +209,8 @@ bool AppendPiece(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t i_
     const std::int64_t stride = i_rJob.Stride;
     const std::int64_t first =
         i_rRing.Source.Level > 0 ? AlignDown(rExtent.EndTick, stride, i_rJob.GridOffset) : rExtent.EndTick;
-    const std::int64_t rows = std::min(i_rJob.RowsOf(first, i_rJob.Wanted.Last), i_MostRows);
+    const std::int64_t rowsToCome = i_rJob.RowsOf(first, i_rJob.Wanted.Last);
+    const std::int64_t rows = std::min(rowsToCome, i_MostRows);
     const std::int64_t last = std::min(i_rJob.Wanted.Last, first + rows * stride);
     if (!ReadRows(i_rRing, i_rJob, {first, last}))
         return false;
@@ -217,10 +220,11 @@ bool AppendPiece(TraceTexelRing& i_rRing, const FillJob& i_rJob, std::int64_t i_
         rExtent.FirstTick = first;
     else if (rExtent.EndTick < rExtent.FirstTick + rExtent.RowCount * stride)
         --rExtent.RowCount;
+    Reserve(i_rRing, static_cast<std::uint32_t>(std::min(rExtent.RowCount + rowsToCome, Capacity)));
     const std::int64_t overflow = rExtent.RowCount + rows - Capacity;
     if (overflow > 0)
     {
-        rExtent.Start = (rExtent.Start + static_cast<std::uint32_t>(overflow)) & TraceTexelRing::RowMask;
+        MoveStart(i_rRing, overflow);
         rExtent.RowCount -= static_cast<std::uint32_t>(overflow);
         rExtent.FirstTick += overflow * stride;
         rExtent.ValidFirstTick = std::max(rExtent.ValidFirstTick, rExtent.FirstTick);
@@ -257,8 +261,8 @@ EFill StartAnew(TraceTexelRing& i_rRing, const RingSource& i_rSource, const Fill
 
 EFill GoOn(TraceTexelRing& i_rRing, const FillJob& i_rJob)
 {
-    TrimRing(i_rRing.Extent, i_rJob);
-    if (!DropChangedHead(i_rRing.Extent, i_rJob))
+    TrimRing(i_rRing, i_rJob);
+    if (!DropChangedHead(i_rRing, i_rJob))
         return StartAnew(i_rRing, i_rRing.Source, i_rJob);
     const EFill prepended = Prepend(i_rRing, i_rJob);
     if (prepended == EFill::NothingRead)

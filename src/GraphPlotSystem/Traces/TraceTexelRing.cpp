@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstring>
 #include <type_traits>
+#include <utility>
 
 namespace GraphPlotUI
 {
@@ -279,8 +280,7 @@ template <typename TSource>
 void WriteSourceRows(TraceTexelRing& i_rRing, std::span<const TSource> i_Source, std::uint32_t i_RowOffset)
 {
     const std::uint32_t columns = i_rRing.Source.ComponentCount;
-    const auto count =
-        static_cast<std::uint32_t>(std::min<std::size_t>(i_Source.size() / columns, TraceTexelRing::Capacity));
+    const auto count = static_cast<std::uint32_t>(i_Source.size() / columns);
     if (count == 0)
         return;
     const bool bWasEmpty = i_rRing.Extent.RowCount == 0;
@@ -288,7 +288,7 @@ void WriteSourceRows(TraceTexelRing& i_rRing, std::span<const TSource> i_Source,
         i_rRing.Gaps.assign(columns, RingGaps{});
     PrepareColumns(i_rRing, i_RowOffset);
     const std::uint32_t first = i_rRing.TextureRow(i_RowOffset);
-    const std::uint32_t untilWrap = std::min(count, TraceTexelRing::Capacity - first);
+    const std::uint32_t untilWrap = std::min(count, i_rRing.Size - first);
     TraceTexel* const pTexels = i_rRing.Texels.data();
     WriteRun<TSource>(i_rRing, {pTexels + std::size_t{first} * columns, i_Source.data(), 0, untilWrap, i_RowOffset});
     WriteRun<TSource>(i_rRing,
@@ -300,12 +300,34 @@ void WriteSourceRows(TraceTexelRing& i_rRing, std::span<const TSource> i_Source,
     i_rRing.Extent.RowCount += count;
     UpdateValidTicks(i_rRing, i_RowOffset, count, bWasEmpty);
     if (i_RowOffset == 0 && !bWasEmpty)
-        MarkDirty(i_rRing.DirtyHead, first, RepairDistances(i_rRing, count));
+        MarkDirty(i_rRing.DirtyHead, first, RepairDistances(i_rRing, count), i_rRing.Size);
     else
-        MarkDirty(i_rRing.Dirty, first, count);
+        MarkDirty(i_rRing.Dirty, first, count, i_rRing.Size);
 }
 
 } // namespace
+
+void Reserve(TraceTexelRing& i_rRing, std::uint32_t i_Rows)
+{
+    constexpr std::uint32_t smallest = 16;
+    const std::size_t columns = i_rRing.Source.ComponentCount;
+    const bool bFits = i_rRing.Texels.size() == i_rRing.Size * columns;
+    if (bFits && i_Rows <= i_rRing.Size)
+        return;
+    const std::uint32_t size = std::bit_ceil(std::max(i_Rows, smallest));
+    std::vector<TraceTexel> texels(size * columns);
+    if (const std::uint32_t rows = bFits ? i_rRing.Extent.RowCount : 0; rows > 0)
+    {
+        const std::uint32_t untilWrap = std::min(rows, i_rRing.Size - i_rRing.Extent.Start);
+        const auto from = i_rRing.Texels.begin() + static_cast<std::ptrdiff_t>(i_rRing.Extent.Start * columns);
+        const auto wrapped = std::copy_n(from, untilWrap * columns, texels.begin());
+        std::copy_n(i_rRing.Texels.begin(), (rows - untilWrap) * columns, wrapped);
+    }
+    i_rRing.Texels = std::move(texels);
+    i_rRing.Size = size;
+    i_rRing.Extent.Start = 0;
+    MarkAllDirty(i_rRing);
+}
 
 void WriteRows(TraceTexelRing& i_rRing, std::span<const float> i_Samples, std::uint32_t i_RowOffset)
 {
@@ -317,15 +339,21 @@ void WriteRows(TraceTexelRing& i_rRing, std::span<const LodRecord> i_Records, st
     WriteSourceRows(i_rRing, i_Records, i_RowOffset);
 }
 
-void MarkDirty(DirtyRows& i_rDirty, std::uint32_t i_First, std::uint32_t i_Count)
+void MarkDirty(DirtyRows& i_rDirty, std::uint32_t i_First, std::uint32_t i_Count, std::uint32_t i_Size)
 {
     DirtyRows added{i_First, i_First + i_Count};
     if (i_Count == 0)
         return;
-    if (added.End > TraceTexelRing::Capacity)
-        added = {0, TraceTexelRing::Capacity};
+    if (added.End > i_Size)
+        added = {0, i_Size};
     i_rDirty = i_rDirty.IsEmpty() ? added
                                   : DirtyRows{std::min(i_rDirty.First, added.First), std::max(i_rDirty.End, added.End)};
+}
+
+void MarkAllDirty(TraceTexelRing& i_rRing)
+{
+    i_rRing.Dirty = {0, i_rRing.Size};
+    i_rRing.DirtyHead = {};
 }
 
 std::uint32_t LongestStep(const TraceTexelRing& i_rRing, std::uint32_t i_Component)

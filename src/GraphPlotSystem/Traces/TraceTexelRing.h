@@ -33,7 +33,7 @@ struct DirtyRows
 /// Which rows a ring holds and which ticks they cover.
 struct RingExtent
 {
-    std::uint32_t Start = 0;         ///< texture row of the first row, below 4096
+    std::uint32_t Start = 0;         ///< texture row of the first row, below the ring's size
     std::uint32_t RowCount = 0;      ///< at most 4096
     std::int64_t FirstTick = 0;      ///< of row 0, on the grid of the level
     std::int64_t EndTick = 0;        ///< exclusive; inside the last row while that row is incomplete
@@ -76,14 +76,15 @@ struct RingGaps
     std::uint32_t LongestStep = 1;                                    ///< rows from data to data
 };
 
-/// The plotted rows of one channel: a ring of 4096 rows with one texel a component, in the memory layout of the float
-/// texture that the shaders read (row-major, width = components, height = 4096). Rows are consecutive in time and join
-/// at either end only. Plain data: FillRing and WriteRows below are the rules. Owned by the trace data provider, used
-/// under its mutex; knows nothing of OpenGL.
+/// The plotted rows of one channel: a ring with one texel a component, in the memory layout of the float texture that
+/// the shaders read (row-major, width = components, height = size). It grows to what the rows need, at most 4096 of
+/// them. Rows are consecutive in time and join at either end only. Plain data: FillRing and the functions below are the
+/// rules. Owned by the trace data provider, used under its mutex; knows nothing of OpenGL.
 struct TraceTexelRing
 {
-    static constexpr std::uint32_t Capacity = 4096;
-    static constexpr std::uint32_t RowMask = Capacity - 1;
+    static constexpr std::uint32_t Capacity = 4096; ///< the most rows
+
+    std::uint32_t Size = 0; ///< rows that there is room for: a power of two, 0 before the first row
 
     RingExtent Extent;
     RingSource Source;
@@ -96,7 +97,7 @@ struct TraceTexelRing
     std::vector<RingColumn> Columns; ///< one a component
 
     /// Texture row of the i-th row.
-    std::uint32_t TextureRow(std::uint32_t i_Row) const { return (Extent.Start + i_Row) & RowMask; }
+    std::uint32_t TextureRow(std::uint32_t i_Row) const { return (Extent.Start + i_Row) & (Size - 1); }
     std::int64_t RowTick(std::uint32_t i_Row) const
     {
         return Extent.FirstTick + static_cast<std::int64_t>(i_Row) * Source.Stride();
@@ -111,17 +112,24 @@ struct TraceTexelRing
     }
 };
 
-/// Writes rows x components of interleaved samples as rows i_RowOffset and following, at most 4096 of them, and counts
-/// them to the ring. Offset 0 puts them before the rows that the ring holds: the caller has moved the ring's start and
-/// first tick back by as many rows. NaN and infinite samples are rows without data.
+/// Makes room for so many rows, at most 4096, without losing those that are held. Every row is dirty and the first
+/// stands in texture row 0 when the ring had to grow.
+void Reserve(TraceTexelRing& i_rRing, std::uint32_t i_Rows);
+
+/// Writes rows x components of interleaved samples as rows i_RowOffset and following, for which there is room, and
+/// counts them to the ring. Offset 0 puts them before the rows that the ring holds: the caller has moved the ring's
+/// start and first tick back by as many rows. NaN and infinite samples are rows without data.
 void WriteRows(TraceTexelRing& i_rRing, std::span<const float> i_Samples, std::uint32_t i_RowOffset);
 
 /// The same with one summary record a row and component.
 void WriteRows(TraceTexelRing& i_rRing, std::span<const ChannelSystem::LodRecord> i_Records, std::uint32_t i_RowOffset);
 
-/// Adds texture rows [i_First, i_First + i_Count) to the dirty ones; a run that passes the end of the ring makes every
-/// row dirty. i_First is below 4096.
-void MarkDirty(DirtyRows& i_rDirty, std::uint32_t i_First, std::uint32_t i_Count);
+/// Adds texture rows [i_First, i_First + i_Count) to the dirty ones; a run that passes the end of a ring of i_Size rows
+/// makes every row dirty. i_First is below i_Size.
+void MarkDirty(DirtyRows& i_rDirty, std::uint32_t i_First, std::uint32_t i_Count, std::uint32_t i_Size);
+
+/// Every row has to be uploaded, to a texture that has none.
+void MarkAllDirty(TraceTexelRing& i_rRing);
 
 /// The most rows that a line of the component may span, 1 where it has no gaps. May be too large, never too small.
 std::uint32_t LongestStep(const TraceTexelRing& i_rRing, std::uint32_t i_Component);

@@ -21,12 +21,12 @@ constexpr GLenum TexelFormat = GL_RGBA32F;
 bool UploadRows(TraceTexelRing& i_rRing, CoreGraphics::Texture2D& i_rTexture, CoreGraphics::RenderContext& i_rContext)
 {
     const auto width = static_cast<int>(i_rRing.Source.ComponentCount);
-    constexpr auto height = static_cast<int>(TraceTexelRing::Capacity);
+    const auto height = static_cast<int>(i_rRing.Size);
     if (!i_rTexture.Matches(TexelFormat, width, height))
     {
         if (!i_rTexture.Create(i_rContext, TexelFormat, width, height))
             return false;
-        MarkDirty(i_rRing.Dirty, 0, TraceTexelRing::Capacity);
+        MarkAllDirty(i_rRing);
     }
     for (DirtyRows* pRows : {&i_rRing.Dirty, &i_rRing.DirtyHead})
     {
@@ -57,7 +57,7 @@ void VTraceDataProvider::Upload(const IChannelInstanceId& i_rChannel, TraceRecor
     TraceTexelRing& rRing = i_rRecord.Ring;
     TraceRenderInfo& rInfo = i_rRecord.Uploaded;
     const std::uint32_t components = rRing.Source.ComponentCount;
-    if (components == 0 || !UploadRows(rRing, *i_rRecord.pTexture, i_rContext))
+    if (rRing.Size == 0 || !UploadRows(rRing, *i_rRecord.pTexture, i_rContext))
         return;
     if (i_rRecord.ColourGeneration != i_rColours.Generation() || rInfo.Colours.size() != components)
     {
@@ -71,7 +71,7 @@ void VTraceDataProvider::Upload(const IChannelInstanceId& i_rChannel, TraceRecor
     rInfo.TicksPerSample = rRing.Source.SamplePeriod;
     rInfo.SampleCount = rRing.Extent.RowCount;
     rInfo.CircularStart = rRing.Extent.Start;
-    rInfo.CircularCapacity = TraceTexelRing::Capacity;
+    rInfo.CircularCapacity = rRing.Size;
     rInfo.Level = rRing.Source.Level;
 }
 
@@ -101,7 +101,7 @@ void VTraceDataProvider::ReleaseTextures()
     for (auto& [rChannel, rRecord] : m_Records)
     {
         rRecord.pTexture->Destroy();
-        MarkDirty(rRecord.Ring.Dirty, 0, TraceTexelRing::Capacity);
+        MarkAllDirty(rRecord.Ring);
     }
 }
 
