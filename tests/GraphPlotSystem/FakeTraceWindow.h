@@ -51,6 +51,7 @@ public:
 
     void GetTicksPerFrame(std::int64_t& o_rTicks) const override { o_rTicks = TQL::DefaultFramePeriod; }
     std::int64_t GetLatestFrameIndex() const override { return 0; }
+    std::uint64_t GetRevision() const override { return 0; }
     void UpdateTextures(CoreGraphics::RenderContext&) override {}
     void ReleaseTextures() override {}
     void BindTraceTexture(TQL::IResult&, const TQL::IChannelInstanceId&, CoreGraphics::RenderContext&,

@@ -7,6 +7,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <functional>
 #include <limits>
 #include <sstream>
 #include <string>
@@ -241,6 +242,98 @@ TEST_F(Provider, RemovalWaitsForTheRenderThread)
     Update(Channel(2), block);
     EXPECT_EQ(TakeSignals(), "d") << "until the render thread has been there";
     EXPECT_EQ(TracesText(), "2.0 2.1 ");
+}
+
+TEST_F(Provider, RevisionCountsWhatAFrameShows)
+{
+    MemoryBlock block;
+    block.Append({1, 2, 3});
+    IResult result;
+    const std::vector<Colour4f> palette = {Red};
+    struct Case
+    {
+        const char* pName;
+        std::function<void()> Change;
+        bool bShown = true;
+    };
+    const auto update = [&]
+    {
+        Update(Channel(1), block);
+    };
+    const Case cases[] = {
+        {"rows", update},
+        {"no new rows", update, false},
+        {"a read that failed",
+         [&]
+         {
+             block.Append({4});
+             block.bFail = true;
+             update();
+             block.bFail = false;
+         },
+         false},
+        {"one more row", update},
+        {"another limit",
+         [&]
+         {
+             m_Provider.UpdateTrace(Channel(1), block, {0, 20}, {0, 20}, 0);
+         }},
+        {"latest frame",
+         [&]
+         {
+             m_Provider.SetLatestFrame(5);
+         }},
+        {"the same frame", [&] { m_Provider.SetLatestFrame(5); }, false},
+        {"frame period",
+         [&]
+         {
+             m_Provider.SetTicksPerFrame(10);
+         }},
+        {"palette",
+         [&]
+         {
+             m_Provider.SetPalette(palette);
+         }},
+        {"the same palette", [&] { m_Provider.SetPalette(palette); }, false},
+        {"colour",
+         [&]
+         {
+             EXPECT_EQ(Assign({Channel(1), 0}), Result::Ok);
+         }},
+        {"a second colour for it",
+         [&] {
+             EXPECT_EQ(Assign({Channel(1), 0}), Result::OkButNoEffect);
+         },
+         false},
+        {"no colours",
+         [&]
+         {
+             m_Provider.ResetColours();
+         }},
+        {"inspection", [&] { m_Provider.SetInspectionTime(1.0); }, false},
+        {"lost textures",
+         [&]
+         {
+             m_Provider.ReleaseTextures();
+         }},
+        {"removed",
+         [&]
+         {
+             m_Provider.RemoveTrace(Channel(1));
+         }},
+        {"a channel that waits for its release", update, false},
+        {"all removed",
+         [&]
+         {
+             m_Provider.Clear();
+         }},
+    };
+    for (const Case& rCase : cases)
+    {
+        const std::uint64_t before = m_Provider.GetRevision();
+        rCase.Change();
+        EXPECT_EQ(m_Provider.GetRevision() != before, rCase.bShown) << rCase.pName;
+    }
 }
 
 TEST_F(Provider, ColoursGoToTracesSmallestFirst)

@@ -21,6 +21,7 @@
 #include <QtQuickWidgets/QQuickWidget>
 
 #include <cmath>
+#include <functional>
 #include <limits>
 #include <memory>
 #include <span>
@@ -40,6 +41,7 @@ public:
 
     void GetTicksPerFrame(std::int64_t& o_rTicks) const override { o_rTicks = 1; }
     std::int64_t GetLatestFrameIndex() const override { return 0; }
+    std::uint64_t GetRevision() const override { return Revision; }
     void UpdateTextures(CoreGraphics::RenderContext&) override { m_rCalls += "update "; }
     void ReleaseTextures() override { m_rCalls += QOpenGLContext::currentContext() ? "release " : "release-blind "; }
     void BindTraceTexture(TQL::IResult&, const TQL::IChannelInstanceId&, CoreGraphics::RenderContext&,
@@ -52,6 +54,8 @@ public:
     void AssignTraceColour(TQL::IResult&, const TQL::ITraceId&) override {}
     void GetTraceColour(Colour4f&, const TQL::ITraceId&) const override {}
     void ResetColours() override {}
+
+    std::uint64_t Revision = 0;
 
 private:
     std::string& m_rCalls;
@@ -361,6 +365,90 @@ TEST_F(FboItemTest, ATypeDestroyedBetweenFramesIsNotDrawnAgain)
     EXPECT_EQ(QuarterRenderType::s_Calls, "render-second ");
     EXPECT_EQ(Pixel(image, 11, 21), "#202020");
     EXPECT_EQ(Pixel(image, 131, 108), "#00ff00");
+}
+
+TEST_F(FboItemTest, ATickAsksForAFrameWhereOneWouldShowSomethingElse)
+{
+    Load();
+    // What the clock of the scene does, and what comes of it.
+    const auto tick = [this]
+    {
+        QCoreApplication::processEvents();
+        QuarterRenderType::s_Calls.clear();
+        Fbo().updateIfChanged();
+        m_pWidget->grabFramebuffer();
+        return !QuarterRenderType::s_Calls.empty();
+    };
+    VGraphPlotContext other(m_pResources, m_pProvider);
+    auto& rFirst = Find("first");
+    const auto addRows = [this]
+    {
+        ++m_pProvider->Revision;
+    };
+    struct Case
+    {
+        const char* pName;
+        std::function<void()> Change;
+        bool bDrawn = true;
+    };
+    const Case cases[]{
+        {"context",
+         [&]
+         {
+             Fbo().SetGraphPlotContext(&m_Context);
+         }},
+        {"rows", addRows},
+        {"no frame while hidden", [&] { m_pWidget->hide(), addRows(); }, false},
+        {"seen again",
+         [&]
+         {
+             m_pWidget->show();
+         }},
+        {"no frame while minimised", [&] { m_pWidget->showMinimized(), addRows(); }, false},
+        {"seen once more",
+         [&]
+         {
+             m_pWidget->showNormal();
+         }},
+        {"rectangle",
+         [&]
+         {
+             rFirst.SetScreenRect({0, 0, 50, 40});
+         }},
+        {"the same rectangle",
+         [&] {
+             rFirst.SetScreenRect({0, 0, 50, 40});
+         },
+         false},
+        {"one of two hidden",
+         [&]
+         {
+             rFirst.setVisible(false);
+         }},
+        {"provider of a type",
+         [&]
+         {
+             rFirst.SetTraceDataProvider(m_pProvider);
+         }},
+        {"one of two gone",
+         [&]
+         {
+             delete &rFirst;
+         }},
+        {"another context",
+         [&]
+         {
+             Fbo().SetGraphPlotContext(&other);
+         }},
+        {"a frame that somebody else asked for", [&] { addRows(), Grab(); }, false},
+    };
+    for (const Case& rCase : cases)
+    {
+        rCase.Change();
+        EXPECT_EQ(tick(), rCase.bDrawn) << rCase.pName;
+        if (rCase.bDrawn)
+            EXPECT_FALSE(tick()) << rCase.pName << ", and then nothing";
+    }
 }
 
 TEST_F(FboItemTest, AnotherContextReleasesTheTexturesOfTheFormerProvider)

@@ -89,6 +89,7 @@ public:
 
     void GetTicksPerFrame(std::int64_t& o_rTicks) const override { o_rTicks = TicksPerFrame; }
     std::int64_t GetLatestFrameIndex() const override { return LatestFrame; }
+    std::uint64_t GetRevision() const override { return 0; }
 
     void UpdateTextures(CoreGraphics::RenderContext& i_rContext) override
     {

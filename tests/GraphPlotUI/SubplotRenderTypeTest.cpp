@@ -1,3 +1,4 @@
+#include "GraphPlotUI/Axes/VTimeAxisRenderType.h"
 #include "GraphPlotUI/Traces/VSubplotRenderType.h"
 #include "RingProvider.h"
 
@@ -29,6 +30,46 @@ TEST(SubplotRenderTypeTest, Defaults)
     EXPECT_TRUE(subplot.GetDrawMinorGrid() && subplot.GetDrawMajorGrid() && subplot.GetDrawZero());
     EXPECT_FALSE(subplot.GetTraceIds().isValid());
     EXPECT_FALSE(subplot.GetOverlays().isValid());
+}
+
+TEST(SubplotRenderTypeTest, EveryChangeOfWhatIsDrawnCounts)
+{
+    const std::vector<TQL::IGraphPlotOverlay> overlays(1);
+    const QVariant trace = QVariant::fromValue(TQL::ITraceId(MakeChannel("a"), 0));
+    const std::pair<const char*, QVariant> properties[]{
+        {"screenRect", QRectF(1, 2, 30, 40)},
+        {"devicePixelRatio", 2.0},
+        {"liveContext", false},
+        {"relativeTimeDisplay", false},
+        {"valueRangeX", QPointF(2, 3)},
+        {"valueRangeY", QPointF(2, 3)},
+        {"overlays", QVariant::fromValue(overlays)},
+        {"traceIds", QVariantList{trace}},
+        {"gapOpacity", 0.25f},
+        {"backgroundColor", QColor(Qt::red)},
+        {"drawMinorGrid", false},
+        {"drawMajorGrid", false},
+        {"drawZero", false},
+        {"visible", false},
+    };
+    VSubplotRenderType subplot;
+    VTimeAxisRenderType axis;
+    const auto counts = [](VBaseGraphRenderType& i_rType, const auto& i_rChange)
+    {
+        const std::uint64_t before = i_rType.GetRevision();
+        i_rChange();
+        return i_rType.GetRevision() != before;
+    };
+    for (const auto& [pName, value] : properties)
+        EXPECT_TRUE(counts(subplot, [&] { ASSERT_TRUE(subplot.setProperty(pName, value)); })) << pName;
+    EXPECT_TRUE(counts(subplot, [&] { subplot.setFocusChannelOrTraceId(trace); }));
+    EXPECT_TRUE(counts(axis, [&] { axis.SetValueRange({2, 3}); }));
+    EXPECT_TRUE(counts(axis, [&] { axis.SetMajorTickLength(20); }));
+    EXPECT_TRUE(counts(axis, [&] { axis.SetTicksOnFarEdge(false); }));
+    const QMetaObject* pMeta = subplot.metaObject();
+    EXPECT_EQ(static_cast<std::size_t>(pMeta->propertyCount() - QQuickItem::staticMetaObject.propertyCount()),
+              std::size(properties) - 1)
+        << "a new property belongs into the list";
 }
 
 TEST(SubplotRenderTypeTest, RangesRefuseWhatIsNoRange)

@@ -24,6 +24,10 @@ public:
     virtual void GetTicksPerFrame(std::int64_t& o_rTicks) const = 0;
     virtual std::int64_t GetLatestFrameIndex() const = 0;
 
+    /// Counts every change of what a frame shows: rows, colours, the clock, traces that wait for their release. A frame
+    /// whose UpdateTextures comes after this shows at least what was counted.
+    virtual std::uint64_t GetRevision() const = 0;
+
     /// Once a frame, before anything draws: uploads the rows that changed and releases what was removed.
     virtual void UpdateTextures(CoreGraphics::RenderContext& i_rContext) = 0;
 

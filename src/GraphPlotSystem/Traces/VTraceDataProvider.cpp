@@ -36,13 +36,15 @@ std::int64_t VTraceDataProvider::GetLatestFrameIndex() const
 void VTraceDataProvider::SetTicksPerFrame(std::int64_t i_Ticks)
 {
     const std::lock_guard lock(m_Mutex);
-    m_TicksPerFrame = i_Ticks;
+    if (std::exchange(m_TicksPerFrame, i_Ticks) != i_Ticks)
+        ++m_Revision;
 }
 
 void VTraceDataProvider::SetLatestFrame(std::int64_t i_Frame)
 {
     const std::lock_guard lock(m_Mutex);
-    m_LatestFrame = i_Frame;
+    if (std::exchange(m_LatestFrame, i_Frame) != i_Frame)
+        ++m_Revision;
 }
 
 void VTraceDataProvider::UpdateTrace(const IChannelInstanceId& i_rChannel, const ChannelSystem::IChannelBlock& i_rBlock,
@@ -58,7 +60,11 @@ void VTraceDataProvider::UpdateTrace(const IChannelInstanceId& i_rChannel, const
         TQL::TickRange available;
         i_rBlock.GetRange(available);
         change = UpdateValueTable(m_Values[i_rChannel], i_rChannel, i_rBlock, available);
+        const RingExtent extent = rRecord.Ring.Extent;
+        const RingSource source = rRecord.Ring.Source;
         UpdateRing(rRecord.Ring, m_Scratch, i_rBlock, available, i_rRequested, i_rLimit, i_Level);
+        if (extent != rRecord.Ring.Extent || source != rRecord.Ring.Source)
+            ++m_Revision;
     }
     if (change.bComponentAdded)
         m_pDataChanged->Invoke();
@@ -68,6 +74,7 @@ void VTraceDataProvider::UpdateTrace(const IChannelInstanceId& i_rChannel, const
 
 void VTraceDataProvider::ForgetChannelLocked(const IChannelInstanceId& i_rChannel)
 {
+    ++m_Revision;
     m_Colours.Release(i_rChannel);
     const auto [first, last] = m_Inspectors.equal_range(i_rChannel);
     m_Inspectors.erase(first, last);
@@ -120,6 +127,7 @@ void VTraceDataProvider::Clear()
         const std::lock_guard lock(m_Mutex);
         for (auto& [rChannel, rRecord] : m_Records)
             rRecord.bDeleted = true;
+        ++m_Revision;
         m_Values.clear();
         m_Colours.Reset();
         m_Inspectors.clear();

@@ -9,6 +9,7 @@
 #include "NotificationSystem/VMultiCallbackPostal.h"
 #include "TQL/ITick.h"
 
+#include <atomic>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -37,6 +38,7 @@ public:
 
     void GetTicksPerFrame(std::int64_t& o_rTicks) const override;
     std::int64_t GetLatestFrameIndex() const override;
+    std::uint64_t GetRevision() const override { return m_Revision; }
     void UpdateTextures(CoreGraphics::RenderContext& i_rContext) override;
     void ReleaseTextures() override;
     void BindTraceTexture(TQL::IResult& o_rResult, const TQL::IChannelInstanceId& i_rChannel,
@@ -105,7 +107,7 @@ private:
 
     using RecordMap = std::map<TQL::IChannelInstanceId, TraceRecord>;
 
-    static void Upload(const TQL::IChannelInstanceId& i_rChannel, TraceRecord& i_rRecord,
+    static bool Upload(const TQL::IChannelInstanceId& i_rChannel, TraceRecord& i_rRecord,
                        const TraceColours& i_rColours, CoreGraphics::RenderContext& i_rContext);
     void ForgetChannelLocked(const TQL::IChannelInstanceId& i_rChannel);
 
@@ -122,6 +124,7 @@ private:
     std::map<TQL::ITraceId, VTraceInspector, TraceOrder> m_Inspectors;
     std::int64_t m_InspectionOffset = 0; ///< ticks
     std::vector<float> m_InspectionScratch;
+    std::atomic<std::uint64_t> m_Revision{0}; ///< counted under m_Mutex, with the change
 
     const std::shared_ptr<NotificationSystem::VChangeSignal> m_pDataChanged;
     const std::shared_ptr<NotificationSystem::VChangeSignal> m_pValueRangeChanged;

@@ -20,6 +20,7 @@ void VTraceDataProvider::SetPalette(std::span<const Colour4f> i_Colours)
         const std::lock_guard lock(m_Mutex);
         if (!m_Colours.SetPalette(i_Colours))
             return;
+        ++m_Revision;
     }
     m_pColoursChanged->Invoke();
 }
@@ -29,6 +30,7 @@ void VTraceDataProvider::ResetColours()
     {
         const std::lock_guard lock(m_Mutex);
         m_Colours.Reset();
+        ++m_Revision;
     }
     m_pColoursChanged->Invoke();
 }
@@ -39,6 +41,8 @@ void VTraceDataProvider::AssignChannelColour(IResult& o_rResult, const ITraceId&
     {
         const std::lock_guard lock(m_Mutex);
         o_rResult = m_Colours.AssignChannel(i_rTrace, i_ComponentCount);
+        if (o_rResult == Result::Ok)
+            ++m_Revision;
     }
     if (o_rResult == Result::Ok)
         m_pColoursChanged->Invoke();

@@ -51,14 +51,17 @@ VTraceDataProvider::TraceRecord::TraceRecord() : pTexture(std::make_unique<CoreG
 
 VTraceDataProvider::TraceRecord::~TraceRecord() = default;
 
-void VTraceDataProvider::Upload(const IChannelInstanceId& i_rChannel, TraceRecord& i_rRecord,
+/// False when there was no texture to be had.
+bool VTraceDataProvider::Upload(const IChannelInstanceId& i_rChannel, TraceRecord& i_rRecord,
                                 const TraceColours& i_rColours, CoreGraphics::RenderContext& i_rContext)
 {
     TraceTexelRing& rRing = i_rRecord.Ring;
     TraceRenderInfo& rInfo = i_rRecord.Uploaded;
     const std::uint32_t components = rRing.Source.ComponentCount;
-    if (rRing.Size == 0 || !UploadRows(rRing, *i_rRecord.pTexture, i_rContext))
-        return;
+    if (rRing.Size == 0)
+        return true;
+    if (!UploadRows(rRing, *i_rRecord.pTexture, i_rContext))
+        return false;
     if (i_rRecord.ColourGeneration != i_rColours.Generation() || rInfo.Colours.size() != components)
     {
         CopyColours(i_rChannel, components, i_rColours, rInfo.Colours);
@@ -73,6 +76,7 @@ void VTraceDataProvider::Upload(const IChannelInstanceId& i_rChannel, TraceRecor
     rInfo.CircularStart = rRing.Extent.Start;
     rInfo.CircularCapacity = rRing.Size;
     rInfo.Level = rRing.Source.Level;
+    return true;
 }
 
 void VTraceDataProvider::UpdateTextures(CoreGraphics::RenderContext& i_rContext)
@@ -86,7 +90,8 @@ void VTraceDataProvider::UpdateTextures(CoreGraphics::RenderContext& i_rContext)
             it = m_Records.erase(it);
         else
         {
-            Upload(it->first, it->second, m_Colours, i_rContext);
+            if (!Upload(it->first, it->second, m_Colours, i_rContext))
+                ++m_Revision; // the next frame tries again
             ++it;
         }
         lock.unlock();
@@ -98,6 +103,7 @@ void VTraceDataProvider::ReleaseTextures()
 {
     const std::lock_guard renderLock(m_RenderMutex);
     const std::lock_guard lock(m_Mutex);
+    ++m_Revision;
     for (auto& [rChannel, rRecord] : m_Records)
     {
         rRecord.pTexture->Destroy();

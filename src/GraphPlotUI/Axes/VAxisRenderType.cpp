@@ -90,6 +90,7 @@ void VAxisRenderType::AppendAxisLine(double i_First, double i_Last, VertexList& 
 void VAxisRenderType::SetTicks(VertexList i_Vertices)
 {
     m_Ticks.Set(std::move(i_Vertices));
+    MarkChanged();
 }
 
 void VAxisRenderType::SetPixelLength(double i_ScaledLength)

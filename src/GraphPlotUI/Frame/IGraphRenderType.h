@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstdint>
 #include <functional>
 #include <memory>
 
@@ -23,6 +24,9 @@ public:
 
     /// Stored, and called with this object when it is destroyed; an empty function forgets the former. GUI thread.
     virtual void SetDestroyedCallback(DestroyedCallback i_Callback) = 0;
+
+    /// Counts every change of this object that Render shows. GUI thread.
+    virtual std::uint64_t GetRevision() const = 0;
 
     /// The three below: render thread, OpenGL context current. Initialise comes once, before the first Render.
     virtual bool IsInitialised() const = 0;

@@ -26,7 +26,10 @@ bool IsSameRect(const QRectF& i_rA, const QRectF& i_rB)
 
 } // namespace
 
-VBaseGraphRenderType::VBaseGraphRenderType(QQuickItem* i_pParent) : QQuickItem(i_pParent) {}
+VBaseGraphRenderType::VBaseGraphRenderType(QQuickItem* i_pParent) : QQuickItem(i_pParent)
+{
+    connect(this, &QQuickItem::visibleChanged, this, &VBaseGraphRenderType::MarkChanged);
+}
 
 VBaseGraphRenderType::~VBaseGraphRenderType()
 {
@@ -66,6 +69,7 @@ void VBaseGraphRenderType::UpdateScaledRect()
     m_ScaledRect = QRectF(m_ScreenRect.topLeft() * m_DevicePixelRatio, m_ScreenRect.size() * m_DevicePixelRatio);
     m_Projection.setToIdentity();
     m_Projection.ortho(QRectF(0.0, 0.0, m_ScaledRect.width(), m_ScaledRect.height()));
+    MarkChanged();
     Q_EMIT ScreenRectChanged();
 }
 
@@ -74,6 +78,7 @@ void VBaseGraphRenderType::SetLiveContext(bool i_bLive)
     if (m_bLiveContext == i_bLive)
         return;
     m_bLiveContext = i_bLive;
+    MarkChanged();
     Q_EMIT LiveContextChanged();
 }
 
@@ -82,12 +87,14 @@ void VBaseGraphRenderType::SetRelativeTimeDisplay(bool i_bRelative)
     if (m_bRelativeTimeDisplay == i_bRelative)
         return;
     m_bRelativeTimeDisplay = i_bRelative;
+    MarkChanged();
     Q_EMIT RelativeTimeDisplayChanged();
 }
 
 void VBaseGraphRenderType::SetTraceDataProvider(std::weak_ptr<TQL::ITraceDataProvider> i_pProvider)
 {
     m_pTraceDataProvider = std::move(i_pProvider);
+    MarkChanged();
 }
 
 } // namespace GraphPlotUI

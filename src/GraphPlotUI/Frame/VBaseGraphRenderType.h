@@ -35,6 +35,7 @@ public:
     ~VBaseGraphRenderType() override;
 
     void SetDestroyedCallback(DestroyedCallback i_Callback) override;
+    std::uint64_t GetRevision() const override { return m_Revision; }
     bool IsInitialised() const override { return m_bInitialised; }
     /// Sets the flag. A class that draws overrides it, makes its OpenGL objects and calls this one.
     void Initialise(std::shared_ptr<CoreGraphics::Resources> i_pResources) override;
@@ -66,6 +67,8 @@ Q_SIGNALS:
     void VisibleChanged();
 
 protected:
+    /// To be called with every change that Render shows: without it, no frame is drawn.
+    void MarkChanged() { ++m_Revision; }
     /// Maps (0, 0) to the lower left and (scaled width, scaled height) to the upper right corner of the scaled
     /// rectangle as it is seen: values grow upwards, while viewports count downwards as items do.
     const QMatrix4x4& GetProjection() const { return m_Projection; }
@@ -81,6 +84,7 @@ private:
     QRectF m_ScaledRect{0.0, 0.0, 1.0, 1.0};
     QMatrix4x4 m_Projection;
     double m_DevicePixelRatio = 1.0;
+    std::uint64_t m_Revision = 0;
     bool m_bInitialised = false;
     bool m_bLiveContext = true;
     bool m_bRelativeTimeDisplay = true;

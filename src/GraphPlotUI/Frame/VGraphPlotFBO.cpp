@@ -1,9 +1,13 @@
 #include "GraphPlotUI/Frame/VGraphPlotFBO.h"
 
 #include "CoreGraphics/RenderContext.h"
+#include "GraphPlotSystem/ITraceDataProvider.h"
 #include "GraphPlotSystem/VGraphPlotContext.h"
 #include "GraphPlotUI/Frame/VBaseGraphRenderType.h"
 #include "GraphPlotUI/Frame/VGraphPlotFBORenderer.h"
+
+#include <QtQuick/QQuickRenderControl>
+#include <QtQuick/QQuickWindow>
 
 #include <algorithm>
 #include <memory>
@@ -68,6 +72,32 @@ void VGraphPlotFBO::RemoveRenderType(IGraphRenderType* i_pRenderType)
         return;
     m_RenderTypes.erase(found);
     ++m_Generation;
+}
+
+void VGraphPlotFBO::updateIfChanged()
+{
+    if (IsSeen() && FindContents() != m_Shown)
+        update();
+}
+
+VGraphPlotFBO::Contents VGraphPlotFBO::FindContents() const
+{
+    Contents contents{m_pContext, m_Generation};
+    for (const IGraphRenderType* pRenderType : m_RenderTypes)
+        contents.RenderTypes += pRenderType->GetRevision();
+    if (const auto pProvider = m_pContext ? m_pContext->GetTraceDataProvider() : nullptr)
+        contents.Data = pProvider->GetRevision();
+    return contents;
+}
+
+bool VGraphPlotFBO::IsSeen() const
+{
+    if (!isVisible() || window() == nullptr || !window()->isVisible())
+        return false;
+    // The scene of a widget has a window of its own that is never on the screen; the widget's window is.
+    const QWindow* pOuter = QQuickRenderControl::renderWindowFor(window());
+    const QWindow* pWindow = pOuter != nullptr ? pOuter : window();
+    return pWindow->isExposed() && !pWindow->windowStates().testFlag(Qt::WindowMinimized);
 }
 
 QSGNode* VGraphPlotFBO::updatePaintNode(QSGNode* i_pNode, UpdatePaintNodeData* i_pData)

@@ -41,9 +41,10 @@ QOpenGLFramebufferObject* VGraphPlotFBORenderer::createFramebufferObject(const Q
 
 void VGraphPlotFBORenderer::synchronize(QQuickFramebufferObject* i_pItem)
 {
-    const auto* pItem = static_cast<VGraphPlotFBO*>(i_pItem);
+    auto* pItem = static_cast<VGraphPlotFBO*>(i_pItem);
     if (pItem == nullptr)
         return;
+    pItem->NoteFrame();
     if (m_Generation != pItem->GetGeneration())
     {
         m_RenderTypes = pItem->GetRenderTypes();

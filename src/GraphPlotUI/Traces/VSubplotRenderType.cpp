@@ -81,6 +81,7 @@ void VSubplotRenderType::SetOverlays(const QVariant& i_rOverlays)
     if (m_Overlays == i_rOverlays)
         return;
     m_Overlays = i_rOverlays;
+    MarkChanged();
     using Records = std::vector<TQL::IGraphPlotOverlay>;
     if (i_rOverlays.canConvert<Records>())
     {
@@ -114,6 +115,7 @@ void VSubplotRenderType::SetGapOpacity(float i_Opacity)
     if (m_GapOpacity == i_Opacity)
         return;
     m_GapOpacity = i_Opacity;
+    MarkChanged();
     Q_EMIT GapOpacityChanged();
 }
 
@@ -127,6 +129,7 @@ void VSubplotRenderType::SetBackgroundColor(const QColor& i_rColour)
 {
     m_BackgroundColour = QVector4D(static_cast<float>(i_rColour.redF()), static_cast<float>(i_rColour.greenF()),
                                    static_cast<float>(i_rColour.blueF()), static_cast<float>(i_rColour.alphaF()));
+    MarkChanged();
     Q_EMIT BackgroundColorChanged();
 }
 
@@ -135,11 +138,13 @@ void VSubplotRenderType::SetGridProperty(bool& o_rProperty, bool i_bValue)
     if (o_rProperty == i_bValue)
         return;
     o_rProperty = i_bValue;
+    MarkChanged();
     Q_EMIT GridPropertyChanged();
 }
 
 void VSubplotRenderType::setFocusChannelOrTraceId(const QVariant& i_rChannelOrTraceId)
 {
+    MarkChanged();
     m_Focus = {};
     if (i_rChannelOrTraceId.canConvert<TQL::IChannelInstanceId>())
         m_Focus.Channel = i_rChannelOrTraceId.value<TQL::IChannelInstanceId>();
@@ -156,6 +161,7 @@ void VSubplotRenderType::OnScreenRectChanged()
 
 void VSubplotRenderType::RebuildGeometry()
 {
+    MarkChanged();
     m_View = SubplotViewMatrix(m_RangeX, m_RangeY);
     m_Background.Set(BackgroundStrip(m_RangeX, m_RangeY));
     m_ZeroLineX.Set(ZeroLineStripX(m_RangeX, m_RangeY));

@@ -71,11 +71,19 @@ public:
 
     /// Whether draws that cannot touch a pixel are left out; the picture is the same either way. On by default, off to
     /// compare the two.
-    void SetSkipInvisibleDraws(bool i_bSkip) { m_bSkipInvisibleDraws = i_bSkip; }
+    void SetSkipInvisibleDraws(bool i_bSkip)
+    {
+        m_bSkipInvisibleDraws = i_bSkip;
+        MarkChanged();
+    }
 
     /// Whether a software renderer gets strips instead of single rows where rows stand close together; the picture is
     /// the same but for rounding. On by default, off to compare the two.
-    void SetMergeDenseRows(bool i_bMerge) { m_bMergeDenseRows = i_bMerge; }
+    void SetMergeDenseRows(bool i_bMerge)
+    {
+        m_bMergeDenseRows = i_bMerge;
+        MarkChanged();
+    }
 
 Q_SIGNALS:
     void ValueRangeXChanged();

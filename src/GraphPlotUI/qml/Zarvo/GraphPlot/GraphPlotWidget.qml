@@ -2,7 +2,7 @@ import QtQuick
 import Zarvo.GraphPlot 1.0
 
 // The scene of one graph window: the channel bar above, the key at the right, and between them one framebuffer item in
-// which all drawing is done, redrawn by its own clock.
+// which all drawing is done, redrawn by its own clock where anything has changed.
 Item {
     id: root
 
@@ -63,9 +63,9 @@ Item {
         running: true
         repeat: true
         interval: {
-            graphPlotFbo.update()
+            graphPlotFbo.updateIfChanged()
             return contextTraceManager.displayUpdatePeriodMillis
         }
-        onTriggered: graphPlotFbo.update()
+        onTriggered: graphPlotFbo.updateIfChanged()
     }
 }
