@@ -36,7 +36,7 @@ inline constexpr std::string_view ColumnText = "Column";
 inline constexpr std::string_view GlobalContextName = "GlobalItems";
 
 /// The unit of lengths whose recording tells none: no other converts into it, and rates of them are "units/s".
-inline constexpr std::string_view LengthWithoutUnit = Recordings::LengthWithoutUnit;
+inline constexpr std::string_view LengthWithoutUnit = "units";
 
 /// How the unit of a channel falls on its components.
 enum class EUnitUse

@@ -20,6 +20,8 @@ ChannelDefinition VChannelNumbering::Define(const Recordings::RecordedChannel& i
     definition.TypeName = ChannelTypeOf(i_rChannel.Kind).Name;
     definition.Name = i_rChannel.Name;
     definition.Units = i_rChannel.Units;
+    if (definition.Units.empty() && i_rChannel.Quantity == Recordings::LengthQuantity)
+        definition.Units = LengthWithoutUnit;
     definition.ComponentNames = i_rChannel.ComponentNames;
     definition.RotationOrder = i_rChannel.RotationOrder;
     definition.bCountsRows = i_rChannel.bCountsRows;

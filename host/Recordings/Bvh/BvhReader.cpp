@@ -115,11 +115,10 @@ public:
             names.push_back(rJoint.Name);
         m_Names = UniqueLabels(std::move(names), i_rHierarchy.Joints.size(), "Joint");
         AddWritten(EChannelKind::JointAngles, IsRotation, "", "deg");
-        AddWritten(EChannelKind::Column, IsPosition, " position", LengthWithoutUnit);
+        AddWritten(EChannelKind::Column, IsPosition, " position", "");
         m_FirstPose = m_rRecording.Channels.size();
         for (const std::size_t joint : m_Poses.GetJoints())
-            Add(EChannelKind::SegmentPose, m_Names[joint], LengthWithoutUnit).ComponentNames = {"RX", "RY", "RZ",
-                                                                                                "TX", "TY", "TZ"};
+            Add(EChannelKind::SegmentPose, m_Names[joint], "").ComponentNames = {"RX", "RY", "RZ", "TX", "TY", "TZ"};
         for (RecordedChannel& rChannel : m_rRecording.Channels)
             rChannel.Samples.reserve(i_ExpectedFrames * rChannel.ComponentCount());
         m_Row.resize(m_Poses.GetJoints().size() * VBvhPoses::ComponentCount);
@@ -142,29 +141,30 @@ public:
     std::uint64_t GetFrameCount() const { return m_Frames; }
 
 private:
-    RecordedChannel& Add(EChannelKind i_Kind, std::string i_Name, std::string_view i_Units)
+    RecordedChannel& Add(EChannelKind i_Kind, std::string i_Name, std::string i_Units)
     {
         RecordedChannel& rChannel = m_rRecording.Channels.emplace_back();
         rChannel.Kind = i_Kind;
         rChannel.Name = std::move(i_Name);
-        rChannel.Units = i_Units;
+        rChannel.Units = std::move(i_Units);
         rChannel.Rate = m_Rate;
         rChannel.SamplePeriod = PeriodOfRate(m_Rate);
         return rChannel;
     }
 
     /// A channel for each joint that has columns of that sort, as they are written.
-    void AddWritten(EChannelKind i_Kind, bool (*i_pIsOfSort)(EBvhChannel), const char* i_pSuffix,
-                    std::string_view i_Units)
+    void AddWritten(EChannelKind i_Kind, bool (*i_pIsOfSort)(EBvhChannel), const char* i_pSuffix, const char* i_pUnits)
     {
         for (std::size_t joint = 0; joint < m_rHierarchy.Joints.size(); ++joint)
         {
             const BvhJoint& rJoint = m_rHierarchy.Joints[joint];
             if (std::ranges::none_of(rJoint.Channels, i_pIsOfSort))
                 continue;
-            RecordedChannel& rChannel = Add(i_Kind, m_Names[joint] + i_pSuffix, i_Units);
+            RecordedChannel& rChannel = Add(i_Kind, m_Names[joint] + i_pSuffix, i_pUnits);
             if (i_Kind == EChannelKind::JointAngles)
                 rChannel.RotationOrder = RotationOrderOf(rJoint);
+            else
+                rChannel.Quantity = LengthQuantity;
             for (std::size_t i = 0; i < rJoint.Channels.size(); ++i)
                 if (i_pIsOfSort(rJoint.Channels[i]))
                 {

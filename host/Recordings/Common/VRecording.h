@@ -11,8 +11,8 @@
 namespace Recordings
 {
 
-/// The unit of lengths in files whose format knows none.
-inline constexpr std::string_view LengthWithoutUnit = "units";
+/// The quantity of columns that are lengths, whatever their unit.
+inline constexpr std::string_view LengthQuantity = "Length";
 
 enum class EChannelKind
 {
@@ -31,14 +31,14 @@ struct RecordedChannel
     std::string Name;    ///< as in the file; one that comes again in the file gets "#2", "#3" behind it
     std::string Subject; ///< the part of the label before the colon, or empty
     std::vector<std::string> ComponentNames; ///< {""} for a channel with one unnamed component
-    std::string Units;                       ///< "mm", "V" as in the file; lengths of a BVH "units"; empty: none
+    std::string Units;                       ///< as in the file: "mm", "m", "V"; empty when the file has none
     double Rate = 0.0;                       ///< samples a second
     std::int64_t SamplePeriod = TQL::DefaultFramePeriod; ///< ticks, nearest to the rate
     std::int64_t FirstTick = 0; ///< of the first row; row i stands at FirstTick + i x SamplePeriod
     std::vector<float> Samples;
     std::string RotationOrder = {}; ///< of joint angles: the axes in the order of the components, "ZXY"; empty: unknown
     bool bCountsRows = false;       ///< a column that says when or which row: a time or a number of a frame
-    std::string Quantity = {};      ///< of a model output: "Angle", "Force", "Moment", "Power", "Scalar", "Reaction"
+    std::string Quantity = {};      ///< of a model output: "Angle", "Force", "Moment" and so on; of a column: "Length"
 
     std::size_t ComponentCount() const { return ComponentNames.size(); }
     std::size_t RowCount() const { return ComponentNames.empty() ? 0 : Samples.size() / ComponentNames.size(); }
