@@ -214,7 +214,7 @@ TEST_F(RecordingLoader, ManyFilesLeaveTheWindowItsTurns)
                          mostAtOnce = std::max(mostAtOnce, finished - std::exchange(before, finished));
                      });
     window.start(0);
-    ASSERT_TRUE(WaitUntilIdle());
+    ASSERT_TRUE(QTest::qWaitFor([this] { return m_pLoader->IsIdle(); }, 60'000));
     window.stop();
     EXPECT_EQ(finished, many);
     EXPECT_LE(mostAtOnce, 64) << turns << " turns";

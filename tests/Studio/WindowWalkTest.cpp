@@ -346,8 +346,11 @@ TEST_F(StudioWindow, WhatCannotBeReadAndWhatWasGuessedIsTold)
     QTest::mouseClick(Find<QPushButton>("noticeButton"), Qt::LeftButton);
     EXPECT_TRUE(Find<QWidget>("logPanel")->isVisible());
     const QAbstractItemModel* pLog = Find<QTreeView>("log")->model();
-    ASSERT_GT(pLog->rowCount(), 0);
-    EXPECT_TRUE(pLog->index(pLog->rowCount() - 1, 3).data().toString().startsWith("table.csv:"));
+    const auto last = [pLog]
+    {
+        return pLog->index(pLog->rowCount() - 1, 3).data().toString();
+    };
+    EXPECT_TRUE(QTest::qWaitFor([&] { return last().startsWith("table.csv:"); }, patience)) << last().toStdString();
 }
 
 TEST_F(StudioWindow, ARecordingIsNamedInTheTitleAndCanBeClosed)
@@ -385,10 +388,10 @@ TEST_F(StudioWindow, ARecordingIsNamedInTheTitleAndCanBeClosed)
 TEST_F(StudioWindow, TheSliderKeepsItsSizeInANarrowWindow)
 {
     Start();
-    m_pWindow->resize(640, 500);
-    ASSERT_TRUE(QTest::qWaitFor([&] { return Find<QSlider>("position")->width() < 700; }, patience));
+    m_pWindow->resize(1, 1); // as narrow as it goes
+    QTest::qWait(1);
     EXPECT_TRUE(Find<QSlider>("position")->isVisible());
-    EXPECT_GT(Find<QSlider>("position")->width(), 500);
+    EXPECT_GT(Find<QSlider>("position")->width(), m_pWindow->width() * 3 / 4);
 }
 
 TEST_F(StudioWindow, ASearchThatFindsNothingInTheNextRecordingIsCleared)
@@ -410,8 +413,9 @@ TEST_F(StudioWindow, ASearchThatFindsNothingInTheNextRecordingIsCleared)
     ASSERT_TRUE(show("walk.c3d", "walk"));
     auto* pSearch = Find<QLineEdit>("channelSearch");
     pSearch->setText(QStringLiteral("lfhd"));
-    EXPECT_TRUE(show("table.csv", "table")) << "channels are seen";
-    EXPECT_EQ(pSearch->text(), "");
+    EXPECT_TRUE(show("table.csv", "table"));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return pSearch->text().isEmpty(); }, patience));
+    EXPECT_EQ(Find<QTreeView>("channelTree")->model()->index(0, 0).data().toString(), "Columns");
     pSearch->setText(QStringLiteral("kne"));
     EXPECT_TRUE(show("walk.c3d", "walk (2)"));
     EXPECT_EQ(pSearch->text(), "kne") << "this one finds something there, too";
@@ -431,18 +435,24 @@ TEST_F(StudioWindow, TextsOfFilesAreShownAsTheyAre)
     QHelpEvent hover(QEvent::ToolTip, place, pTree->viewport()->mapToGlobal(place));
     QApplication::sendEvent(pTree->viewport(), &hover);
     EXPECT_EQ(QToolTip::text(), name);
+    const auto countShown = [&name]
+    {
+        int shown = 0;
+        for (const QWidget* pWidget : QApplication::allWidgets())
+            if (const auto* pLabel = qobject_cast<const QLabel*>(pWidget); pLabel && pLabel->isVisible())
+            {
+                EXPECT_EQ(pLabel->textFormat(), Qt::PlainText) << pLabel->text().toStdString();
+                shown += pLabel->text() == name ? 1 : 0;
+            }
+        return shown;
+    };
+    EXPECT_EQ(countShown(), 1) << "the tool tip";
+    QToolTip::hideText();
     QMessageBox box(QMessageBox::Information, name, name, QMessageBox::Ok, m_pWindow.get());
     box.setInformativeText(name);
     box.show();
-    int shown = 0;
-    for (const QWidget* pWidget : QApplication::allWidgets())
-        if (const auto* pLabel = qobject_cast<const QLabel*>(pWidget); pLabel && pLabel->isVisible())
-        {
-            EXPECT_EQ(pLabel->textFormat(), Qt::PlainText) << pLabel->text().toStdString();
-            shown += pLabel->text() == name ? 1 : 0;
-        }
-    EXPECT_EQ(shown, 3) << "tool tip and both texts of the box";
-    QToolTip::hideText();
+    EXPECT_GE(countShown(), 2) << "both texts of the box";
+    box.close();
     const QStringList buttons = [this]
     {
         QStringList texts;

@@ -23,8 +23,8 @@ class VStudioSession;
 /// Reads recordings on a thread of its own, one file after the other, and hands each to the session on the UI thread.
 /// Every number that Open or Reload gave ends with exactly one of Finished, Failed and Cancelled, unless the loader is
 /// destroyed before: then the file that is being read is dropped at its next piece, and nothing is handed over any
-/// more. However many files are read, the window gets its turn between two that are handed over. Owned by a window; the
-/// session outlives it. All calls and signals on the UI thread.
+/// more. Of however many files, only a few are handed over in one turn of the UI thread. Owned by a window; the session
+/// outlives it. All calls and signals on the UI thread.
 class VRecordingLoader : public QObject
 {
     Q_OBJECT
