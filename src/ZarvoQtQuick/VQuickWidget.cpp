@@ -1,5 +1,6 @@
 #include "ZarvoQtQuick/VQuickWidget.h"
 
+#include "IOInterfaceQt/DenyNetworkAccess.h"
 #include "IOInterfaceQt/QmlComponentFactory.h"
 #include "TQL/Log.h"
 
@@ -35,7 +36,10 @@ VQuickWidget::VQuickWidget(QQmlEngine* i_pEngine, QWidget* i_pParent)
     : QQuickWidget(i_pEngine ? i_pEngine : new QQmlEngine, i_pParent)
 {
     if (!i_pEngine)
+    {
         engine()->setParent(this);
+        TQL::IO::DenyNetworkAccess(*engine());
+    }
     m_pContext = new QQmlContext(engine()->rootContext(), this);
     m_pPersistentProperties = new QQmlPropertyMap(this);
     m_pContext->setContextProperty(QStringLiteral("contextQuickWidget"), this);

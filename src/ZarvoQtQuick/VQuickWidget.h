@@ -19,7 +19,7 @@ class VQuickWidget : public QQuickWidget, public TQL::IQuickWidget
     Q_OBJECT
 
 public:
-    /// A null engine makes one of its own.
+    /// A null engine makes one of its own, without network access.
     explicit VQuickWidget(QQmlEngine* i_pEngine, QWidget* i_pParent = nullptr);
     ~VQuickWidget() override;
 

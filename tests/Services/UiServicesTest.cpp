@@ -8,6 +8,10 @@
 
 #include <gmock/gmock.h>
 
+#include <QtCore/QEventLoop>
+#include <QtNetwork/QNetworkAccessManager>
+#include <QtNetwork/QNetworkReply>
+#include <QtNetwork/QTcpServer>
 #include <QtQml/QJSValue>
 #include <QtQml/QQmlComponent>
 #include <QtQml/QQmlEngine>
@@ -50,6 +54,21 @@ TEST(VQmlEngineHost, ANullObjectLeavesThePropertyPresent)
     host.ReleaseUnused();
     EXPECT_EQ(Evaluate(rEngine, look), "object true");
     EXPECT_EQ(Evaluate(rEngine, "Qt.point(3, 4).y"), "4") << "the engine is still of use";
+}
+
+TEST(VQmlEngineHost, HasNoNetwork)
+{
+    QTcpServer server; // somebody who would answer
+    ASSERT_TRUE(server.listen(QHostAddress::LocalHost));
+    const QUrl url(QStringLiteral("http://127.0.0.1:%1/picture.png").arg(server.serverPort()));
+    VQmlEngineHost host;
+    const std::unique_ptr<QNetworkReply> pReply(host.GetEngine()->networkAccessManager()->get(QNetworkRequest(url)));
+    QEventLoop loop;
+    QObject::connect(pReply.get(), &QNetworkReply::finished, &loop, &QEventLoop::quit);
+    QObject::connect(&server, &QTcpServer::newConnection, &loop, &QEventLoop::quit);
+    loop.exec();
+    EXPECT_EQ(pReply->error(), QNetworkReply::ContentAccessDenied);
+    EXPECT_FALSE(server.hasPendingConnections());
 }
 
 TEST(VContentRegistry, KeepsAFactoryUntilItIsUnregistered)

@@ -1,5 +1,7 @@
 #include "Services/Ui/VQmlEngineHost.h"
 
+#include "IOInterfaceQt/DenyNetworkAccess.h"
+
 #include <QtCore/QString>
 #include <QtQml/QQmlContext>
 #include <QtQml/QQmlEngine>
@@ -10,6 +12,7 @@ namespace Services
 VQmlEngineHost::VQmlEngineHost(ThreadCheckPointer i_pCheck)
     : m_pCheck(std::move(i_pCheck)), m_pEngine(std::make_unique<QQmlEngine>())
 {
+    TQL::IO::DenyNetworkAccess(*m_pEngine);
 }
 
 VQmlEngineHost::~VQmlEngineHost() = default;

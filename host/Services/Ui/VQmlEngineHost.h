@@ -10,8 +10,8 @@
 namespace Services
 {
 
-/// Owns the one QML engine of the host. Owned by the host services; destroyed before the application object and after
-/// every widget. UI thread.
+/// Owns the one QML engine of the host, which has no network access: texts of files and messages come near it. Owned by
+/// the host services; destroyed before the application object and after every widget. UI thread.
 class VQmlEngineHost : public OrvanePluginInterface::IQmlEngineHost
 {
 public:
