@@ -33,6 +33,31 @@ std::vector<FactorText> ReadFactors(const TQL::ComponentGroup& i_rGroup,
     return factors;
 }
 
+/// A unit may come from a file that somebody sent: nothing in it is a mark.
+std::string EscapeMarks(std::string_view i_Text)
+{
+    std::string text;
+    for (const char character : i_Text)
+        switch (character)
+        {
+        case '<':
+            text += "&lt;";
+            break;
+        case '>':
+            text += "&gt;";
+            break;
+        case '&':
+            text += "&amp;";
+            break;
+        case '"':
+            text += "&quot;";
+            break;
+        default:
+            text += character;
+        }
+    return text;
+}
+
 /// Of the exponent without its sign.
 std::string ExponentText(const Exponent& i_rExponent, EUnitText i_Form)
 {
@@ -66,7 +91,8 @@ std::string ComposeUnitText(const TQL::ComponentGroup& i_rGroup, const ChannelSy
             text += bBrackets ? "/(" : "/";
         else if (it != factors.begin())
             text += ".";
-        text += it->Text + ExponentText(it->Power, i_Form);
+        text += i_Form == EUnitText::Rich ? EscapeMarks(it->Text) : it->Text;
+        text += ExponentText(it->Power, i_Form);
     }
     return bBrackets ? text + ")" : text;
 }

@@ -18,7 +18,8 @@ class IChannel;
 struct ComponentGroup;
 } // namespace TQL
 
-/// Units as text: "mm/s^2", or "mm/s<sup>2</sup>" as rich text. UTF-8. Any thread.
+/// Units as text: "mm/s^2", or "mm/s<sup>2</sup>" as rich text, in which the host's own texts are escaped. UTF-8. Any
+/// thread.
 namespace ChannelSystemUtils
 {
 

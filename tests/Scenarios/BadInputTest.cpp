@@ -1,3 +1,5 @@
+#include "GraphPlotSystem/VSubplotManager.h"
+#include "GraphPlotSystem/VSubplotModel.h"
 #include "Scenarios/PlotScenario.h"
 #include "Scenarios/SmallTake.h"
 
@@ -20,6 +22,11 @@ protected:
         pRecording->Channels.push_back(pRecording->Channels[2]);
         pRecording->Channels.back().Name = "Fast";
         pRecording->Channels.back().SamplePeriod /= 2;
+        Recordings::RecordedChannel& rMarked = pRecording->Channels.emplace_back();
+        rMarked.Name = "<img src='http://127.0.0.1/name'>";
+        rMarked.ComponentNames = {"<b>1</b>"};
+        rMarked.Units = "<img src='http://127.0.0.1/unit'>";
+        rMarked.Samples = {1, 2, 3};
         AddRecording("Take", pRecording);
         Show("Take");
     }
@@ -76,6 +83,19 @@ TEST_F(BadInput, WhatCannotBeComputedSaysWhyAndThePlotGoesOn)
         Settle();
         EXPECT_EQ(Subplots(), before);
         EXPECT_EQ(Key().substr(0, 4), "Mine") << rCase.pExpression;
+    }
+}
+
+TEST_F(BadInput, MarksInNamesAndUnitsAreShownAndNotObeyed)
+{
+    Select({"<img src='http://127.0.0.1/name'>"});
+    Settle();
+    const QModelIndex subplot = pSystem->GetSubplotManager()->GetSubplotModel()->index(0);
+    for (const int role : {TQL::SubplotModelRoles::SubplotYAxisUnits, TQL::SubplotModelRoles::SubplotYAxisToolTip})
+    {
+        const std::string text = subplot.data(role).toString().toStdString();
+        EXPECT_EQ(text.find("<img"), std::string::npos) << text;
+        EXPECT_NE(text.find("&lt;img src='http://127.0.0.1/unit'&gt;"), std::string::npos) << text;
     }
 }
 

@@ -23,6 +23,8 @@ ComboBox {
     }
 
     delegate: ItemDelegate {
+        id: row
+
         required property int index
         required property string channelTypeDisplayName
         required property bool channelTypeCategoryHeader
@@ -30,7 +32,14 @@ ComboBox {
 
         width: ListView.view ? ListView.view.width : 0
         height: 26
-        text: channelTypeDisplayName
+        contentItem: Text {
+            text: row.channelTypeDisplayName
+            textFormat: Text.PlainText
+            font: row.font
+            elide: Text.ElideRight
+            verticalAlignment: Text.AlignVCenter
+            color: row.highlighted ? row.palette.highlightedText : row.palette.text
+        }
         enabled: !channelTypeCategoryHeader
         highlighted: ListView.isCurrentItem
         opacity: channelTypeCategoryHeader || channelTypeAvailable ? 1 : 0.5
@@ -39,7 +48,8 @@ ComboBox {
         font.pixelSize: 12
     }
 
-    ToolTip.visible: hovered && !popup.visible
-    ToolTip.delay: 600
-    ToolTip.text: prompt
+    PlainToolTip {
+        visible: root.hovered && !root.popup.visible
+        text: root.prompt
+    }
 }

@@ -24,7 +24,8 @@ ComboBox {
     onValueChanged: _showValue()
     Component.onCompleted: _showValue()
 
-    ToolTip.visible: hovered && !popup.visible
-    ToolTip.delay: 600
-    ToolTip.text: prompt
+    PlainToolTip {
+        visible: root.hovered && !root.popup.visible
+        text: root.prompt
+    }
 }

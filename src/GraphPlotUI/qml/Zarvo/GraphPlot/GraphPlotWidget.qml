@@ -41,6 +41,7 @@ Item {
             wrapMode: Text.WordWrap
             visible: column.count === 0
             text: contextActiveChannelModel.haveActiveChannels ? qsTr("No channel data available") : bar.helpText
+            textFormat: Text.PlainText
             color: "#d0d0d0"
             font.pixelSize: 14
         }

@@ -31,6 +31,7 @@ ListView {
             color: row.model.keyColour ?? "transparent"
         }
         Text {
+            id: name
             anchors { left: swatch.right; leftMargin: 6; right: pin.left; rightMargin: 6; verticalCenter: parent.verticalCenter }
             text: row.model.keyComponentName ? `${row.model.keyChannelName} : ${row.model.keyComponentName}`
                                              : row.model.keyChannelName
@@ -40,14 +41,16 @@ ListView {
             font.pixelSize: 11
 
             HoverHandler { id: hover }
-            ToolTip.visible: hover.hovered && truncated
-            ToolTip.delay: 600
-            ToolTip.text: text
+            PlainToolTip {
+                visible: hover.hovered && name.truncated
+                text: name.text
+            }
         }
         Text {
             id: pin
             anchors { right: parent.right; rightMargin: 8; verticalCenter: parent.verticalCenter }
             text: row.model.keyPinned ? "\u25cf" : "\u25cb"
+            textFormat: Text.PlainText
             color: "#d0d0d0"
             font.pixelSize: 12
 

@@ -33,6 +33,7 @@ Repeater {
 
         visible: position >= 0 && position <= root.length
         text: root.textOf(root.valueForTextFunc(value))
+        textFormat: Text.PlainText
         color: "#d0d0d0"
         font.pixelSize: 11
         x: root.vertical ? parent.width - width - 14 : Math.max(0, Math.min(root.length - width, position - width / 2))

@@ -33,6 +33,7 @@ Item {
         anchors { bottom: parent.bottom; horizontalCenter: parent.horizontalCenter }
         text: root.traceManager.liveContext && root.traceManager.relativeTimeDisplay ? qsTr("Relative Time (Frames)")
                                                                                      : qsTr("Session Time (Frames)")
+        textFormat: Text.PlainText
         color: "#d0d0d0"
         font.pixelSize: 12
     }

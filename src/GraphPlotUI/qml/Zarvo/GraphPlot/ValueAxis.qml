@@ -1,5 +1,4 @@
 import QtQuick
-import QtQuick.Controls.Basic
 import QtQuick.Window
 import Zarvo.GraphPlot 1.0
 
@@ -10,8 +9,8 @@ Item {
     property rect screenRect
     property point valueRange
     property string label
-    property string units // rich text in brackets, or empty
-    property string toolTip
+    property string units // rich text in brackets, or empty; what is not a mark in it is escaped
+    property string toolTip // likewise
 
     ValueAxisRenderType {
         id: axis
@@ -30,21 +29,36 @@ Item {
         length: root.height
     }
 
-    Text {
+    Row {
         x: 2
         y: (root.height + width) / 2
         rotation: -90
         transformOrigin: Item.TopLeft
-        width: Math.min(implicitWidth, root.height)
-        elide: Text.ElideRight
-        textFormat: Text.StyledText
-        text: root.units === "" ? root.label : `${root.label} ${root.units}`
-        color: "#d0d0d0"
-        font.pixelSize: 12
+        spacing: root.units === "" ? 0 : 4
+
+        Text {
+            width: Math.min(implicitWidth, Math.max(0, root.height - parent.spacing - unitsText.width))
+            elide: Text.ElideRight
+            textFormat: Text.PlainText
+            text: root.label
+            color: "#d0d0d0"
+            font.pixelSize: 12
+        }
+        Text {
+            id: unitsText
+            width: Math.min(implicitWidth, root.height)
+            elide: Text.ElideRight
+            textFormat: Text.StyledText
+            text: root.units
+            color: "#d0d0d0"
+            font.pixelSize: 12
+        }
     }
 
     HoverHandler { id: hover }
-    ToolTip.visible: hover.hovered && toolTip !== ""
-    ToolTip.delay: 600
-    ToolTip.text: toolTip
+    PlainToolTip {
+        markedUp: true
+        visible: hover.hovered && text !== ""
+        text: root.toolTip
+    }
 }
