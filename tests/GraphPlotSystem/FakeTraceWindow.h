@@ -99,6 +99,7 @@ public:
     using VBaseGraphPlotTime::VBaseGraphPlotTime;
 
     void SetActive(bool i_bActive) override { bActive = i_bActive; }
+    bool HasSource(const std::string& i_rName) const override { return Sources.contains(i_rName); }
     void SetPreferredSources(const std::set<std::string>& i_rNames) override { PreferredSources = i_rNames; }
     std::optional<TQL::TickRange> GetFitRange() const override { return FitRange; }
     void SetCurrentTime(qlonglong) override {}
@@ -117,6 +118,7 @@ public:
     }
 
     bool bActive = false;
+    std::set<std::string> Sources{"Live", "Take"};
     std::set<std::string> PreferredSources;
     std::optional<TQL::TickRange> FitRange;
 };

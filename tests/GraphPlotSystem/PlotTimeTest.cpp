@@ -238,8 +238,7 @@ TEST_F(PlotTime, PrefersTheSourcesOfTheChannels)
         {"no preference", {}, "review"},
         {"the current source, though another is live", {"Live", "Take"}, "review"},
         {"another one: the first live source", {"Other"}, "live"},
-        {"no time source at all", {"GlobalItems"}, "review"},
-        {"the live one", {"Live", "GlobalItems"}, "live"},
+        {"one that has gone since", {"Gone"}, "live"},
     };
     pTime->SetActive(true);
     for (const Case& rCase : cases)
@@ -250,6 +249,8 @@ TEST_F(PlotTime, PrefersTheSourcesOfTheChannels)
         pTime->SetPreferredSources(rCase.Preferred);
         EXPECT_EQ(pUi->Pending(), 0u) << "the same names again: " << rCase.pWhat;
     }
+    EXPECT_TRUE(pTime->HasSource("Other"));
+    EXPECT_FALSE(pTime->HasSource("Gone"));
     pController->Sources["Live"]->Mode = 2;
     pController->pListChanged->Invoke();
     pUi->RunAll();

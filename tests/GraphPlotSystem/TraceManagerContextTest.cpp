@@ -231,10 +231,11 @@ TEST_F(TraceManager, ChannelsNameTheirSources)
     const auto pInput = std::make_shared<FakeHost::Channel>(TQL::IChannelInstanceId{"Take", "Input", 1, 0, ""});
     const auto pNameless = std::make_shared<FakeHost::Channel>(TQL::IChannelInstanceId{"", "Nameless", 1, 0, ""});
     const auto pDerived = std::make_shared<FakeHost::Channel>(TQL::IChannelInstanceId{"Live", "Derived", 1, 0, ""});
-    pDerived->Inputs = {pInput, pNameless, nullptr};
+    const auto pGlobal = std::make_shared<FakeHost::Channel>(TQL::IChannelInstanceId{"GlobalItems", "Rate", 1, 0, ""});
+    pDerived->Inputs = {pInput, pNameless, pGlobal, nullptr};
     pInput->Inputs = {pDerived}; // a ring must not hang
     pManager->SetChannels({pDerived, pNameless});
-    EXPECT_EQ(pTime->PreferredSources, (std::set<std::string>{"Live", "Take"}));
+    EXPECT_EQ(pTime->PreferredSources, (std::set<std::string>{"Live", "Take"})) << "what has a time, and no other";
     pInput->Inputs.clear();
     pManager->SetChannels({});
     EXPECT_TRUE(pTime->PreferredSources.empty());

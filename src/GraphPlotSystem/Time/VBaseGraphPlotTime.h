@@ -46,7 +46,10 @@ public:
 
     virtual void SetActive(bool i_bActive) = 0;
 
-    /// The names of the sources that the plotted channels come from; an empty set has no preference.
+    /// Whether a time source of the host bears the name.
+    virtual bool HasSource(const std::string& i_rName) const = 0;
+
+    /// The names of the time sources that the plotted channels come from; an empty set has no preference.
     virtual void SetPreferredSources(const std::set<std::string>& i_rNames) = 0;
 
     /// The range that a fitted time axis of a review shows, counted in frames; none leaves it to the caller.

@@ -4,7 +4,6 @@
 #include "NotificationSystem/VDispatchCollapsers.h"
 #include "NotificationSystem/WeakCallback.h"
 
-#include <algorithm>
 #include <utility>
 
 namespace GraphPlotUI
@@ -42,17 +41,12 @@ std::shared_ptr<OrvanePluginInterface::ITimeSource> VOrvaneGraphPlotTime::Choose
 {
     std::string currentName;
     m_pController->GetCurrentSourceName(currentName);
-    const auto pMap = m_pController->GetSourceMap();
-    const std::set<std::string> known = pMap->GetNames();
-    const bool bPreferOthers =
-        !m_PreferredSources.contains(currentName) &&
-        std::ranges::any_of(m_PreferredSources, [&](const std::string& i_rName) { return known.contains(i_rName); });
-    if (!bPreferOthers)
+    if (m_PreferredSources.empty() || m_PreferredSources.contains(currentName))
         return m_pController->GetCurrentSource();
 
     std::shared_ptr<OrvanePluginInterface::ITimeSource> pFirst;
     std::shared_ptr<OrvanePluginInterface::ITimeSource> pLive;
-    pMap->ForEach(
+    m_pController->GetSourceMap()->ForEach(
         [&](const std::string&, const std::shared_ptr<OrvanePluginInterface::ITimeSource>& i_rpSource)
         {
             if (!pFirst)
@@ -123,6 +117,11 @@ void VOrvaneGraphPlotTime::SetActive(bool i_bActive)
         PostRefresh();
     else
         m_SourceSubscriptions.Drain();
+}
+
+bool VOrvaneGraphPlotTime::HasSource(const std::string& i_rName) const
+{
+    return m_pController->GetSourceMap()->Find(i_rName) != nullptr;
 }
 
 void VOrvaneGraphPlotTime::SetPreferredSources(const std::set<std::string>& i_rNames)

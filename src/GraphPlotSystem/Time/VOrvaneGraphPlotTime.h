@@ -21,7 +21,7 @@ public:
     ~VOrvaneGraphPlotTime() override;
 
     void SetActive(bool i_bActive) override;
-    /// Names that are no time source of the host are passed over.
+    bool HasSource(const std::string& i_rName) const override;
     void SetPreferredSources(const std::set<std::string>& i_rNames) override;
     void SetCurrentTime(qlonglong i_Frame) override;
 

@@ -199,6 +199,8 @@ void VTraceManager::SetChannels(const std::vector<std::shared_ptr<TQL::IChannel>
         CollectSourceNames(*rpChannel, visited, sourceNames);
     }
     m_pUpdater->SetChannels(i_rChannels, ids);
+    // A context that spans others has channels but no time, and must not draw the plot away from the time on show.
+    std::erase_if(sourceNames, [this](const std::string& i_rName) { return !m_pPlotTime->HasSource(i_rName); });
     m_pPlotTime->SetPreferredSources(sourceNames);
 }
 
