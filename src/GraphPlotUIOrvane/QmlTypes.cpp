@@ -17,6 +17,7 @@
 #include "IOInterfaceQt/RegisterTypes.h"
 #include "TQL/SchemaIntern.h"
 
+#include <QtCore/QDir>
 #include <QtCore/QMetaEnum>
 #include <QtQml/QQmlEngine>
 #include <QtQml/qqml.h>
@@ -61,11 +62,19 @@ void RegisterGraphPlotTypes()
     TQL::IO::RegisterEnumMap(pModule, "LengthUnits", LengthUnitsSchema());
 }
 
-void AddResourceImportPath(QQmlEngine& i_rEngine)
+QString SourceFolder(const char* i_pRoom)
 {
-    const QString path = QStringLiteral("qrc:/");
-    if (!i_rEngine.importPathList().contains(path))
-        i_rEngine.addImportPath(path);
+    return QDir::cleanPath(QStringLiteral(GRAPHPLOTS_SOURCE_FOLDER) + QLatin1Char('/') + QLatin1String(i_pRoom));
+}
+
+void AddDevelopmentPaths(QQmlEngine& i_rEngine)
+{
+    const QString hostFacing = SourceFolder("GraphPlotUIOrvane");
+    for (const QString& rFolder : {SourceFolder("GraphPlotUI/qml"), hostFacing})
+        i_rEngine.addImportPath(rFolder); // one that the engine has already only moves to the front
+    const QString prefix = QStringLiteral("qml");
+    if (const QStringList folders = QDir::searchPaths(prefix); !folders.contains(hostFacing))
+        QDir::setSearchPaths(prefix, folders + QStringList(hostFacing));
 }
 
 } // namespace GraphPlotUI

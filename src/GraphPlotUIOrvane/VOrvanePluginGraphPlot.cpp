@@ -1,15 +1,14 @@
 #include "GraphPlotUIOrvane/VOrvanePluginGraphPlot.h"
 
 #include "CoreGraphics/Resources.h"
+#include "GraphPlotSystem/SharedObject.h"
+#include "GraphPlotSystem/VOrvaneGraphPlotTime.h"
 #include "GraphPlotUIOrvane/QmlTypes.h"
 #include "GraphPlotUIOrvane/VOrvaneGraphPlotWindowContentFactory.h"
 #include "OrvanePluginInterface/IHostCoreServices.h"
 #include "OrvanePluginInterface/IHostUiServices.h"
 #include "OrvanePluginInterface/ITimeController.h"
 #include "Store/VStore.h"
-
-#include <QtCore/QDir>
-#include <QtQml/QQmlEngine>
 
 namespace GraphPlotUI
 {
@@ -22,10 +21,11 @@ const std::string& EmptyText()
     return s_Empty;
 }
 
-/// The folder beside this room that holds another room's sources, for development builds only.
-QString SourceFolder(const char* i_pRoom)
+/// The name of the time that is not of one window alone.
+const std::string& DefaultTimeName()
 {
-    return QDir::cleanPath(QStringLiteral(GRAPHPLOTS_SOURCE_FOLDER) + QLatin1Char('/') + QLatin1String(i_pRoom));
+    static const std::string s_Name = "default";
+    return s_Name;
 }
 
 template <typename T, typename TServices>
@@ -50,6 +50,10 @@ bool SaysObject(const std::shared_ptr<OrvanePluginInterface::IHostProfile>& i_rp
 using OrvanePluginInterface::IHostCoreServices;
 using OrvanePluginInterface::IHostUiServices;
 
+VOrvanePluginGraphPlot::VOrvanePluginGraphPlot() = default;
+
+VOrvanePluginGraphPlot::~VOrvanePluginGraphPlot() = default;
+
 const std::string& VOrvanePluginGraphPlot::QueryText1() const
 {
     return EmptyText();
@@ -65,11 +69,8 @@ bool VOrvanePluginGraphPlot::LoadQmlModules(IHostCoreServices&, IHostUiServices&
     RegisterResources();
     RegisterGraphPlotTypes();
     const auto pEngineHost = Fetch(i_rUi, &IHostUiServices::GetQmlEngineHost);
-    QQmlEngine* pEngine = pEngineHost->GetEngine();
-    if (pEngine)
-        AddResourceImportPath(*pEngine);
-    if (pEngine && i_rUi.IsDevelopmentBuild())
-        pEngine->addImportPath(SourceFolder("GraphPlotUI/qml"));
+    if (QQmlEngine* pEngine = pEngineHost->GetEngine(); pEngine && i_rUi.IsDevelopmentBuild())
+        AddDevelopmentPaths(*pEngine);
     // The property must exist, with no value, before any QML is loaded.
     pEngineHost->SetRootContextProperty("rootContextTraceFactory", nullptr);
     return true;
@@ -79,6 +80,13 @@ bool VOrvanePluginGraphPlot::Initialise(IHostCoreServices& i_rCore, IHostUiServi
 {
     const auto pResources = Fetch(i_rUi, &IHostUiServices::GetResources);
     pResources->AddSearchFolder(SourceFolder("GraphPlotUI").toStdString());
+
+    std::shared_ptr<OrvanePluginInterface::ITimeController> pDefaultTime;
+    if (const auto pRegistry = Fetch(i_rCore, &IHostCoreServices::GetTimeControllerRegistry))
+        pRegistry->GetTimeController(DefaultTimeName(), pDefaultTime);
+    if (pDefaultTime) // each window has the one that it was made with, and works without this
+        m_pPlotTime = MakeSharedObject<VOrvaneGraphPlotTime>(Fetch(i_rCore, &IHostCoreServices::GetUiPostalService),
+                                                             std::move(pDefaultTime));
 
     GraphPlotServices services;
     services.pUiPostalService = Fetch(i_rCore, &IHostCoreServices::GetUiPostalService);
@@ -97,6 +105,11 @@ bool VOrvanePluginGraphPlot::Initialise(IHostCoreServices& i_rCore, IHostUiServi
         ->RegisterContent(VOrvaneGraphPlotWindowContentFactory::Name(),
                           TQL::MakeShared<VOrvaneGraphPlotWindowContentFactory>(std::move(services)));
     return true;
+}
+
+void VOrvanePluginGraphPlot::Shutdown()
+{
+    m_pPlotTime = nullptr;
 }
 
 void VOrvanePluginGraphPlot::UnloadResources()

@@ -17,6 +17,7 @@
 #include <gmock/gmock.h>
 
 #include <QtCore/QCoreApplication>
+#include <QtCore/QDir>
 #include <QtCore/QElapsedTimer>
 #include <QtCore/QTemporaryDir>
 #include <QtQml/QQmlEngine>
@@ -112,6 +113,50 @@ TEST(RealModule, LivesTwiceInTheStrictHostWithoutAFault)
         EXPECT_THAT(services.Faults(), ElementsAre()) << "life " << life;
         rTime.SetCurrentSource("");
         QCoreApplication::processEvents();
+    }
+}
+
+/// The last folders of what an engine has beyond some paths.
+QStringList FoldersBeyond(const QStringList& i_rPaths, const QStringList& i_rBefore)
+{
+    QStringList folders;
+    for (const QString& rPath : i_rPaths)
+        if (!i_rBefore.contains(rPath))
+            folders += rPath.section(QStringLiteral("/src/"), -1);
+    return folders;
+}
+
+/// What the module takes of its host besides its windows.
+TEST(RealModule, FollowsTheDefaultTimeAndReadsItsSourcesInADevelopmentBuildAlone)
+{
+    TestSupport::LogGuard log;
+    for (const bool bDevelopment : {false, true})
+    {
+        HostOptions options;
+        options.bChecking = true;
+        options.bDevelopmentBuild = bDevelopment;
+        VHostServices services(options);
+        services.SetChannelService(std::make_shared<Fakes::FakeChannelService>());
+        const QQmlEngine& rEngine = *services.EngineHost()->GetEngine();
+        const QStringList before = rEngine.importPathList();
+        const QString prefix = QStringLiteral("qml");
+        const QStringList searchBefore = QDir::searchPaths(prefix);
+        const auto pListChanged = services.TimeController()->SourceListChanged();
+        const std::size_t followers = pListChanged->Count();
+
+        VPluginHost host(services);
+        std::string message;
+        ASSERT_TRUE(host.Load(REAL_MODULE, message).IsSuccess()) << message;
+        using Folders = QStringList;
+        EXPECT_EQ(FoldersBeyond(rEngine.importPathList(), before),
+                  bDevelopment ? Folders({QStringLiteral("GraphPlotUIOrvane"), QStringLiteral("GraphPlotUI/qml")})
+                               : Folders());
+        EXPECT_EQ(FoldersBeyond(QDir::searchPaths(prefix), searchBefore),
+                  bDevelopment ? Folders(QStringLiteral("GraphPlotUIOrvane")) : Folders());
+        EXPECT_EQ(pListChanged->Count(), followers + 1) << "the time that is not of a window";
+        EXPECT_EQ(host.Unload(), TQL::Result::Ok);
+        EXPECT_EQ(pListChanged->Count(), followers);
+        EXPECT_THAT(services.Faults(), ElementsAre());
     }
 }
 
