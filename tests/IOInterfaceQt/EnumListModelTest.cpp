@@ -1,12 +1,14 @@
 #include "IOInterfaceQt/VEnumListModel.h"
 
+#include <QtTest/QAbstractItemModelTester>
 #include <gtest/gtest.h>
 
 using TQL::IO::VEnumListModel;
 
 TEST(EnumListModel, GivesItsRowsByRole)
 {
-    const VEnumListModel model({{"Ten", 10, "first"}, {"Also ten", 10, "second"}, {"Text", QString("t"), {}}});
+    VEnumListModel model({{"Ten", 10, "first"}, {"Also ten", 10, "second"}, {"Text", QString("t"), {}}});
+    const QAbstractItemModelTester tester(&model, QAbstractItemModelTester::FailureReportingMode::Fatal);
     QString table;
     const QHash<int, QByteArray> names = model.roleNames();
     for (int row = 0; row < model.rowCount(); ++row)
