@@ -131,7 +131,7 @@ VHostServices::~VHostServices()
     // Jobs that wait hold the services that they wait in, so the queues are emptied before the pointers are let go.
     if (!m_pParts->pWorker->Drain(std::chrono::milliseconds(500)))
         TQL::Log::Write(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Warning,
-                        "The worker pool was stopped while it still had work", "Services/VHostServices", __LINE__);
+                        "The worker pool was stopped while it still had work");
     m_pParts->pWorker->Stop();
     m_pParts->pUi->Drain();
     m_pParts->pUi->Close();

@@ -25,7 +25,7 @@ constexpr std::chrono::milliseconds c_ShortPatience{500};
 
 void LogLine(TQL::ELogSeverity i_Severity, const std::string& i_rText)
 {
-    TQL::Log::Write(TQL::Log::GetCategory("Host"), i_Severity, i_rText, "Services/VPluginHost", __LINE__);
+    TQL::Log::Write(TQL::Log::GetCategory("Host"), i_Severity, i_rText);
 }
 
 /// What the exception that is being handled says.

@@ -29,8 +29,7 @@ constexpr int s_MostBroken = 10; ///< files put aside; one more replaces the las
 template <typename... Args>
 void LogError(const char* i_pFormat, const Args&... i_rArgs)
 {
-    TQL::Log::Format(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Error, "Services/VPreferencesStore", __LINE__,
-                     i_pFormat, i_rArgs...);
+    TQL::Log::Format(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Error, i_pFormat, i_rArgs...);
 }
 
 /// A file does not say that what it holds belongs into it.

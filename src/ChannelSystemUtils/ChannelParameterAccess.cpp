@@ -72,7 +72,6 @@ TQL::IResult ReadSelectionParameter(const TQL::IChannelParameters& i_rParameters
     if (number < 0 || number >= std::ssize(s_SelectionNames))
     {
         TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Error,
-                         "ChannelSystemUtils/ChannelParameterAccess", __LINE__,
                          "Failed to interpret default value as expected type.");
         return TQL::Result::InvalidType;
     }

@@ -14,7 +14,6 @@ namespace CoreGraphics
 namespace
 {
 
-constexpr const char* c_Source = "CoreGraphics/RenderContext";
 constexpr GLenum c_DebugOutput = 0x92E0; // GL_DEBUG_OUTPUT, absent from some headers
 constexpr std::size_t c_AttributeBits = 8;
 
@@ -36,9 +35,9 @@ TQL::ELogSeverity SeverityOf(const QOpenGLDebugMessage& i_rMessage)
     }
 }
 
-void LogInformation(const char* i_pText, int i_Line)
+void LogInformation(const char* i_pText, const TQL::LogPlace& i_rPlace = std::source_location::current())
 {
-    TQL::Log::Write(GraphicsLog(), TQL::ELogSeverity::Information, i_pText, c_Source, i_Line);
+    TQL::Log::Write(GraphicsLog(), TQL::ELogSeverity::Information, i_pText, i_rPlace);
 }
 
 } // namespace
@@ -59,13 +58,13 @@ void RenderContext::Initialise()
 
 void RenderContext::StartDebugLogger()
 {
-    LogInformation("Debug OpenGL context requested", __LINE__);
+    LogInformation("Debug OpenGL context requested");
     if (!m_pContext->hasExtension("GL_KHR_debug"))
     {
-        LogInformation("GL_KHR_debug not available", __LINE__);
+        LogInformation("GL_KHR_debug not available");
         return;
     }
-    LogInformation("Initialising debug logger", __LINE__);
+    LogInformation("Initialising debug logger");
     m_pDebugLogger = std::make_unique<QOpenGLDebugLogger>();
     if (m_pDebugLogger->initialize())
         m_Functions.glEnable(c_DebugOutput);
@@ -79,8 +78,7 @@ void RenderContext::DrainDebugLog()
         return;
     const QList<QOpenGLDebugMessage> messages = m_pDebugLogger->loggedMessages();
     for (const QOpenGLDebugMessage& rMessage : messages)
-        TQL::Log::Format(GraphicsLog(), SeverityOf(rMessage), c_Source, __LINE__, "%1%",
-                         rMessage.message().toStdString());
+        TQL::Log::Format(GraphicsLog(), SeverityOf(rMessage), "%1%", rMessage.message().toStdString());
 }
 
 bool RenderContext::UseProgram(const std::shared_ptr<VShaderProgram>& i_rpProgram)

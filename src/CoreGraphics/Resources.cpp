@@ -92,9 +92,10 @@ void Resources::CheckVersion(const QOpenGLContext& i_rContext) const
     const bool bEmbedded = format.renderableType() == QSurfaceFormat::OpenGLES;
     const std::pair required = bEmbedded ? std::pair(3, 0) : std::pair(4, 3);
     if (format.version() < required)
-        TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Warning, "CoreGraphics/Resources", c_VersionMessageLine,
-                         "%1% context version %2%.%3% is unsupported", bEmbedded ? "OpenGL ES" : "OpenGL",
-                         format.majorVersion(), format.minorVersion());
+        TQL::Log::Format(
+            GraphicsLog(), TQL::ELogSeverity::Warning,
+            {"%1% context version %2%.%3% is unsupported", {"CoreGraphics/Resources", c_VersionMessageLine}},
+            bEmbedded ? "OpenGL ES" : "OpenGL", format.majorVersion(), format.minorVersion());
 }
 
 void Resources::ScanRoot(const std::string& i_rRoot, ShareGroup& o_rGroup) const

@@ -12,8 +12,6 @@ namespace CoreGraphics
 namespace
 {
 
-constexpr const char* c_Source = "CoreGraphics/VShader";
-
 QByteArray VertexPreamble()
 {
     return "#version 300 es\n"
@@ -34,11 +32,11 @@ QByteArray FragmentPreamble()
 
 VShader::VShader(EShaderKind i_Kind, const std::string& i_rPath) : m_Kind(i_Kind), m_Path(i_rPath)
 {
-    TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Detail, c_Source, __LINE__, "Loading shader file %1%", m_Path);
+    TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Detail, "Loading shader file %1%", m_Path);
     QFile file(QString::fromStdString(m_Path));
     if (!file.open(QIODevice::ReadOnly))
     {
-        TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Error, c_Source, __LINE__, "Failed to open %1%", m_Path);
+        TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Error, "Failed to open %1%", m_Path);
         return;
     }
     Compile(file.readAll());
@@ -55,8 +53,8 @@ void VShader::Compile(const QByteArray& i_rSource)
         m_pShader = std::move(pShader);
         return;
     }
-    TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Error, c_Source, __LINE__,
-                     "Shader Failed To Compile<%1%> Log=<%2%>", m_Path, pShader->log().toStdString());
+    TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Error, "Shader Failed To Compile<%1%> Log=<%2%>", m_Path,
+                     pShader->log().toStdString());
 }
 
 } // namespace CoreGraphics

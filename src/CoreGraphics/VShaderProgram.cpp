@@ -48,9 +48,8 @@ void VShaderProgram::Link()
     if (!pProgram->addShader(m_pVertexShader->Compiled()) || !pProgram->addShader(m_pFragmentShader->Compiled()) ||
         !pProgram->link())
     {
-        TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Error, "CoreGraphics/VShaderProgram", __LINE__,
-                         "Shader program failed to link<%1%, %2%> Log=<%3%>", m_pVertexShader->Path(),
-                         m_pFragmentShader->Path(), pProgram->log().toStdString());
+        TQL::Log::Format(GraphicsLog(), TQL::ELogSeverity::Error, "Shader program failed to link<%1%, %2%> Log=<%3%>",
+                         m_pVertexShader->Path(), m_pFragmentShader->Path(), pProgram->log().toStdString());
         return;
     }
     m_pProgram = std::move(pProgram);

@@ -75,8 +75,8 @@ void VViewFollower::ApplyStateOf(const View& i_rView)
     TQL::IResult result;
     m_pSystem->ApplyState(result, i_rView.bLive ? m_LiveState : m_ReviewState);
     if (result.IsError())
-        TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Error, "GraphPlotSystem/VViewFollower",
-                         __LINE__, "Failed to load graph plot state: %1%", std::string(result.Description()));
+        TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Error,
+                         "Failed to load graph plot state: %1%", std::string(result.Description()));
 }
 
 } // namespace GraphPlotUI

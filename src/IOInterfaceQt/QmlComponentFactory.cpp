@@ -13,10 +13,10 @@ namespace
 {
 
 template <typename... Args>
-void LogLine(ELogSeverity i_Severity, int i_Line, const char* i_pFormat, const Args&... i_rArgs)
+void LogLine(ELogSeverity i_Severity, const LogText& i_rFormat, const Args&... i_rArgs)
 {
     static const VLogCategory& s_rCategory = Log::GetCategory("QmlComponentFactory");
-    Log::Format(s_rCategory, i_Severity, "IOInterfaceQt/QmlComponentFactory", i_Line, i_pFormat, i_rArgs...);
+    Log::Format(s_rCategory, i_Severity, i_rFormat, i_rArgs...);
 }
 
 void LogStatus(const QQmlComponent& i_rComponent)
@@ -25,17 +25,17 @@ void LogStatus(const QQmlComponent& i_rComponent)
     switch (i_rComponent.status())
     {
     case QQmlComponent::Ready:
-        LogLine(ELogSeverity::Detail, __LINE__, "Component %1% ready.", name);
+        LogLine(ELogSeverity::Detail, "Component %1% ready.", name);
         break;
     case QQmlComponent::Loading:
-        LogLine(ELogSeverity::Detail, __LINE__, "Component %1% loading.", name);
+        LogLine(ELogSeverity::Detail, "Component %1% loading.", name);
         break;
     case QQmlComponent::Error:
-        LogLine(ELogSeverity::Error, __LINE__, "Component %1% failed to load: %2%.", name,
+        LogLine(ELogSeverity::Error, "Component %1% failed to load: %2%.", name,
                 i_rComponent.errorString().trimmed().toStdString());
         break;
     case QQmlComponent::Null:
-        LogLine(ELogSeverity::Error, __LINE__, "Component %1% was null.", name);
+        LogLine(ELogSeverity::Error, "Component %1% was null.", name);
         break;
     }
 }
@@ -46,7 +46,7 @@ std::unique_ptr<QObject> MakeObject(QQmlComponent& i_rComponent)
         return nullptr;
     std::unique_ptr<QObject> pObject(i_rComponent.create(i_rComponent.creationContext()));
     if (!pObject)
-        LogLine(ELogSeverity::Error, __LINE__, "Component %1% was null.", i_rComponent.url().toString().toStdString());
+        LogLine(ELogSeverity::Error, "Component %1% was null.", i_rComponent.url().toString().toStdString());
     return pObject;
 }
 
@@ -75,7 +75,7 @@ std::shared_ptr<QQmlComponent> QmlComponentFactory::CreateComponent(const QStrin
     const QUrl url = FindComponentUrl(i_rName, m_bUseFolders ? i_rFolders : QStringList());
     if (url.isEmpty() || !m_pEngine)
     {
-        LogLine(ELogSeverity::Error, __LINE__, "Component %1% was null.", i_rName.toStdString());
+        LogLine(ELogSeverity::Error, "Component %1% was null.", i_rName.toStdString());
         return nullptr;
     }
     auto pComponent = std::make_shared<QQmlComponent>(m_pEngine.data(), url);

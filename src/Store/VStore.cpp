@@ -44,7 +44,7 @@ void RunGuarded(const TCallable& i_rCallable, VFirstFault& io_rFault)
 void LogUnmatched(const char* i_pText)
 {
     static const TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("Store");
-    TQL::Log::Write(s_rCategory, TQL::ELogSeverity::Error, i_pText, "Store/Access", __LINE__);
+    TQL::Log::Write(s_rCategory, TQL::ELogSeverity::Error, i_pText);
 }
 
 } // namespace

@@ -42,8 +42,7 @@ private:
     static void Write(const IStoreReader& i_rOf, EntryHandle i_Entry, ELogSeverity i_Severity, const char* i_pFormat)
     {
         static const TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("StoreIO");
-        TQL::Log::Format(s_rCategory, i_Severity, "StoreIO/StoreCopy", __LINE__, i_pFormat,
-                         i_rOf.GetStore().GetEntryPath(i_Entry).Text());
+        TQL::Log::Format(s_rCategory, i_Severity, i_pFormat, i_rOf.GetStore().GetEntryPath(i_Entry).Text());
     }
 };
 

@@ -8,14 +8,13 @@
 namespace TQL
 {
 
-/// Writes one line about an entry to the store's log; a "%1%" in i_pFormat is the entry's path.
+/// Writes one line about an entry to the store's log; a "%1%" in i_rFormat is the entry's path.
 template <typename... Args>
-void LogEntry(const IStoreReader& i_rReader, Store::EntryHandle i_Entry, ELogSeverity i_Severity, const char* i_pFormat,
-              const Args&... i_rArgs)
+void LogEntry(const IStoreReader& i_rReader, Store::EntryHandle i_Entry, ELogSeverity i_Severity,
+              const LogText& i_rFormat, const Args&... i_rArgs)
 {
     static const VLogCategory& s_rCategory = Log::GetCategory("Store");
-    Log::Format(s_rCategory, i_Severity, "StoreInterface/Access", __LINE__, i_pFormat,
-                i_rReader.GetStore().GetEntryPath(i_Entry).Text(), i_rArgs...);
+    Log::Format(s_rCategory, i_Severity, i_rFormat, i_rReader.GetStore().GetEntryPath(i_Entry).Text(), i_rArgs...);
 }
 
 /// Reads one of an entry's values as T. False, with an error in the log, when the entry or the value does not exist or

@@ -137,8 +137,8 @@ private:
 
     void Refuse(std::string_view i_What, const std::string& i_rText)
     {
-        LogParameter(TQL::ELogSeverity::Error, __LINE__, "Cannot read the %1% '%2%' of parameter '%3%'.", i_What,
-                     i_rText, m_rWriter.GetStore().GetEntryPath(m_Entry).Text());
+        LogParameter(TQL::ELogSeverity::Error, "Cannot read the %1% '%2%' of parameter '%3%'.", i_What, i_rText,
+                     m_rWriter.GetStore().GetEntryPath(m_Entry).Text());
         Keep(TQL::Result::InvalidValue);
     }
 

@@ -7,10 +7,10 @@ namespace Store
 
 /// One line of the room's log.
 template <typename... Args>
-void LogParameter(TQL::ELogSeverity i_Severity, int i_Line, const char* i_pFormat, const Args&... i_rArgs)
+void LogParameter(TQL::ELogSeverity i_Severity, const TQL::LogText& i_rFormat, const Args&... i_rArgs)
 {
     static TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("StoreParameters");
-    TQL::Log::Format(s_rCategory, i_Severity, "StoreParameters", i_Line, i_pFormat, i_rArgs...);
+    TQL::Log::Format(s_rCategory, i_Severity, i_rFormat, i_rArgs...);
 }
 
 } // namespace Store

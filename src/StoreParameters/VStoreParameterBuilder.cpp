@@ -54,34 +54,32 @@ TQL::IResult VStoreParameterBuilder::MakeTuple(EntryHandle i_Primary, std::span<
 
 bool VStoreParameterBuilder::MayMakeTuple(EntryHandle i_Primary, std::span<const EntryHandle> i_Parameters)
 {
-    const auto refuse = [&](int i_Line, const char* i_pText, const auto&... i_rMore)
+    const auto refuse = [&](const TQL::LogText& i_rText, const auto&... i_rMore)
     {
-        LogParameter(TQL::ELogSeverity::Error, i_Line, i_pText, Name(i_Primary), i_rMore...);
+        LogParameter(TQL::ELogSeverity::Error, i_rText, Name(i_Primary), i_rMore...);
         return false;
     };
     if (i_Parameters.size() < 2)
-        return refuse(__LINE__, "Cannot make parameter tuple for '%1%' with fewer than two parameters.");
+        return refuse("Cannot make parameter tuple for '%1%' with fewer than two parameters.");
     for (const EntryHandle parameter : i_Parameters)
         if (!Owns(parameter))
-            return refuse(__LINE__,
-                          "Cannot make parameter tuple for '%1%', the parameter '%2%' does not belong to the "
+            return refuse("Cannot make parameter tuple for '%1%', the parameter '%2%' does not belong to the "
                           "parameter builder.",
                           Name(parameter));
     for (std::size_t i = 0; i < i_Parameters.size(); ++i)
     {
         const TQL::ITuplePresentation* const pTuple = FindTuple(i_Parameters[i]);
         if (pTuple || Contains(i_Parameters.first(i), i_Parameters[i]))
-            return refuse(__LINE__, s_pTaken, Name(i_Parameters[i]), Name(pTuple ? pTuple->Primary : i_Primary));
+            return refuse(s_pTaken, Name(i_Parameters[i]), Name(pTuple ? pTuple->Primary : i_Primary));
     }
     for (const EntryHandle parameter : i_Parameters)
         if (m_CategoryOf.at(parameter) != m_CategoryOf.at(i_Parameters.front()))
-            return refuse(__LINE__, "Cannot make parameter tuple for '%1%' with parameters with different categories.");
+            return refuse("Cannot make parameter tuple for '%1%' with parameters with different categories.");
     if (!Contains(m_Order, i_Primary))
-        return refuse(__LINE__,
-                      "Cannot make parameter tuple for '%1%', the primary parameter was not found in the parameter "
+        return refuse("Cannot make parameter tuple for '%1%', the primary parameter was not found in the parameter "
                       "order list.");
     if (const TQL::ITuplePresentation* const pTuple = FindTuple(i_Primary))
-        return refuse(__LINE__, s_pTaken, Name(i_Primary), Name(pTuple->Primary));
+        return refuse(s_pTaken, Name(i_Primary), Name(pTuple->Primary));
     return true;
 }
 
@@ -105,7 +103,7 @@ TQL::IResult VStoreParameterBuilder::SetTupleText(EntryHandle i_Parameter,
 {
     if (!Owns(i_Parameter))
     {
-        LogParameter(TQL::ELogSeverity::Error, __LINE__, i_pRefusal, Name(i_Parameter));
+        LogParameter(TQL::ELogSeverity::Error, i_pRefusal, Name(i_Parameter));
         return TQL::Result::InvalidArgument;
     }
     TQL::ITuplePresentation* const pTuple = FindTuple(i_Parameter);
@@ -121,12 +119,12 @@ void VStoreParameterBuilder::SortCategories(std::span<const std::string> i_Order
     const auto unordered = boost::make_iterator_range(
         sorted.Categories.begin() + static_cast<std::ptrdiff_t>(sorted.OrderedCount), sorted.Categories.end());
     if (unordered.size() == 1)
-        LogParameter(TQL::ELogSeverity::Warning, __LINE__,
+        LogParameter(TQL::ELogSeverity::Warning,
                      "No ordering found for parameter category '%1%', the category will occur after the sorted "
                      "categories.",
                      unordered.front());
     else if (!unordered.empty())
-        LogParameter(TQL::ELogSeverity::Warning, __LINE__,
+        LogParameter(TQL::ELogSeverity::Warning,
                      "No ordering found for parameter categories '%1%', the categories will occur after the sorted "
                      "categories in alphabetical order.",
                      boost::algorithm::join(unordered, "' and '"));

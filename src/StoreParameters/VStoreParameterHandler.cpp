@@ -20,7 +20,7 @@ VStoreParameterHandler::VStoreParameterHandler(std::shared_ptr<TQL::IStore> i_pS
     bool bAnother = false;
     m_pActive = BecomeActiveHandler(*m_pStore, m_Root, bAnother);
     if (bAnother)
-        LogParameter(TQL::ELogSeverity::Error, __LINE__,
+        LogParameter(TQL::ELogSeverity::Error,
                      "A store parameter handler '%1%' of type '%2%' has been created while another active handler "
                      "instance already exists, TQL::IStoreParameterHandler::Remove() must be called on any existing "
                      "parameter handlers before creating a replacement.",

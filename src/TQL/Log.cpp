@@ -1,5 +1,7 @@
 #include "TQL/Log.h"
 
+#include <boost/format.hpp>
+
 #include <algorithm>
 #include <atomic>
 #include <cstdio>
@@ -39,6 +41,16 @@ LogState& GetState()
     return *pState;
 }
 
+/// The last folder and the name of a source file, without its ending.
+std::string_view SourceName(std::string_view i_Path)
+{
+    const std::size_t file = i_Path.find_last_of("/\\");
+    const std::size_t folder =
+        file == std::string_view::npos || file == 0 ? file : i_Path.find_last_of("/\\", file - 1);
+    const std::string_view name = folder == std::string_view::npos ? i_Path : i_Path.substr(folder + 1);
+    return name.substr(0, name.find_last_of('.'));
+}
+
 } // namespace
 
 VLogCategory& GetCategory(std::string_view i_Name)
@@ -71,8 +83,7 @@ bool IsEnabled(const VLogCategory& i_rCategory, ELogSeverity i_Severity)
     return static_cast<int>(i_Severity) <= i_rCategory.m_Threshold.load(std::memory_order_relaxed);
 }
 
-void Write(const VLogCategory& i_rCategory, ELogSeverity i_Severity, std::string_view i_Text, std::string_view i_Source,
-           int i_Line)
+void Write(const VLogCategory& i_rCategory, ELogSeverity i_Severity, std::string_view i_Text, const LogPlace& i_rPlace)
 {
     if (!IsEnabled(i_rCategory, i_Severity))
         return;
@@ -82,12 +93,28 @@ void Write(const VLogCategory& i_rCategory, ELogSeverity i_Severity, std::string
         const std::lock_guard lock(rState.m_Mutex);
         sinks = rState.m_Sinks;
     }
-    const LogMessage message{i_rCategory.m_Name, i_Severity, i_Text, i_Source, i_Line};
+    const LogMessage message{i_rCategory.m_Name, i_Severity, i_Text, SourceName(i_rPlace.Path), i_rPlace.Line};
     const std::lock_guard lock(rState.m_WriteMutex);
     for (const auto& pSink : sinks)
         (*pSink)(message);
     if (sinks.empty())
         std::fprintf(stderr, "%s: %.*s\n", i_rCategory.m_Name.c_str(), static_cast<int>(i_Text.size()), i_Text.data());
+}
+
+void WriteFormatted(const VLogCategory& i_rCategory, ELogSeverity i_Severity, const LogText& i_rFormat,
+                    std::span<const LogArgument> i_Arguments)
+{
+    try
+    {
+        boost::format format(i_rFormat.pText);
+        for (const LogArgument& rArgument : i_Arguments)
+            std::visit([&format](const auto& i_rValue) { format % i_rValue; }, rArgument);
+        Write(i_rCategory, i_Severity, format.str(), i_rFormat.Place);
+    }
+    catch (const boost::io::format_error&)
+    {
+        Write(i_rCategory, ELogSeverity::Error, i_rFormat.pText, i_rFormat.Place);
+    }
 }
 
 std::shared_ptr<void> AddSink(Sink i_Sink)

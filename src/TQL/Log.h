@@ -1,12 +1,15 @@
 #pragma once
 
-#include <boost/format.hpp>
-
+#include <array>
+#include <concepts>
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <source_location>
+#include <span>
 #include <string>
 #include <string_view>
+#include <variant>
 
 namespace TQL
 {
@@ -28,9 +31,37 @@ struct LogMessage
     std::string_view Category;
     ELogSeverity Severity;
     std::string_view Text;
-    std::string_view Source; ///< for example "CoreGraphics/Resources"
+    std::string_view Source; ///< room and file, for example "CoreGraphics/Resources"
     int Line;
 };
+
+/// Where a message comes from: by itself the line in the source that makes it, or a place that the message is known by.
+struct LogPlace
+{
+    // Implicit: as a default argument it stands for the line of the call.
+    LogPlace(const std::source_location& i_rWhere) : Path(i_rWhere.file_name()), Line(static_cast<int>(i_rWhere.line()))
+    {
+    }
+    LogPlace(std::string_view i_Path, int i_Line) : Path(i_Path), Line(i_Line) {}
+
+    std::string_view Path; ///< of a source file, or room and file alone
+    int Line;
+};
+
+/// A Boost.Format text and the place where it stands. Made by writing the text down as an argument.
+struct LogText
+{
+    LogText(const char* i_pText, const LogPlace& i_rPlace = std::source_location::current())
+        : pText(i_pText), Place(i_rPlace)
+    {
+    }
+
+    const char* pText; ///< outlives the message
+    LogPlace Place;
+};
+
+/// What takes the place of a placeholder: any number, character or text.
+using LogArgument = std::variant<std::int64_t, std::uint64_t, double, char, std::string_view>;
 
 /// The process-wide log. Any thread may write; sinks are called one at a time, on the writing thread, and must not log.
 namespace Log
@@ -46,30 +77,40 @@ void SetThreshold(VLogCategory& i_rCategory, ELogSeverity i_Severity);
 void SetDefaultThreshold(ELogSeverity i_Severity);
 
 bool IsEnabled(const VLogCategory& i_rCategory, ELogSeverity i_Severity);
-void Write(const VLogCategory& i_rCategory, ELogSeverity i_Severity, std::string_view i_Text, std::string_view i_Source,
-           int i_Line);
+void Write(const VLogCategory& i_rCategory, ELogSeverity i_Severity, std::string_view i_Text,
+           const LogPlace& i_rPlace = std::source_location::current());
 
 /// Adds a receiver; releasing the returned token removes it. Without any sink messages go to standard error.
 [[nodiscard]] std::shared_ptr<void> AddSink(Sink i_Sink);
 
+/// Of an argument of Format, which has to outlive it.
+template <typename T>
+LogArgument MakeLogArgument(const T& i_rValue)
+{
+    if constexpr (std::same_as<T, char>)
+        return i_rValue;
+    else if constexpr (std::floating_point<T>)
+        return double{i_rValue};
+    else if constexpr (std::signed_integral<T>)
+        return std::int64_t{i_rValue};
+    else if constexpr (std::unsigned_integral<T>)
+        return std::uint64_t{i_rValue};
+    else
+        return std::string_view(i_rValue);
+}
+
+void WriteFormatted(const VLogCategory& i_rCategory, ELogSeverity i_Severity, const LogText& i_rFormat,
+                    std::span<const LogArgument> i_Arguments);
+
 /// Writes a Boost.Format text with its arguments, formatting only when the category admits the severity. When the
 /// formatting fails the bare text is written at severity 2.
 template <typename... Args>
-void Format(const VLogCategory& i_rCategory, ELogSeverity i_Severity, std::string_view i_Source, int i_Line,
-            const char* i_pFormat, const Args&... i_rArgs)
+void Format(const VLogCategory& i_rCategory, ELogSeverity i_Severity, const LogText& i_rFormat, const Args&... i_rArgs)
 {
     if (!IsEnabled(i_rCategory, i_Severity))
         return;
-    try
-    {
-        boost::format format(i_pFormat);
-        (void)(format % ... % i_rArgs);
-        Write(i_rCategory, i_Severity, format.str(), i_Source, i_Line);
-    }
-    catch (const boost::io::format_error&)
-    {
-        Write(i_rCategory, ELogSeverity::Error, i_pFormat, i_Source, i_Line);
-    }
+    const std::array<LogArgument, sizeof...(Args)> arguments{MakeLogArgument(i_rArgs)...};
+    WriteFormatted(i_rCategory, i_Severity, i_rFormat, arguments);
 }
 
 } // namespace Log

@@ -24,10 +24,10 @@ std::error_code LastCError();
 bool LogLockers(const char* i_pFormat, const std::string& i_rPath);
 
 template <typename... Args>
-void LogFile(TQL::ELogSeverity i_Severity, const char* i_pFormat, const Args&... i_rArgs)
+void LogFile(TQL::ELogSeverity i_Severity, const TQL::LogText& i_rFormat, const Args&... i_rArgs)
 {
     static TQL::VLogCategory& rCategory = TQL::Log::GetCategory("FileSystem");
-    TQL::Log::Format(rCategory, i_Severity, "UtilsFileSystem", 0, i_pFormat, i_rArgs...);
+    TQL::Log::Format(rCategory, i_Severity, i_rFormat, i_rArgs...);
 }
 
 } // namespace UtilsFileSystem

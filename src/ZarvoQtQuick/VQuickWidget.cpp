@@ -16,10 +16,10 @@ namespace
 {
 
 template <typename... Args>
-void LogLine(TQL::ELogSeverity i_Severity, int i_Line, const char* i_pFormat, const Args&... i_rArgs)
+void LogLine(TQL::ELogSeverity i_Severity, const TQL::LogText& i_rFormat, const Args&... i_rArgs)
 {
     static const TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("QuickWidget");
-    TQL::Log::Format(s_rCategory, i_Severity, "ZarvoQtQuick/VQuickWidget", i_Line, i_pFormat, i_rArgs...);
+    TQL::Log::Format(s_rCategory, i_Severity, i_rFormat, i_rArgs...);
 }
 
 std::string JoinErrors(const QList<QQmlError>& i_rErrors)
@@ -53,7 +53,7 @@ VQuickWidget::VQuickWidget(QQmlEngine* i_pEngine, QWidget* i_pParent)
                 const char* pFormat = i_Error == QQuickWindow::ContextNotAvailable
                                           ? "Scene graph error, context unavailable: %1%."
                                           : "Unknown scene graph error: %1%.";
-                LogLine(TQL::ELogSeverity::Error, __LINE__, pFormat, i_rMessage.toStdString());
+                LogLine(TQL::ELogSeverity::Error, pFormat, i_rMessage.toStdString());
             });
 }
 
@@ -90,7 +90,7 @@ void VQuickWidget::SetSource(const QString& i_rRelativeName, const QStringList& 
     m_Source = TQL::IO::FindComponentUrl(i_rRelativeName, m_SearchFolders);
     if (m_Source.isEmpty())
     {
-        LogLine(TQL::ELogSeverity::Error, __LINE__,
+        LogLine(TQL::ELogSeverity::Error,
                 "Component resource file %1% not found, have you forgotten to add the resource to the relevant qrc "
                 "file?",
                 i_rRelativeName.toStdString());
@@ -106,8 +106,8 @@ void VQuickWidget::SetSource(const QString& i_rRelativeName, const QStringList& 
 void VQuickWidget::OnComponentStatus()
 {
     if (m_pComponent->isError())
-        LogLine(TQL::ELogSeverity::Error, __LINE__, "Error loading component %1%:\n%2%",
-                m_Source.toString().toStdString(), JoinErrors(m_pComponent->errors()));
+        LogLine(TQL::ELogSeverity::Error, "Error loading component %1%:\n%2%", m_Source.toString().toStdString(),
+                JoinErrors(m_pComponent->errors()));
     else if (m_pComponent->isReady())
         CreateRoot();
 }
@@ -117,12 +117,12 @@ void VQuickWidget::CreateRoot()
     QObject* pRoot = m_pComponent->create(m_pContext);
     if (!pRoot)
     {
-        LogLine(TQL::ELogSeverity::Error, __LINE__, "Error loading component %1%:\n%2%",
-                m_Source.toString().toStdString(), JoinErrors(m_pComponent->errors()));
+        LogLine(TQL::ELogSeverity::Error, "Error loading component %1%:\n%2%", m_Source.toString().toStdString(),
+                JoinErrors(m_pComponent->errors()));
         return;
     }
     setContent(m_Source, m_pComponent, pRoot);
-    LogLine(TQL::ELogSeverity::Detail, __LINE__, "Loaded component %1%.", m_Source.toString().toStdString());
+    LogLine(TQL::ELogSeverity::Detail, "Loaded component %1%.", m_Source.toString().toStdString());
 }
 
 void VQuickWidget::ClearSource()

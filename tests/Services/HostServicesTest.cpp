@@ -148,8 +148,8 @@ TEST(VGlobalLogSink, KeepsTheNewestLinesAndTellsOnce)
         sink.LinesChanged()->AddDirect([&] { ++told; });
         TQL::VLogCategory& rCategory = TQL::Log::GetCategory("Sink");
         for (const char* pText : {"a", "b", "c", "d"})
-            TQL::Log::Write(rCategory, TQL::ELogSeverity::Warning, pText, "here", 1);
-        TQL::Log::Write(rCategory, TQL::ELogSeverity::Detail, "below the threshold", "here", 1);
+            TQL::Log::Write(rCategory, TQL::ELogSeverity::Warning, pText, {"here", 1});
+        TQL::Log::Write(rCategory, TQL::ELogSeverity::Detail, "below the threshold", {"here", 1});
         std::vector<std::string> lines;
         for (const VGlobalLogSink::Line& rLine : sink.Lines())
             lines.push_back(rLine.Text);
@@ -158,7 +158,7 @@ TEST(VGlobalLogSink, KeepsTheNewestLinesAndTellsOnce)
         pPostal->RunAll();
         EXPECT_EQ(told, 1);
     }
-    TQL::Log::Write(TQL::Log::GetCategory("Sink"), TQL::ELogSeverity::Warning, "after the sink", "here", 1);
+    TQL::Log::Write(TQL::Log::GetCategory("Sink"), TQL::ELogSeverity::Warning, "after the sink", {"here", 1});
     std::rewind(pFile);
     std::string written(200, '\0');
     written.resize(std::fread(written.data(), 1, written.size(), pFile));

@@ -127,7 +127,7 @@ TEST(EventList, TheLastEventReachedIsBold)
 
 void Log(TQL::ELogSeverity i_Severity, const std::string& i_rText)
 {
-    TQL::Log::Write(TQL::Log::GetCategory("WindowModelsTest"), i_Severity, i_rText, "WindowModelsTest", 0);
+    TQL::Log::Write(TQL::Log::GetCategory("WindowModelsTest"), i_Severity, i_rText);
 }
 
 TEST(LogModel, KeepsTheNewestOfManyThreads)

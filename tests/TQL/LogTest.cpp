@@ -23,11 +23,11 @@ TEST(Log, FormatsOnlyWhatTheThresholdAdmits)
     TQL::VLogCategory& rCategory = TQL::Log::GetCategory("LogTest");
     EXPECT_EQ(&rCategory, &TQL::Log::GetCategory("LogTest"));
 
-    TQL::Log::Format(rCategory, ELogSeverity::Detail, "Test", 1, "hidden %1%", 1);
-    TQL::Log::Format(rCategory, ELogSeverity::Warning, "Test", 2, "%2% after %1%", "a", 7);
-    TQL::Log::Format(rCategory, ELogSeverity::Information, "Test", 3, "[%1%]", 1, 2);
+    TQL::Log::Format(rCategory, ELogSeverity::Detail, "hidden %1%", 1);
+    TQL::Log::Format(rCategory, ELogSeverity::Warning, "%2% after %1%", "a", 7);
+    TQL::Log::Format(rCategory, ELogSeverity::Information, "[%1%]", 1, 2);
     TQL::Log::SetThreshold(rCategory, ELogSeverity::Detail);
-    TQL::Log::Format(rCategory, ELogSeverity::Detail, "Test", 4, "shown");
+    TQL::Log::Format(rCategory, ELogSeverity::Detail, "shown");
     EXPECT_EQ(lines, (std::vector<std::string>{"LogTest 3 7 after a", "LogTest 2 [%1%]", "LogTest 6 shown"}))
         << "a failure of formatting falls back to the bare text as an error";
 
@@ -36,8 +36,35 @@ TEST(Log, FormatsOnlyWhatTheThresholdAdmits)
     auto pOther = TQL::Log::AddSink([pOwned = std::move(pLast)](const TQL::LogMessage&) {});
     pOther.reset(); // what a sink owned may use the log as it goes
     pOther = TQL::Log::AddSink([](const TQL::LogMessage&) {});
-    TQL::Log::Format(rCategory, ELogSeverity::Error, "Test", 5, "nobody");
+    TQL::Log::Format(rCategory, ELogSeverity::Error, "nobody");
     EXPECT_EQ(lines.size(), 3u);
+}
+
+/// A room's own way to write, as many rooms have one.
+template <typename... Args>
+void Tell(const TQL::LogText& i_rFormat, const Args&... i_rArgs)
+{
+    TQL::Log::Format(TQL::Log::GetCategory("LogTest"), ELogSeverity::Error, i_rFormat, i_rArgs...);
+}
+
+TEST(Log, AMessageComesFromTheLineThatMakesIt)
+{
+    std::vector<std::string> places;
+    const auto pSink = TQL::Log::AddSink(
+        [&](const TQL::LogMessage& i_rMessage)
+        { places.push_back(std::string(i_rMessage.Source) + ' ' + std::to_string(i_rMessage.Line)); });
+    const auto here = [](std::uint_least32_t i_Before)
+    {
+        return "TQL/LogTest " + std::to_string(i_Before + 1);
+    };
+    std::uint_least32_t before = std::source_location::current().line();
+    Tell("%1% %2% %3% %4%", 1u, 2.5, 'c', std::string("text"));
+    EXPECT_EQ(places.back(), here(before));
+    before = std::source_location::current().line();
+    TQL::Log::Write(TQL::Log::GetCategory("LogTest"), ELogSeverity::Error, "bare");
+    EXPECT_EQ(places.back(), here(before));
+    Tell({"known by another place", {"Room/Class", 190}});
+    EXPECT_EQ(places.back(), "Room/Class 190");
 }
 
 TEST(Log, SinksSeeOneMessageAtATime)
@@ -59,7 +86,7 @@ TEST(Log, SinksSeeOneMessageAtATime)
             [&rCategory]
             {
                 for (int i = 0; i < 500; ++i)
-                    TQL::Log::Write(rCategory, ELogSeverity::Error, "x", "Test", 1);
+                    TQL::Log::Write(rCategory, ELogSeverity::Error, "x");
             });
     threads.clear();
     EXPECT_EQ(overlaps, 0);

@@ -34,9 +34,9 @@ VRecordedContext::VRecordedContext(std::string i_Name, std::shared_ptr<VSubTypeT
                 result = AddChannel(rDefinition, std::move(pSamples), pChannel);
         }
         if (result.IsError())
-            TQL::Log::Format(TQL::Log::GetCategory("Channels"), TQL::ELogSeverity::Warning, "Channels/VRecordedContext",
-                             __LINE__, "Channel \"%1%\" of recording \"%2%\" is left out: %3%", rChannel.Name,
-                             m_pRecording->Name, result.Name());
+            TQL::Log::Format(TQL::Log::GetCategory("Channels"), TQL::ELogSeverity::Warning,
+                             "Channel \"%1%\" of recording \"%2%\" is left out: %3%", rChannel.Name, m_pRecording->Name,
+                             result.Name());
     }
 }
 

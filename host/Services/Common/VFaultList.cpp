@@ -19,8 +19,7 @@ void VFaultList::Add(const std::string& i_rFault)
             return;
         m_Faults.push_back(i_rFault);
     }
-    TQL::Log::Write(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Warning, i_rFault, "Services/VFaultList",
-                    __LINE__);
+    TQL::Log::Write(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Warning, i_rFault);
 }
 
 std::vector<std::string> VFaultList::Faults() const

@@ -14,8 +14,8 @@ void RunGuarded(const TFunction& i_rJob, const char* i_pWhere)
 {
     const auto report = [i_pWhere](const char* i_pText)
     {
-        TQL::Log::Format(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Error, "Services/JobGuard", __LINE__,
-                         "A job on %1% failed: %2%", i_pWhere, i_pText);
+        TQL::Log::Format(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Error, "A job on %1% failed: %2%", i_pWhere,
+                         i_pText);
     };
     try
     {

@@ -10,8 +10,7 @@ namespace
 
 void Warn(const char* i_pFormat, const std::string& i_rName)
 {
-    TQL::Log::Format(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Warning, "Services/VContentRegistry", __LINE__,
-                     i_pFormat, i_rName);
+    TQL::Log::Format(TQL::Log::GetCategory("Host"), TQL::ELogSeverity::Warning, i_pFormat, i_rName);
 }
 
 } // namespace

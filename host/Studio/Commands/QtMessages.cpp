@@ -63,7 +63,7 @@ void HandleMessage(QtMsgType i_Type, const QMessageLogContext& i_rContext, const
     const bool bDesktop = i_rText.startsWith(QLatin1String("QStandardPaths:"));
     const TQL::ELogSeverity severity = bDesktop ? TQL::ELogSeverity::Detail : SeverityOf(i_Type);
     TQL::Log::Write(TQL::Log::GetCategory("Qt"), severity, i_rText.toStdString(),
-                    i_rContext.file ? i_rContext.file : "Qt", i_rContext.line);
+                    {i_rContext.file ? i_rContext.file : "Qt", i_rContext.line});
 }
 
 } // namespace

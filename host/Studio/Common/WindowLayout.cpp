@@ -24,8 +24,7 @@ constexpr double smallestShare = 0.05;
 
 void LogWarning(const char* i_pFormat, const std::filesystem::path& i_rFile)
 {
-    TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/WindowLayout", __LINE__,
-                     i_pFormat, TextFromPath(i_rFile));
+    TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, i_pFormat, TextFromPath(i_rFile));
 }
 
 QRectF PutInside(const QRectF& i_rPlace)

@@ -117,7 +117,7 @@ void VRecentFiles::Save()
     const QByteArray bytes = QJsonDocument(rows).toJson();
     const bool bSaved = file.open(QIODevice::WriteOnly) && file.write(bytes) == bytes.size() && file.commit();
     if (!bSaved && !m_bUnsaved) // told once
-        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/VRecentFiles", __LINE__,
+        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning,
                          "The list of recent files cannot be kept in %1%: %2%", TextFromPath(m_File),
                          file.errorString().toStdString());
     m_bUnsaved = !bSaved;

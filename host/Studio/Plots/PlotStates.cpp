@@ -28,8 +28,8 @@ Store::EntryPath PathOf(std::size_t i_Number)
 
 void LogWarning(const char* i_pFormat, const std::filesystem::path& i_rFile, const TQL::IResult& i_rResult)
 {
-    TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/PlotStates", __LINE__,
-                     i_pFormat, TextFromPath(i_rFile), i_rResult.Description());
+    TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, i_pFormat, TextFromPath(i_rFile),
+                     i_rResult.Description());
 }
 
 } // namespace

@@ -133,8 +133,8 @@ void VLiveActions::TellSaved(const QString& i_rPath, const QStringList& i_rRemar
 {
     m_Tell("Saved live data as " + i_rPath.toStdString());
     for (const QString& rRemark : i_rRemarks)
-        TQL::Log::Format(TQL::Log::GetCategory("Live"), TQL::ELogSeverity::Warning, "Studio/VLiveActions", __LINE__,
-                         "%1%: %2%", i_rPath.toStdString(), rRemark.toStdString());
+        TQL::Log::Format(TQL::Log::GetCategory("Live"), TQL::ELogSeverity::Warning, "%1%: %2%", i_rPath.toStdString(),
+                         rRemark.toStdString());
     if (i_rRemarks.isEmpty())
         return;
     auto* pBox =

@@ -75,8 +75,8 @@ void VLiveCapture::Work()
             lock.lock();
             m_bEnded = result.IsError() || result == TQL::Result::OkButNoEffect;
             if (result.IsError())
-                TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error, "Studio/VLiveCapture",
-                                 __LINE__, "The live capture has stopped: %1%", result.Description());
+                TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error,
+                                 "The live capture has stopped: %1%", result.Description());
             if (m_bEnded)
                 return;
             done += count;

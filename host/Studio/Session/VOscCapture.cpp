@@ -16,9 +16,10 @@ namespace
 
 constexpr std::chrono::seconds warnEvery{30};
 
-void Log(TQL::ELogSeverity i_Severity, int i_Line, const std::string& i_rText)
+void Log(TQL::ELogSeverity i_Severity, const std::string& i_rText,
+         const TQL::LogPlace& i_rPlace = std::source_location::current())
 {
-    TQL::Log::Write(TQL::Log::GetCategory("Live"), i_Severity, i_rText, "Studio/VOscCapture", i_Line);
+    TQL::Log::Write(TQL::Log::GetCategory("Live"), i_Severity, i_rText, i_rPlace);
 }
 
 } // namespace
@@ -44,7 +45,7 @@ struct VOscCapture::Shared
 
     static void Report(const std::shared_ptr<Shared>& i_rpShared, const std::string& i_rText)
     {
-        Log(TQL::ELogSeverity::Warning, __LINE__, i_rText);
+        Log(TQL::ELogSeverity::Warning, i_rText);
         const auto now = std::chrono::steady_clock::now();
         if (i_rpShared->WarnedAt && now - *i_rpShared->WarnedAt < warnEvery)
             return;
@@ -81,7 +82,7 @@ VOscCapture::VOscCapture(const Streaming::VOscInput::Options& i_rOptions,
     };
     callbacks.Note = [](const std::string& i_rText)
     {
-        Log(TQL::ELogSeverity::Information, __LINE__, i_rText);
+        Log(TQL::ELogSeverity::Information, i_rText);
     };
     callbacks.Trouble = [pShared = m_pShared](const std::string& i_rText)
     {

@@ -48,8 +48,8 @@ void LogWarnings(const Recordings::VRecording& i_rRecording, const std::filesyst
     const auto log = [&i_rPath](TQL::ELogSeverity i_Severity, const std::vector<std::string>& i_rSentences)
     {
         for (const std::string& rSentence : i_rSentences)
-            TQL::Log::Format(TQL::Log::GetCategory("Studio"), i_Severity, "Studio/VStudioSession", __LINE__, "%1%: %2%",
-                             TextFromPath(i_rPath.filename()), rSentence);
+            TQL::Log::Format(TQL::Log::GetCategory("Studio"), i_Severity, "%1%: %2%", TextFromPath(i_rPath.filename()),
+                             rSentence);
     };
     log(TQL::ELogSeverity::Warning, i_rRecording.Warnings);
     log(TQL::ELogSeverity::Information, i_rRecording.Remarks);
@@ -228,7 +228,7 @@ void VStudioSession::Close()
     if (!m_pPlugin->IsLoaded())
         return;
     if (const TQL::IResult result = m_pPlugin->Unload(); result != TQL::Result::Ok)
-        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning, "Studio/VStudioSession", __LINE__,
+        TQL::Log::Format(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Warning,
                          "The module was not unloaded cleanly: %1%", result.Description());
 }
 

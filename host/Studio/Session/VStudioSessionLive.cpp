@@ -23,9 +23,9 @@ constexpr double slowestReplay = 0.01;
 constexpr double fastestReplay = 100.0;
 
 template <typename TText>
-void Log(TQL::ELogSeverity i_Severity, int i_Line, const char* i_pFormat, const TText& i_rText)
+void Log(TQL::ELogSeverity i_Severity, const TQL::LogText& i_rFormat, const TText& i_rText)
 {
-    TQL::Log::Format(TQL::Log::GetCategory("Studio"), i_Severity, "Studio/VStudioSession", i_Line, i_pFormat, i_rText);
+    TQL::Log::Format(TQL::Log::GetCategory("Studio"), i_Severity, i_rFormat, i_rText);
 }
 
 std::shared_ptr<const Recordings::VRecording> RecordingOf(const Channels::VChannelService& i_rChannels,
@@ -63,7 +63,7 @@ void VStudioSession::StartLive(std::uint32_t i_Subjects, std::int64_t i_HistoryF
     const auto pFeed = std::make_shared<VSimulatedFeed>(options, pContext);
     if (i_HistoryFrames > 0)
         if (const TQL::IResult result = pFeed->Produce(0, i_HistoryFrames); result.IsError())
-            Log(TQL::ELogSeverity::Error, __LINE__, "The live capture has no history: %1%", result.Description());
+            Log(TQL::ELogSeverity::Error, "The live capture has no history: %1%", result.Description());
     AddLive(pContext, Simulation::VWalkSimulator::FrameRate);
     m_pCapture = std::make_unique<VLiveCapture>([pFeed](std::int64_t i_First, std::int64_t i_Count)
                                                 { return pFeed->Produce(i_First, i_Count); },
@@ -127,7 +127,7 @@ TQL::IResult VStudioSession::StartReplay(const std::string& i_rContextName, doub
     const auto pFeed =
         std::make_shared<Streaming::VReplayFeed>(pRecording, pContext, Streaming::VReplayFeed::Options{i_bLoop});
     for (const std::string& rWarning : pFeed->Warnings())
-        Log(TQL::ELogSeverity::Warning, __LINE__, "%1%", rWarning);
+        Log(TQL::ELogSeverity::Warning, "%1%", rWarning);
     AddLive(pContext, pFeed->FramesPerSecond() * i_Speed);
     m_pCapture = std::make_unique<VLiveCapture>([pFeed](std::int64_t i_First, std::int64_t i_Count)
                                                 { return pFeed->Produce(i_First, i_Count); },

@@ -11,11 +11,10 @@ namespace GraphPlotUI
 namespace
 {
 
-void LogChannelError(int i_Line, const std::string& i_rType, std::string_view i_Error)
+void LogChannelError(const std::string& i_rType, std::string_view i_Error)
 {
     static const TQL::VLogCategory& rCategory = TQL::Log::GetCategory("GraphPlot");
-    TQL::Log::Format(rCategory, TQL::ELogSeverity::Error, "GraphPlotSystem/VActiveChannelBuilder", i_Line,
-                     "Channel %1% Error %2%", i_rType, i_Error);
+    TQL::Log::Format(rCategory, TQL::ELogSeverity::Error, "Channel %1% Error %2%", i_rType, i_Error);
 }
 
 void LogErrorsOf(const TQL::IChannel& i_rChannel)
@@ -26,7 +25,7 @@ void LogErrorsOf(const TQL::IChannel& i_rChannel)
     std::vector<std::string> errors;
     pParameters->GetErrors(errors);
     for (const std::string& rError : errors)
-        LogChannelError(__LINE__, i_rChannel.GetInstanceId().TypeName, rError);
+        LogChannelError(i_rChannel.GetInstanceId().TypeName, rError);
 }
 
 } // namespace
@@ -108,7 +107,7 @@ void VActiveChannelBuilder::TakeCreated(const std::string& i_rType, TQL::IResult
                                         const ChannelList& i_rCreated, SourceList& io_rBuilt)
 {
     if (i_Result.IsError() && i_rCreated.empty())
-        LogChannelError(__LINE__, i_rType, i_Result.Description());
+        LogChannelError(i_rType, i_Result.Description());
     for (const std::shared_ptr<TQL::IChannel>& rpChannel : i_rCreated)
     {
         if (!rpChannel)

@@ -15,11 +15,10 @@ namespace
 using ChannelList = std::vector<std::shared_ptr<TQL::IChannel>>;
 
 template <typename... Args>
-void LogDetail(int i_Line, const char* i_pFormat, const Args&... i_rArgs)
+void LogDetail(const TQL::LogText& i_rFormat, const Args&... i_rArgs)
 {
     static const TQL::VLogCategory& rCategory = TQL::Log::GetCategory("GraphPlot");
-    TQL::Log::Format(rCategory, TQL::ELogSeverity::Detail, "GraphPlotSystem/VContextSwitchPlan", i_Line, i_pFormat,
-                     i_rArgs...);
+    TQL::Log::Format(rCategory, TQL::ELogSeverity::Detail, i_rFormat, i_rArgs...);
 }
 
 /// What takes the place of a channel; null when there is nothing.
@@ -47,16 +46,16 @@ void PlanMigration(const VActiveChannelData& i_rRow, const std::string& i_rConte
     const TQL::IResult result = FindSuccessor(i_rRow.pChannel, i_rNewContext, i_pMigrationService, pSuccessor);
     if (result.IsError())
     {
-        LogDetail(__LINE__, "Failed to migrate channel %1% to context '%2%': %3%", i_rRow.Name.toStdString(),
-                  i_rNewContext, result.Description());
+        LogDetail("Failed to migrate channel %1% to context '%2%': %3%", i_rRow.Name.toStdString(), i_rNewContext,
+                  result.Description());
         if (io_rPlan.FirstFailure.IsSuccess())
             io_rPlan.FirstFailure = result;
         return;
     }
     if (!pSuccessor)
         return; // the row goes on with the channel that it has
-    LogDetail(__LINE__, "Migrated channel %1% from context '%2%' to context '%3%'", i_rRow.Name.toStdString(),
-              i_rContext, i_rNewContext);
+    LogDetail("Migrated channel %1% from context '%2%' to context '%3%'", i_rRow.Name.toStdString(), i_rContext,
+              i_rNewContext);
     io_rPlan.bMigrated = true;
     io_rPlan.Changes.emplace(i_rRow.pChannel.get(), std::move(pSuccessor));
 }
@@ -67,7 +66,7 @@ void PlanRenewal(const VActiveChannelData& i_rRow, const std::string& i_rContext
     std::shared_ptr<TQL::IChannel> pAnew = FindChannelAnew(i_rRow.pChannel, i_pMigrationService);
     if (pAnew == i_rRow.pChannel)
         return;
-    LogDetail(__LINE__, "Found channel %1% again in context '%2%'", i_rRow.Name.toStdString(), i_rContext);
+    LogDetail("Found channel %1% again in context '%2%'", i_rRow.Name.toStdString(), i_rContext);
     io_rPlan.Changes.emplace(i_rRow.pChannel.get(), std::move(pAnew));
 }
 
@@ -107,7 +106,7 @@ VContextSwitchPlan PlanContextSwitch(const VActiveChannelRows::RowList& i_rRows,
             PlanMigration(*rpRow, context, i_rNewContext, i_pMigrationService, plan);
             break;
         case EContextSwitchFate::Leave:
-            LogDetail(__LINE__, "Removing channel %1% from context '%2%' when switching to context '%3%'",
+            LogDetail("Removing channel %1% from context '%2%' when switching to context '%3%'",
                       rpRow->Name.toStdString(), context, i_rNewContext);
             plan.Changes.emplace(rpRow->pChannel.get(), nullptr);
             break;

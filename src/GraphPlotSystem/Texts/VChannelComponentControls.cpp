@@ -30,8 +30,7 @@ TQL::VDisabledComponents& VChannelComponentControls::EnsureEntryLocked(std::uint
     const auto found = m_Disabled.find(i_SubType);
     if (found != m_Disabled.end())
         return found->second;
-    TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Detail,
-                     "GraphPlotSystem/VChannelComponentControls", __LINE__, i_pLogFormat, i_SubType);
+    TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Detail, i_pLogFormat, i_SubType);
     return m_Disabled.try_emplace(i_SubType, s_FirstBuckets).first->second;
 }
 

@@ -25,17 +25,16 @@ TQL::VLogCategory& LogCategory()
 }
 
 template <typename... Args>
-void LogError(int i_Line, const char* i_pFormat, const Args&... i_rArgs)
+void LogError(const TQL::LogText& i_rFormat, const Args&... i_rArgs)
 {
-    TQL::Log::Format(LogCategory(), TQL::ELogSeverity::Error, "GraphPlotSystem/VTraceDataUpdater", i_Line, i_pFormat,
-                     i_rArgs...);
+    TQL::Log::Format(LogCategory(), TQL::ELogSeverity::Error, i_rFormat, i_rArgs...);
 }
 
 void SetParameter(TQL::IChannel& i_rChannel, const char* i_pName, const TQL::ParameterValue& i_rValue)
 {
     const TQL::IResult result = i_rChannel.GetParameters()->SetParameter(i_pName, i_rValue);
     if (result.IsError())
-        LogError(__LINE__, "Failed to set cache channel parameter %1%: %2%", i_pName, result.Description());
+        LogError("Failed to set cache channel parameter %1%: %2%", i_pName, result.Description());
 }
 
 /// Clears the flag of a running update on every way out.
@@ -108,8 +107,8 @@ void VTraceDataUpdater::TryUpdateRecordLocked(CacheRecord& o_rRecord, const TQL:
     catch (const std::exception& rException)
     {
         if (!std::exchange(o_rRecord.bFailing, true))
-            LogError(__LINE__, "Failed to update trace data of channel: %1% %2%: %3%", i_rId.DataContextName,
-                     i_rId.TypeName, rException.what());
+            LogError("Failed to update trace data of channel: %1% %2%: %3%", i_rId.DataContextName, i_rId.TypeName,
+                     rException.what());
     }
 }
 
@@ -181,7 +180,7 @@ bool VTraceDataUpdater::CreateCacheLocked(CacheRecord& o_rRecord, const TQL::ICh
     auto pCache = m_pChannelService->CreateDerivedChannel("Cache", asItStands, {o_rRecord.pSource});
     if (!pCache)
     {
-        LogError(__LINE__, "Failed to create cache channel: %1% %2%", i_rId.DataContextName, i_rId.TypeName);
+        LogError("Failed to create cache channel: %1% %2%", i_rId.DataContextName, i_rId.TypeName);
         return false;
     }
     SetParameter(*pCache, "SupportLodding", true);

@@ -97,8 +97,8 @@ bool FindDivisions(const AxisRange& i_rRange, double& o_rMajor, double& o_rMinor
         step /= LadderDivisors[index++];
     if (index >= LadderSteps.size())
     {
-        TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Error, "GraphPlotUI/AxisRange", 190,
-                         "Failed to find divisions for min gap %1%", gap);
+        TQL::Log::Format(TQL::Log::GetCategory("GraphPlot"), TQL::ELogSeverity::Error,
+                         {"Failed to find divisions for min gap %1%", {"GraphPlotUI/AxisRange", 190}}, gap);
         return false;
     }
 
