@@ -12,8 +12,8 @@ namespace
 void LogAnother(const char* i_pWhat)
 {
     static const TQL::VLogCategory& s_rCategory = TQL::Log::GetCategory("NotificationSystem");
-    TQL::Log::Format(s_rCategory, TQL::ELogSeverity::Error, "NotificationSystem/Signals", __LINE__,
-                     "A further subscriber of the same notice threw: %1%", i_pWhat);
+    TQL::Log::Format(s_rCategory, TQL::ELogSeverity::Error, "A further subscriber of the same notice threw: %1%",
+                     i_pWhat);
 }
 
 } // namespace

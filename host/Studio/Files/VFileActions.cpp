@@ -152,8 +152,7 @@ void VFileActions::TellWarnings(const QString& i_rFile, int i_Count)
 /// One line for them all, and each in the log.
 void VFileActions::TellRefused(const QString& i_rMessage)
 {
-    TQL::Log::Write(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error, i_rMessage.toStdString(),
-                    "Studio/VFileActions", __LINE__);
+    TQL::Log::Write(TQL::Log::GetCategory("Studio"), TQL::ELogSeverity::Error, i_rMessage.toStdString());
     const QString text =
         ++m_Refused == 1
             ? i_rMessage
