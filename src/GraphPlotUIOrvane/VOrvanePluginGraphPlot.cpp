@@ -1,8 +1,8 @@
 #include "GraphPlotUIOrvane/VOrvanePluginGraphPlot.h"
 
 #include "CoreGraphics/Resources.h"
-#include "GraphPlotSystem/SharedObject.h"
-#include "GraphPlotSystem/VOrvaneGraphPlotTime.h"
+#include "GraphPlotSystem/Common/SharedObject.h"
+#include "GraphPlotSystem/Time/VOrvaneGraphPlotTime.h"
 #include "GraphPlotUIOrvane/QmlTypes.h"
 #include "GraphPlotUIOrvane/VOrvaneGraphPlotWindowContentFactory.h"
 #include "OrvanePluginInterface/IHostCoreServices.h"

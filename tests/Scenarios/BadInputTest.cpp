@@ -1,5 +1,5 @@
-#include "GraphPlotSystem/VSubplotManager.h"
-#include "GraphPlotSystem/VSubplotModel.h"
+#include "GraphPlotSystem/Subplots/VSubplotManager.h"
+#include "GraphPlotSystem/Subplots/VSubplotModel.h"
 #include "Scenarios/PlotScenario.h"
 #include "Scenarios/SmallTake.h"
 

@@ -1,5 +1,6 @@
 #include "Recordings/C3d/C3dWriter.h"
 
+#include "Recordings/C3d/C3dHead.h"
 #include "Recordings/C3d/C3dHeader.h"
 #include "Recordings/C3d/C3dParameterWriter.h"
 #include "Recordings/C3d/C3dQuantities.h"
@@ -22,7 +23,6 @@ namespace Recordings
 namespace
 {
 
-constexpr std::uint16_t FirstParameterBlock = 2;
 constexpr std::size_t WriteBytes = 1 << 20; // frames are handed to the file in pieces of about this size
 
 template <typename Get>
@@ -131,22 +131,24 @@ void AddEventGroup(const std::vector<RecordedEvent>& i_rEvents, VC3dParameterWri
     o_rWriter.AddReals("TIMES", times, 2);
 }
 
-std::optional<std::vector<std::byte>> MakeParameters(const VRecording& i_rRecording, const C3dWritePlan& i_rPlan,
-                                                     std::uint16_t i_DataBlock)
+} // namespace
+
+std::optional<std::vector<std::byte>> MakeC3dParameters(const std::vector<RecordedEvent>& i_rEvents,
+                                                        const C3dWritePlan& i_rPlan, std::uint16_t i_DataBlock)
 {
     VC3dParameterWriter writer;
     AddPointGroup(i_rPlan, i_DataBlock, writer);
     AddAnalogGroup(i_rPlan, writer);
     if (i_rPlan.IsLong())
         AddTrialGroup(i_rPlan, writer);
-    if (!i_rRecording.Events.empty())
-        AddEventGroup(i_rRecording.Events, writer);
+    if (!i_rEvents.empty())
+        AddEventGroup(i_rEvents, writer);
     return writer.Finish();
 }
 
-std::vector<std::byte> MakeHeader(const C3dWritePlan& i_rPlan, std::uint16_t i_DataBlock)
+std::vector<std::byte> MakeC3dHeader(const C3dWritePlan& i_rPlan, std::uint16_t i_DataBlock)
 {
-    std::vector<std::byte> header{static_cast<std::byte>(FirstParameterBlock), std::byte{0x50}};
+    std::vector<std::byte> header{static_cast<std::byte>(FirstC3dParameterBlock), std::byte{0x50}};
     AppendC3dWord(CutToWord(i_rPlan.Points.size()), header);
     AppendC3dWord(CutToWord(i_rPlan.Analog.size() * i_rPlan.AnalogSamplesPerFrame), header);
     AppendC3dWord(CutToWord(i_rPlan.FirstFrame), header);
@@ -160,8 +162,7 @@ std::vector<std::byte> MakeHeader(const C3dWritePlan& i_rPlan, std::uint16_t i_D
     return header;
 }
 
-// A missing point is zeros with a residual of -1; one that lacks only some of its components keeps the others.
-void AppendPoint(std::span<const float> i_Position, std::vector<std::byte>& o_rBytes)
+void AppendC3dPoint(std::span<const float> i_Position, std::vector<std::byte>& o_rBytes)
 {
     const bool bMissing =
         std::all_of(i_Position.begin(), i_Position.end(), [](float i_Value) { return std::isnan(i_Value); });
@@ -170,10 +171,13 @@ void AppendPoint(std::span<const float> i_Position, std::vector<std::byte>& o_rB
     AppendC3dReal(bMissing ? -1.0f : 0.0f, o_rBytes);
 }
 
+namespace
+{
+
 void AppendFrame(const C3dWritePlan& i_rPlan, std::size_t i_Frame, std::vector<std::byte>& o_rBytes)
 {
     for (const RecordedChannel* pPoint : i_rPlan.Points)
-        AppendPoint(std::span(pPoint->Samples).subspan(i_Frame * 3, 3), o_rBytes);
+        AppendC3dPoint(std::span(pPoint->Samples).subspan(i_Frame * 3, 3), o_rBytes);
     for (std::size_t sample = 0; sample < i_rPlan.AnalogSamplesPerFrame; ++sample)
         for (const RecordedChannel* pAnalog : i_rPlan.Analog)
             AppendC3dReal(pAnalog->Samples[i_Frame * i_rPlan.AnalogSamplesPerFrame + sample], o_rBytes);
@@ -183,16 +187,16 @@ TQL::IResult WriteFile(const VRecording& i_rRecording, const C3dWritePlan& i_rPl
                        const std::filesystem::path& i_rPath, std::string& o_rError)
 {
     // The parameters name the block behind them; they are as long whatever number stands there.
-    auto parameters = MakeParameters(i_rRecording, i_rPlan, 0);
+    auto parameters = MakeC3dParameters(i_rRecording.Events, i_rPlan, 0);
     if (!parameters)
     {
         o_rError =
             FileMessage(i_rPath, "the names and events are more than a C3D file can hold. Choose fewer channels.");
         return TQL::Result::NotSupported;
     }
-    const auto dataBlock = static_cast<std::uint16_t>(FirstParameterBlock + parameters->size() / C3dBlockBytes);
-    parameters = MakeParameters(i_rRecording, i_rPlan, dataBlock);
-    std::vector<std::byte> bytes = MakeHeader(i_rPlan, dataBlock);
+    const auto dataBlock = static_cast<std::uint16_t>(FirstC3dParameterBlock + parameters->size() / C3dBlockBytes);
+    parameters = MakeC3dParameters(i_rRecording.Events, i_rPlan, dataBlock);
+    std::vector<std::byte> bytes = MakeC3dHeader(i_rPlan, dataBlock);
     bytes.insert(bytes.end(), parameters->begin(), parameters->end());
 
     VFileReplacement file(i_rPath);

@@ -1,7 +1,7 @@
 #include "GraphPlotUI/Frame/VGraphPlotFBO.h"
 
 #include "CoreGraphics/RenderContext.h"
-#include "GraphPlotSystem/ITraceDataProvider.h"
+#include "GraphPlotSystem/Traces/ITraceDataProvider.h"
 #include "GraphPlotSystem/VGraphPlotContext.h"
 #include "GraphPlotUI/Frame/VBaseGraphRenderType.h"
 #include "GraphPlotUI/Frame/VGraphPlotFBORenderer.h"
