@@ -35,31 +35,33 @@ std::uint64_t BigEndian(std::span<const std::byte> i_Bytes)
 
 /// A value that a float cannot hold is missing. The library gives arguments that are aligned to four bytes only.
 template <typename T>
-float Load(const void* i_pArgument)
+float Load(const void* i_pArgument, std::size_t& io_rOutOfRange)
 {
     T value{};
     std::memcpy(&value, i_pArgument, sizeof(T));
     const auto wide = static_cast<double>(value);
-    return std::abs(wide) <= std::numeric_limits<float>::max() ? static_cast<float>(wide)
-                                                               : std::numeric_limits<float>::quiet_NaN();
+    if (std::abs(wide) <= std::numeric_limits<float>::max())
+        return static_cast<float>(wide);
+    io_rOutOfRange += std::isnan(wide) ? 0 : 1;
+    return std::numeric_limits<float>::quiet_NaN();
 }
 
 /// False for an argument that is no number.
-bool ReadArgument(char i_Type, const void* i_pArgument, float& o_rValue)
+bool ReadArgument(char i_Type, const void* i_pArgument, float& o_rValue, std::size_t& io_rOutOfRange)
 {
     switch (i_Type)
     {
     case LO_FLOAT:
-        o_rValue = Load<float>(i_pArgument);
+        o_rValue = Load<float>(i_pArgument, io_rOutOfRange);
         return true;
     case LO_INT32:
-        o_rValue = Load<std::int32_t>(i_pArgument);
+        o_rValue = Load<std::int32_t>(i_pArgument, io_rOutOfRange);
         return true;
     case LO_DOUBLE:
-        o_rValue = Load<double>(i_pArgument);
+        o_rValue = Load<double>(i_pArgument, io_rOutOfRange);
         return true;
     case LO_INT64:
-        o_rValue = Load<std::int64_t>(i_pArgument);
+        o_rValue = Load<std::int64_t>(i_pArgument, io_rOutOfRange);
         return true;
     default:
         return false;
@@ -124,7 +126,7 @@ bool VOscPacketReader::ReadBundle(std::span<const std::byte> i_Bundle, int i_Dep
 bool VOscPacketReader::ReadMessage(std::span<const std::byte> i_Message, std::optional<std::uint64_t> i_TimeTag,
                                    const Sink& i_rSink)
 {
-    OscMessage message{TextAt(i_Message), i_TimeTag, {}, 0};
+    OscMessage message{TextAt(i_Message), i_TimeTag, {}, 0, 0};
     const std::string_view types = TypesOf(i_Message);
     if (!message.Address.starts_with('/') || types.empty())
         return false;
@@ -143,7 +145,7 @@ bool VOscPacketReader::ReadMessage(std::span<const std::byte> i_Message, std::op
     m_Values.clear();
     lo_arg** ppArguments = lo_message_get_argv(pMessage.get());
     for (std::size_t i = 1; i < types.size(); ++i)
-        if (float value = 0.0f; ReadArgument(types[i], ppArguments[i - 1], value))
+        if (float value = 0.0f; ReadArgument(types[i], ppArguments[i - 1], value, message.OutOfRange))
             m_Values.push_back(value);
     message.Values = m_Values;
     i_rSink(message);

@@ -18,6 +18,7 @@ struct OscMessage
     std::optional<std::uint64_t> TimeTag; ///< seconds since 1900 in 32.32 bits; none outside bundles and for "at once"
     std::span<const float> Values;        ///< its arguments: 32 and 64 bit integers and reals
     char WrongType = 0;                   ///< the first argument that is no number; there are no values then
+    std::size_t OutOfRange = 0;           ///< values that a float cannot hold, infinities among them: they are missing
 };
 
 /// Takes packets of Open Sound Control apart: single messages, and bundles of bundles and messages. Keeps memory for

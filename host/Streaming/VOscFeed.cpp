@@ -25,11 +25,33 @@ constexpr float Missing = std::numeric_limits<float>::quiet_NaN();
 
 } // namespace
 
-VOscFeed::VOscFeed(std::shared_ptr<Channels::VLiveContext> i_pContext, double i_Rate, VOscTroubles& i_rTroubles)
+void VOscFeed::Lane::Reach(std::size_t i_Frames)
+{
+    if (Taken.size() >= i_Frames)
+        return;
+    Taken.resize(i_Frames);
+    Rows.resize(i_Frames * Components, Missing);
+}
+
+void VOscFeed::Lane::Drop(std::size_t i_Frames, std::int64_t i_FirstFrame, std::int64_t i_LongestRest)
+{
+    const auto dropped = static_cast<std::ptrdiff_t>(std::min(i_Frames, Taken.size()));
+    Taken.erase(Taken.begin(), Taken.begin() + dropped);
+    Rows.erase(Rows.begin(), Rows.begin() + dropped * static_cast<std::ptrdiff_t>(Components));
+    if (Taken.empty() && NextFrame < i_FirstFrame - i_LongestRest)
+    {
+        Taken = {};
+        Rows = {};
+    }
+}
+
+VOscFeed::VOscFeed(std::shared_ptr<Channels::VLiveContext> i_pContext, double i_Rate, VOscTroubles& i_rTroubles,
+                   bool i_bRateStated)
     : m_pContext(std::move(i_pContext))
     , m_Rate(i_Rate)
     , m_Capacity(std::max(static_cast<std::int64_t>(i_Rate * WaitingSeconds), FewestWaiting))
     , m_rTroubles(i_rTroubles)
+    , m_Shared(i_bRateStated ? EOscTrouble::BeyondRate : EOscTrouble::SharedFrame)
     , m_FirstSeen(static_cast<std::size_t>(m_Capacity))
     , m_FirstFrame(m_pContext->GetTickRange().Last / m_pContext->GetFramePeriod())
     , m_EndFrame(m_FirstFrame)
@@ -141,7 +163,7 @@ TQL::IResult VOscFeed::Place(const OscSamples::Sample& i_rSample, const float* i
         return result;
     const auto place = static_cast<std::size_t>(frame - m_FirstFrame);
     if (std::exchange(rLane.Taken[place], 1))
-        m_rTroubles.Add(EOscTrouble::SharedFrame);
+        m_rTroubles.Add(m_Shared);
     std::copy_n(i_pValues, rLane.Components,
                 rLane.Rows.begin() + static_cast<std::ptrdiff_t>(place * rLane.Components));
     rLane.NextFrame = std::max(rLane.NextFrame, frame + 1);

@@ -33,8 +33,9 @@ class VOscFeed
 public:
     static constexpr LocalTime Hold = std::chrono::milliseconds(50);
 
-    /// i_Rate is that of the context's frames. The troubles get what is left out.
-    VOscFeed(std::shared_ptr<Channels::VLiveContext> i_pContext, double i_Rate, VOscTroubles& i_rTroubles);
+    /// i_Rate is that of the context's frames, as somebody stated or measured it. The troubles get what is left out.
+    VOscFeed(std::shared_ptr<Channels::VLiveContext> i_pContext, double i_Rate, VOscTroubles& i_rTroubles,
+             bool i_bRateStated = false);
 
     /// Adds the channels that the context does not have yet. Call it before their samples come.
     [[nodiscard]] TQL::IResult AddChannels(const std::vector<OscChannel>& i_rChannels);
@@ -73,6 +74,7 @@ private:
     std::map<std::string, std::uint64_t> m_Subjects;       ///< their numbers
     std::map<std::uint64_t, std::uint64_t> m_MarkerCounts; ///< by subject
     std::uint64_t m_ColumnCount = 0;
+    const EOscTrouble m_Shared; ///< what a frame with two samples is told as
     std::vector<LocalTime> m_FirstSeen; ///< when the first sample of a waiting frame was placed; 0 before
     std::int64_t m_FirstFrame;          ///< the oldest that waits or can come
     std::int64_t m_EndFrame;            ///< behind the last that has a sample

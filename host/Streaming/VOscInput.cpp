@@ -71,7 +71,7 @@ TQL::IResult VOscInput::Start(std::string& o_rError)
 void VOscInput::MakeFeed(double i_Rate)
 {
     auto pContext = m_Callbacks.MakeContext(i_Rate, Recordings::PeriodOfRate(i_Rate));
-    m_pFeed = std::make_unique<VOscFeed>(std::move(pContext), i_Rate, Troubles());
+    m_pFeed = std::make_unique<VOscFeed>(std::move(pContext), i_Rate, Troubles(), m_Options.Rate != 0.0);
 }
 
 void VOscInput::TellTroubles(LocalTime i_Now)

@@ -90,6 +90,7 @@ void VOscReceiver::TakeMessage(const OscMessage& i_rMessage, const Datagram& i_r
         return;
     const std::uint64_t restarts = m_Clock.Restarts();
     const LocalTime time = m_Clock.TimeOf(i_rMessage.TimeTag, i_rDatagram.Arrival, i_rDatagram.Sender);
+    m_Troubles.Add(EOscTrouble::OutOfRange, i_rMessage.OutOfRange, i_rMessage.Address);
     m_Troubles.Add(EOscTrouble::ClockSet, m_Clock.Restarts() - restarts);
     {
         const std::lock_guard lock(m_Mutex);

@@ -32,6 +32,11 @@ constexpr std::array<Wording, static_cast<std::size_t>(EOscTrouble::Count)> Word
     {EOscTrouble::TooLate, "sample is", "samples are", "left out: later samples had been taken already"},
     {EOscTrouble::SharedFrame, "sample", "samples",
      "came while there was one for the same frame, which it replaced. State the rate at which the messages come"},
+    {EOscTrouble::BeyondRate, "sample", "samples",
+     "came while there was one for the same frame, which it replaced. Do two programs send to one address, or more "
+     "often than at the stated rate?"},
+    {EOscTrouble::OutOfRange, "number is", "numbers are",
+     "missing: infinite, or too large for a single precision number"},
     {EOscTrouble::ClockSet, "time tag", "time tags",
      "lay more than 2 s from the arrival; the sender's clock was taken anew"},
 }};

@@ -26,6 +26,8 @@ enum class EOscTrouble : std::size_t
     QueueFull,         ///< samples of a channel that were not taken in time
     TooLate,           ///< samples whose frames had been handed on
     SharedFrame,       ///< samples that replaced another of the same frame
+    BeyondRate,        ///< the same where the rate was stated
+    OutOfRange,        ///< numbers that a float cannot hold
     ClockSet,          ///< time tags that started anew
     Count
 };

@@ -180,4 +180,23 @@ TEST_F(OscFeed, ABacklogOfAllChannelsIsTakenInTheOrderOfTime)
         EXPECT_EQ(rpChannel->GetSamples()->GetRange(), (TQL::TickRange{0, 300 * 1'350'000}));
 }
 
+TEST_F(OscFeed, WhereTheRateWasStatedNobodyIsAskedToStateIt)
+{
+    for (const bool bStated : {false, true})
+    {
+        Streaming::VOscTroubles troubles;
+        Streaming::VOscFeed feed(MakeContext(1'350'000), Rate, troubles, bStated);
+        ASSERT_TRUE(feed.AddChannels({{{false, "", "c"}, 1}}).IsSuccess());
+        OscSamples samples;
+        for (std::size_t i = 0; i < 100; ++i)
+        {
+            samples.Samples.push_back({At(0), 0, i});
+            samples.Values.push_back(0.0f);
+        }
+        EXPECT_TRUE(feed.Take(samples, At(0)).IsSuccess());
+        ASSERT_EQ(troubles.Summary().size(), 1u);
+        EXPECT_EQ(troubles.Summary()[0].find("State the rate") == std::string::npos, bStated) << troubles.Summary()[0];
+    }
+}
+
 } // namespace StreamingTest

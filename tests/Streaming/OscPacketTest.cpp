@@ -26,6 +26,8 @@ std::string Read(const Bytes& i_rPacket)
             text << "@" << (*i_rMessage.TimeTag >> 32) - 4'000'000'000u;
         for (const float value : i_rMessage.Values)
             text << " " << value;
+        if (i_rMessage.OutOfRange != 0)
+            text << "!" << i_rMessage.OutOfRange;
         if (i_rMessage.WrongType != 0)
             text << " !" << i_rMessage.WrongType;
         text << "; ";
@@ -99,7 +101,7 @@ Bytes MixedMessage(const char* i_pTypes)
 TEST(OscPacket, MessagesAndBundlesAreTakenApart)
 {
     EXPECT_EQ(Read(MixedMessage("fidh")), "/a 1.5 -7 0.25 1.09951e+12; ");
-    EXPECT_EQ(Read(MixedMessage("D")), "/a nan; ") << "a float cannot hold it";
+    EXPECT_EQ(Read(MixedMessage("D")), "/a nan!1; ") << "a float cannot hold it, and it is counted";
     EXPECT_EQ(Read(MixedMessage("fsf")), "/a !s; ");
     EXPECT_EQ(Read(MixedMessage("T")), "/a !T; ");
     EXPECT_EQ(Read(MixedMessage("")), "/a; ");
