@@ -1,8 +1,11 @@
 #include "Streaming/LiveRecording.h"
 
 #include "Channels/Contexts/VChannelContext.h"
+#include "Recordings/C3d/VC3dStream.h"
 
 #include <algorithm>
+#include <cmath>
+#include <iterator>
 #include <limits>
 #include <memory>
 #include <span>
@@ -102,7 +105,8 @@ RecordedChannel CopyChannel(const Channels::VSourceChannel& i_rChannel, const TQ
 
 } // namespace
 
-VRecording CopyContext(const Channels::VChannelContext& i_rContext)
+VRecording CopyContext(const Channels::VChannelContext& i_rContext,
+                       const std::function<bool(const Channels::VSourceChannel&)>& i_rTakes)
 {
     VRecording recording;
     recording.Name = i_rContext.GetName();
@@ -110,7 +114,8 @@ VRecording CopyContext(const Channels::VChannelContext& i_rContext)
     recording.Range = i_rContext.GetTickRange();
     const auto pChannels = i_rContext.GetChannels();
     for (const auto& rpChannel : *pChannels)
-        if (!rpChannel->GetSamples()->IsEmpty() && IsRecorded(rpChannel->GetInstanceId().TypeName))
+        if (!rpChannel->GetSamples()->IsEmpty() && IsRecorded(rpChannel->GetInstanceId().TypeName) &&
+            (!i_rTakes || i_rTakes(*rpChannel)))
             recording.Channels.push_back(CopyChannel(*rpChannel, recording.Range));
     const std::int64_t first =
         std::min(std::max(i_rContext.GetTickRange().First, recording.Range.First), recording.Range.Last);
@@ -118,6 +123,76 @@ VRecording CopyContext(const Channels::VChannelContext& i_rContext)
         CropBefore(first, rChannel);
     recording.Range.First = first;
     return recording;
+}
+
+namespace
+{
+
+constexpr std::size_t NamesTold = 5;
+constexpr std::size_t LongestName = 255; ///< bytes; longer ones lose their end
+
+/// Whether a channel has more than one row with a sample.
+bool SpeaksOften(const Channels::VSampleStore& i_rSamples)
+{
+    const std::size_t components = i_rSamples.Components();
+    const TQL::TickRange held = i_rSamples.GetRange();
+    std::vector<float> rows;
+    int found = 0;
+    for (std::int64_t tick = held.First; tick < held.Last; tick += RowsAtOnce * i_rSamples.Period())
+    {
+        const std::int64_t end = std::min(tick + RowsAtOnce * i_rSamples.Period(), held.Last);
+        rows.resize(static_cast<std::size_t>((end - tick) / i_rSamples.Period()) * components);
+        if (i_rSamples.ReadSamples({tick, end}, rows).IsError())
+            continue; // forgotten meanwhile
+        for (std::size_t at = 0; at < rows.size(); at += components)
+            if (std::any_of(rows.begin() + static_cast<std::ptrdiff_t>(at),
+                            rows.begin() + static_cast<std::ptrdiff_t>(at + components),
+                            [](float i_Value) { return !std::isnan(i_Value); }) &&
+                ++found > 1)
+                return true;
+    }
+    return false;
+}
+
+Recordings::C3dStreamChannel NamesOf(const Channels::VSourceChannel& i_rChannel)
+{
+    const Channels::ChannelDefinition& rDefinition = i_rChannel.GetDefinition();
+    return {KindOf(rDefinition.TypeName) == EChannelKind::Marker, rDefinition.Name, rDefinition.Units,
+            Channels::ComponentNamesOf(rDefinition)};
+}
+
+} // namespace
+
+std::set<const Channels::VSourceChannel*> ChooseForC3d(const Channels::VChannelContext& i_rContext,
+                                                       std::vector<std::string>& o_rRemarks)
+{
+    std::vector<const Channels::VSourceChannel*> channels;
+    const auto pChannels = i_rContext.GetChannels();
+    for (const auto& rpChannel : *pChannels)
+        channels.push_back(rpChannel.get());
+    std::vector<Recordings::C3dStreamChannel> names;
+    const auto fit = [&]
+    {
+        names.clear();
+        std::ranges::transform(channels, std::back_inserter(names), [](const auto* i_p) { return NamesOf(*i_p); });
+        return Recordings::VC3dStream({}).AddChannels(names);
+    };
+    std::size_t taken = fit();
+    if (taken < channels.size()) // it takes reading to know which are strays
+    {
+        std::ranges::stable_partition(channels, [](const auto* i_p) { return SpeaksOften(*i_p->GetSamples()); });
+        taken = fit();
+    }
+    if (const std::size_t leftOut = channels.size() - taken; leftOut > 0)
+    {
+        std::string text = std::to_string(leftOut) + (leftOut == 1 ? " channel was" : " channels were") +
+                           " left out, for which a C3D file has no room: ";
+        for (std::size_t i = 0; i < std::min(leftOut, NamesTold); ++i)
+            text += (i == 0 ? "" : ", ") + names[taken + i].Name;
+        o_rRemarks.push_back(leftOut > NamesTold ? text + " and " + std::to_string(leftOut - NamesTold) + " others"
+                                                 : text);
+    }
+    return {channels.begin(), channels.begin() + static_cast<std::ptrdiff_t>(taken)};
 }
 
 namespace
@@ -149,8 +224,8 @@ RecordedChannel TakeComponent(const RecordedChannel& i_rChannel, std::size_t i_C
                               i_rChannel.FirstTick,
                               {}};
     analog.Rate *= static_cast<double>(i_Repeats);
-    if (!rComponent.empty())
-        analog.Name += "." + rComponent;
+    const std::string end = rComponent.empty() ? rComponent : "." + rComponent;
+    analog.Name = analog.Name.substr(0, LongestName - std::min(LongestName, end.size())) + end;
     analog.Samples.reserve(i_rChannel.RowCount() * static_cast<std::size_t>(i_Repeats));
     for (std::size_t row = 0; row < i_rChannel.RowCount(); ++row)
         analog.Samples.insert(analog.Samples.end(), static_cast<std::size_t>(i_Repeats),
@@ -236,6 +311,8 @@ void FitToC3d(VRecording& io_rRecording, std::vector<std::string>& o_rRemarks)
         FitChannel(std::move(rChannel), io_rRecording.FramePeriod, analogPeriod, channels, changes);
         rChannel.Samples = {}; // the copy stands instead
     }
+    for (RecordedChannel& rChannel : channels)
+        rChannel.Name.resize(std::min(rChannel.Name.size(), LongestName));
     io_rRecording.Channels = std::move(channels);
     changes.Say(o_rRemarks);
 }

@@ -10,7 +10,9 @@ namespace Streaming
 TQL::IResult SaveAsC3d(const Channels::VChannelContext& i_rContext, const std::filesystem::path& i_rPath,
                        std::vector<std::string>& o_rRemarks, std::string& o_rError)
 {
-    Recordings::VRecording recording = CopyContext(i_rContext);
+    const auto chosen = ChooseForC3d(i_rContext, o_rRemarks);
+    Recordings::VRecording recording = CopyContext(i_rContext, [&](const Channels::VSourceChannel& i_rChannel)
+                                                   { return chosen.contains(&i_rChannel); });
     if (recording.Channels.empty() || recording.Range.IsEmpty())
     {
         o_rError = "there are no live data yet to save";

@@ -82,8 +82,6 @@ TQL::IResult VOscFeed::AddChannels(const std::vector<OscChannel>& i_rChannels)
         lane.Components = rChannel.Components;
         if (const auto result = m_pContext->AddChannel(definition, 0, lane.Channel); result.IsError())
             return result;
-        lane.Rows.assign(static_cast<std::size_t>(m_Capacity) * lane.Components, Missing);
-        lane.Taken.assign(static_cast<std::size_t>(m_Capacity), 0);
         m_Lanes.push_back(std::move(lane));
     }
     return TQL::Result::Ok;
@@ -162,6 +160,7 @@ TQL::IResult VOscFeed::Place(const OscSamples::Sample& i_rSample, const float* i
     if (const TQL::IResult result = MakeRoomFor(frame); result.IsError())
         return result;
     const auto place = static_cast<std::size_t>(frame - m_FirstFrame);
+    rLane.Reach(place + 1);
     if (std::exchange(rLane.Taken[place], 1))
         m_rTroubles.Add(m_Shared);
     std::copy_n(i_pValues, rLane.Components,
@@ -182,22 +181,20 @@ TQL::IResult VOscFeed::HandOn(std::int64_t i_EndFrame)
     const auto count = static_cast<std::size_t>(frames);
     const auto used = static_cast<std::size_t>(m_EndFrame - m_FirstFrame);
     m_Rows.clear();
-    for (const Lane& rLane : m_Lanes)
-        if (std::any_of(rLane.Taken.begin(), rLane.Taken.begin() + frames, [](char i_bTaken) { return i_bTaken != 0; }))
-            m_Rows.push_back({rLane.Channel, std::span<const float>(rLane.Rows).first(count * rLane.Components), 0});
-    const TQL::IResult result = m_pContext->AppendFrames(m_FirstFrame, frames, m_Rows);
-    const auto shift = [&](auto& io_rRow, std::size_t i_Width, auto i_Empty)
-    {
-        const auto begin = io_rRow.begin();
-        const auto end = begin + static_cast<std::ptrdiff_t>(used * i_Width);
-        std::fill(std::copy(begin + static_cast<std::ptrdiff_t>(count * i_Width), end, begin), end, i_Empty);
-    };
     for (Lane& rLane : m_Lanes)
     {
-        shift(rLane.Rows, rLane.Components, Missing);
-        shift(rLane.Taken, 1, char{0});
+        const auto some = static_cast<std::ptrdiff_t>(std::min(count, rLane.Taken.size()));
+        if (std::none_of(rLane.Taken.begin(), rLane.Taken.begin() + some, [](char i_bTaken) { return i_bTaken != 0; }))
+            continue;
+        rLane.Reach(count);
+        m_Rows.push_back({rLane.Channel, std::span<const float>(rLane.Rows).first(count * rLane.Components), 0});
     }
-    shift(m_FirstSeen, 1, LocalTime(0));
+    const TQL::IResult result = m_pContext->AppendFrames(m_FirstFrame, frames, m_Rows);
+    for (Lane& rLane : m_Lanes)
+        rLane.Drop(count, i_EndFrame, m_Capacity);
+    const auto seen = m_FirstSeen.begin();
+    const auto seenEnd = seen + static_cast<std::ptrdiff_t>(used);
+    std::fill(std::copy(seen + static_cast<std::ptrdiff_t>(count), seenEnd, seen), seenEnd, LocalTime(0));
     m_FirstFrame = i_EndFrame;
     return result;
 }

@@ -52,8 +52,12 @@ public:
 private:
     static constexpr std::int64_t NoFrame = INT64_MIN;
 
-    struct Lane ///< the frames of one channel that wait, from m_FirstFrame on
+    struct Lane ///< the frames of one channel that wait, from m_FirstFrame on, as far as it has any
     {
+        void Reach(std::size_t i_Frames);
+        /// Forgets its first frames. Gives its memory back after a rest.
+        void Drop(std::size_t i_Frames, std::int64_t i_FirstFrame, std::int64_t i_LongestRest);
+
         std::uint32_t Channel = 0; ///< of the context
         std::size_t Components = 1;
         std::int64_t NextFrame = NoFrame; ///< behind its last sample
@@ -70,11 +74,11 @@ private:
     const double m_Rate;
     const std::int64_t m_Capacity; ///< frames that can wait
     VOscTroubles& m_rTroubles;
+    const EOscTrouble m_Shared; ///< what a frame with two samples is told as
     std::vector<Lane> m_Lanes;
     std::map<std::string, std::uint64_t> m_Subjects;       ///< their numbers
     std::map<std::uint64_t, std::uint64_t> m_MarkerCounts; ///< by subject
     std::uint64_t m_ColumnCount = 0;
-    const EOscTrouble m_Shared; ///< what a frame with two samples is told as
     std::vector<LocalTime> m_FirstSeen; ///< when the first sample of a waiting frame was placed; 0 before
     std::int64_t m_FirstFrame;          ///< the oldest that waits or can come
     std::int64_t m_EndFrame;            ///< behind the last that has a sample

@@ -151,9 +151,9 @@ TEST_F(LiveContext, KeepsTheHistoryThatItMayAndForgetsTheRest)
     for (const Case& rCase : {Case{3000, 1ull << 30, 3000}, Case{1 << 30, 2001 * bytesPerFrame, 2000}})
     {
         Make({Period, 0, rCase.HistoryFrames * Period, rCase.Bytes});
-        EXPECT_NEAR(static_cast<double>(m_pContext->GetHistoryFrames()), static_cast<double>(rCase.Expected), 10.0);
         for (std::int64_t frame = 0; frame < 20000; frame += 10)
             ASSERT_TRUE(Append(frame, 10).IsSuccess());
+        EXPECT_NEAR(static_cast<double>(m_pContext->GetHistoryFrames()), static_cast<double>(rCase.Expected), 10.0);
         const TickRange range = m_pContext->GetTickRange();
         const std::int64_t frames = (range.Last - range.First) / Period;
         EXPECT_GE(frames, m_pContext->GetHistoryFrames());

@@ -4,6 +4,7 @@
 #include "Recordings/OpenRecording.h"
 #include "Streaming/SaveLive.h"
 
+#include <algorithm>
 #include <atomic>
 #include <filesystem>
 #include <fstream>
@@ -125,6 +126,31 @@ TEST_F(LiveData, WhatCannotBeSavedLeavesTheOldFile)
     EXPECT_EQ(error.find('\n'), std::string::npos);
     EXPECT_TRUE(Streaming::SaveAsC3d(*m_pContext, path, remarks, error).IsSuccess()) << error;
     EXPECT_NE(contents(), "old");
+}
+
+TEST_F(LiveData, StraysAreLeftOutWhereTheFileHasNoRoomForThem)
+{
+    std::vector<std::string> numbers(64, "n");
+    for (std::uint32_t i = 0; i < 200; ++i)
+        Add({"ModelSetSamplesOutput", i, 0, "stray", "stray" + std::to_string(i), "", numbers});
+    const auto good = Add({"ModelSetSamplesOutput", 200, 0, "good", std::string(300, 'g'), "", {""}});
+    const std::vector<float> row(64);
+    std::vector<ChannelRows> rows;
+    for (std::uint32_t i = 0; i < 200; ++i)
+        rows.push_back({i, row, 0});
+    ASSERT_TRUE(m_pContext->AppendFrames(0, 1, rows).IsSuccess());
+    const ChannelRows last[] = {{good, std::span(row).first(50), 0}};
+    ASSERT_TRUE(m_pContext->AppendFrames(1, 50, last).IsSuccess());
+    std::vector<std::string> remarks;
+    std::string error;
+    ASSERT_TRUE(Streaming::SaveAsC3d(*m_pContext, m_Folder / "live.c3d", remarks, error).IsSuccess()) << error;
+    EXPECT_NE(remarks.front().find(" channels were left out, for which a C3D file has no room: stray"),
+              std::string::npos)
+        << remarks.front();
+    VRecording read;
+    ASSERT_TRUE(Recordings::OpenRecording(m_Folder / "live.c3d", read, error).IsSuccess()) << error;
+    const std::string name(255, 'g');
+    EXPECT_TRUE(std::ranges::any_of(read.Channels, [&](const auto& i_r) { return i_r.Name == name; }));
 }
 
 TEST_F(LiveData, CopiesAreWholeWhileFramesComeAndGo)

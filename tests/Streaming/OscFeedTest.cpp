@@ -199,4 +199,27 @@ TEST_F(OscFeed, WhereTheRateWasStatedNobodyIsAskedToStateIt)
     }
 }
 
+TEST_F(OscFeed, ABurstOfStraysCostsLittleMemoryAndNoHistory)
+{
+    constexpr std::size_t numbers = 64;
+    AddChannels(500, numbers);
+    AddChannels(1);
+    for (std::uint32_t channel = 0; channel < 500; ++channel)
+    {
+        m_Samples.Samples.push_back({At(0), channel, m_Samples.Values.size()});
+        m_Samples.Values.resize(m_Samples.Values.size() + numbers);
+    }
+    for (int frame = 0; frame < 5000; ++frame)
+    {
+        Sample(500, frame, 1.0f);
+        Take(frame);
+    }
+    EXPECT_TRUE(m_Feed.Finish().IsSuccess());
+    std::size_t bytes = 0;
+    for (const auto& rpChannel : *m_pContext->GetChannels())
+        bytes += rpChannel->GetSamples()->ByteCount();
+    EXPECT_LT(bytes, 500u * 20'000u); // a row is 256 bytes, the 5000 rows of each would be 1.3 MB
+    EXPECT_EQ(m_pContext->GetHistoryFrames(), 360'000) << "an hour, as without them";
+}
+
 } // namespace StreamingTest

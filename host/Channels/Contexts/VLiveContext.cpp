@@ -15,6 +15,9 @@ namespace
 /// What a value costs while it is kept: itself, and its share of the summary levels if it is plotted.
 constexpr std::int64_t BytesPerValue = 6;
 
+/// A channel that has come so often is taken to come with every frame.
+constexpr int FewestBatches = 2;
+
 /// Trimming gives memory back by the chunk, so it is not tried more often than every so many frames.
 constexpr std::int64_t TrimStep = 256;
 
@@ -117,6 +120,7 @@ TQL::IResult VLiveContext::AppendFrames(std::int64_t i_FirstFrame, std::int64_t 
 void VLiveContext::AppendLocked(std::int64_t i_FirstFrame, std::int64_t i_FrameCount,
                                 std::span<const ChannelRows> i_Rows, std::span<float> io_Shares)
 {
+    bool bMoreSpeak = false;
     for (const ChannelRows& rRows : i_Rows)
     {
         Inlet& rInlet = m_Inlets[rRows.Channel];
@@ -125,9 +129,12 @@ void VLiveContext::AppendLocked(std::int64_t i_FirstFrame, std::int64_t i_FrameC
         FillUpLocked(rInlet, i_FirstFrame);
         rInlet.pChannel->GetSamples()->Append(rRows.Values, rRows.Stride);
         rInlet.EndFrame = i_FirstFrame + i_FrameCount;
+        bMoreSpeak |= rInlet.Batches < FewestBatches && ++rInlet.Batches == FewestBatches;
         if (rInlet.bMeasured)
             CountSamples(rRows, rInlet.pChannel->GetSamples()->Components(), rInlet.RowsPerFrame, io_Shares);
     }
+    if (bMoreSpeak)
+        UpdateHistoryLocked();
     m_EndFrame = i_FirstFrame + i_FrameCount;
     for (Inlet& rInlet : m_Inlets)
     {
@@ -182,7 +189,8 @@ void VLiveContext::UpdateHistoryLocked()
 {
     std::int64_t bytesPerFrame = 1;
     for (const Inlet& rInlet : m_Inlets)
-        bytesPerFrame += rInlet.RowsPerFrame * rInlet.pChannel->GetSamples()->Components() * BytesPerValue;
+        if (rInlet.Batches >= FewestBatches)
+            bytesPerFrame += rInlet.RowsPerFrame * rInlet.pChannel->GetSamples()->Components() * BytesPerValue;
     const std::int64_t affordable = static_cast<std::int64_t>(m_Options.MemoryLimitBytes) / bytesPerFrame;
     const std::int64_t wanted = m_Options.HistoryTicks / m_Options.FramePeriod;
     m_HistoryFrames.store(std::max(std::min(wanted, affordable), std::int64_t{1}), std::memory_order_relaxed);

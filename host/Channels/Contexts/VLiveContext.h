@@ -40,7 +40,8 @@ public:
         std::int64_t FramePeriod = TQL::DefaultFramePeriod; ///< ticks
         std::int64_t FirstFrame = 0;
         std::int64_t HistoryTicks = 3600 * TQL::DefaultTickRate; ///< how much is kept
-        std::uint64_t MemoryLimitBytes = 2ull << 30;             ///< keeps less where that needs more than this
+        /// Keeps less where that needs more than this. A channel that never spoke, or once, needs next to nothing.
+        std::uint64_t MemoryLimitBytes = 2ull << 30;
     };
 
     VLiveContext(std::string i_Name, std::shared_ptr<VSubTypeTable> i_pSubTypes, const Options& i_rOptions);
@@ -76,6 +77,7 @@ private:
         std::int64_t EndFrame = 0; ///< the frame that its next row belongs to
         bool bHasData = false;     ///< since the last restart
         bool bMeasured = true;     ///< it can have no sample
+        int Batches = 0;           ///< with samples of it, counted up to FewestBatches
     };
 
     TQL::IResult CheckLocked(std::int64_t i_FirstFrame, std::int64_t i_FrameCount,

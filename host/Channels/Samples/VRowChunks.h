@@ -1,5 +1,6 @@
 #pragma once
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <deque>
@@ -11,9 +12,10 @@ namespace Channels
 
 /// Rows of values in chunks of fixed size, addressed by row numbers that may be negative. Growing at either end never
 /// moves a value, and the memory of rows that are no longer wanted is given back by the chunk; one freed chunk is kept
-/// for the next growth. Chunks begin at multiples of TRows, and one value behind a chunk's last can be read, whatever
-/// it holds. Not thread-safe: the owner keeps changes of the table of chunks (Ensure, FreeBefore, Clear) apart from
-/// everything else.
+/// for the next growth. Chunks begin at multiples of their rows, and one value behind a chunk's last can be read,
+/// whatever it holds. A chunk can be void: it has its place and no memory, and its rows are not to be read before it is
+/// made by Ensure. Not thread-safe: the owner keeps changes of the table of chunks (Ensure, EnsureVoid, FreeBefore,
+/// Clear) apart from everything else.
 template <typename T, std::int64_t TRows>
 class VRowChunks
 {
@@ -22,15 +24,30 @@ class VRowChunks
 public:
     static constexpr std::int64_t ChunkRows = TRows;
 
-    explicit VRowChunks(std::size_t i_Width) : m_Width(i_Width) {}
+    /// Chunks of fewer rows, a power of two, where rows are wide.
+    explicit VRowChunks(std::size_t i_Width, std::int64_t i_Rows = TRows) : m_Width(i_Width), m_Rows(i_Rows) {}
 
-    bool Covers(std::int64_t i_First, std::int64_t i_End) const
+    /// Whether the rows have a place.
+    bool HasPlace(std::int64_t i_First, std::int64_t i_End) const
     {
         return i_First >= i_End || (!m_Chunks.empty() && i_First >= FirstRow() && i_End <= EndRow());
     }
 
-    /// Makes room for the rows. They have to touch or overlap those that have room already.
-    void Ensure(std::int64_t i_First, std::int64_t i_End)
+    /// Whether the rows have memory.
+    bool Covers(std::int64_t i_First, std::int64_t i_End) const
+    {
+        if (!HasPlace(i_First, i_End))
+            return false;
+        for (std::int64_t row = i_First; row < i_End; row += RunLength(row))
+            if (IsVoid(row))
+                return false;
+        return true;
+    }
+
+    bool IsVoid(std::int64_t i_Row) const { return !m_Chunks[ChunkIndex(i_Row)]; }
+
+    /// Gives the rows a place. They have to touch or overlap those that have one already.
+    void EnsureVoid(std::int64_t i_First, std::int64_t i_End)
     {
         if (i_First >= i_End)
             return;
@@ -38,20 +55,39 @@ public:
             m_FirstChunk = ChunkOf(i_First);
         while (ChunkOf(i_First) < m_FirstChunk)
         {
-            m_Chunks.push_front(NewChunk());
+            m_Chunks.emplace_front();
             --m_FirstChunk;
         }
         while (EndRow() < i_End)
-            m_Chunks.push_back(NewChunk());
+            m_Chunks.emplace_back();
     }
 
-    bool CanFreeBefore(std::int64_t i_Row) const { return !m_Chunks.empty() && FirstRow() + TRows <= i_Row; }
+    /// Gives the rows memory, under the same condition. i_rMade is called with the first row of each chunk that gets
+    /// it.
+    template <typename TMade>
+    void Ensure(std::int64_t i_First, std::int64_t i_End, const TMade& i_rMade)
+    {
+        EnsureVoid(i_First, i_End);
+        for (std::int64_t row = i_First; row < i_End; row += RunLength(row))
+            if (auto& rpChunk = m_Chunks[ChunkIndex(row)]; !rpChunk)
+            {
+                rpChunk = NewChunk();
+                i_rMade(row - (row & (m_Rows - 1)));
+            }
+    }
+    void Ensure(std::int64_t i_First, std::int64_t i_End)
+    {
+        Ensure(i_First, i_End, [](std::int64_t) {});
+    }
+
+    bool CanFreeBefore(std::int64_t i_Row) const { return !m_Chunks.empty() && FirstRow() + m_Rows <= i_Row; }
 
     void FreeBefore(std::int64_t i_Row)
     {
         while (CanFreeBefore(i_Row))
         {
-            m_pSpare = std::move(m_Chunks.front());
+            if (m_Chunks.front())
+                m_pSpare = std::move(m_Chunks.front());
             m_Chunks.pop_front();
             ++m_FirstChunk;
         }
@@ -63,25 +99,31 @@ public:
     T* Row(std::int64_t i_Row) { return m_Chunks[ChunkIndex(i_Row)].get() + Offset(i_Row); }
     const T* Row(std::int64_t i_Row) const { return m_Chunks[ChunkIndex(i_Row)].get() + Offset(i_Row); }
 
-    static std::int64_t RunLength(std::int64_t i_Row) { return TRows - (i_Row & (TRows - 1)); }
+    std::int64_t RunLength(std::int64_t i_Row) const { return m_Rows - (i_Row & (m_Rows - 1)); }
 
-    std::size_t ByteCount() const { return m_Chunks.size() * static_cast<std::size_t>(TRows) * m_Width * sizeof(T); }
+    std::size_t ByteCount() const
+    {
+        const auto made =
+            std::count_if(m_Chunks.begin(), m_Chunks.end(), [](const auto& i_rp) { return i_rp != nullptr; });
+        return static_cast<std::size_t>(made) * static_cast<std::size_t>(m_Rows) * m_Width * sizeof(T);
+    }
 
 private:
-    static std::int64_t ChunkOf(std::int64_t i_Row) { return (i_Row - (i_Row & (TRows - 1))) / TRows; }
+    std::int64_t ChunkOf(std::int64_t i_Row) const { return (i_Row - (i_Row & (m_Rows - 1))) / m_Rows; }
     std::size_t ChunkIndex(std::int64_t i_Row) const { return static_cast<std::size_t>(ChunkOf(i_Row) - m_FirstChunk); }
-    std::size_t Offset(std::int64_t i_Row) const { return static_cast<std::size_t>(i_Row & (TRows - 1)) * m_Width; }
-    std::int64_t FirstRow() const { return m_FirstChunk * TRows; }
-    std::int64_t EndRow() const { return (m_FirstChunk + static_cast<std::int64_t>(m_Chunks.size())) * TRows; }
+    std::size_t Offset(std::int64_t i_Row) const { return static_cast<std::size_t>(i_Row & (m_Rows - 1)) * m_Width; }
+    std::int64_t FirstRow() const { return m_FirstChunk * m_Rows; }
+    std::int64_t EndRow() const { return (m_FirstChunk + static_cast<std::int64_t>(m_Chunks.size())) * m_Rows; }
 
     std::unique_ptr<T[]> NewChunk()
     {
         if (m_pSpare)
             return std::move(m_pSpare);
-        return std::make_unique_for_overwrite<T[]>(static_cast<std::size_t>(TRows) * m_Width + 1);
+        return std::make_unique_for_overwrite<T[]>(static_cast<std::size_t>(m_Rows) * m_Width + 1);
     }
 
     std::size_t m_Width;
+    std::int64_t m_Rows;
     std::int64_t m_FirstChunk = 0;
     std::deque<std::unique_ptr<T[]>> m_Chunks;
     std::unique_ptr<T[]> m_pSpare;

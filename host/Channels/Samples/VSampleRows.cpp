@@ -3,11 +3,55 @@
 #include <algorithm>
 #include <limits>
 #include <utility>
+#include <vector>
 
 namespace Channels
 {
 
-VSampleRows::VSampleRows(std::uint32_t i_Components) : m_Components(i_Components), m_Chunks(i_Components) {}
+namespace
+{
+
+constexpr std::size_t ChunkValues = 4096; ///< at most, so that a channel with few samples is small however wide it is
+constexpr std::int64_t FewestRows = 16;
+constexpr float Missing = std::numeric_limits<float>::quiet_NaN();
+
+std::int64_t RowsOfChunk(std::size_t i_Components)
+{
+    std::int64_t rows = VSampleRows::Chunks::ChunkRows;
+    while (rows > FewestRows && static_cast<std::size_t>(rows) * i_Components > ChunkValues)
+        rows /= 2;
+    return rows;
+}
+
+} // namespace
+
+VSampleRows::VSampleRows(std::uint32_t i_Components)
+    : m_Components(i_Components), m_Chunks(i_Components, RowsOfChunk(i_Components))
+{
+}
+
+/// A chunk of missing samples that all share.
+const float* VSampleRows::MissingRows()
+{
+    static const std::vector<float> s_Rows(ChunkValues + 1, Missing);
+    return s_Rows.data();
+}
+
+void VSampleRows::Ensure(std::int64_t i_First, std::int64_t i_End)
+{
+    m_Chunks.Ensure(
+        i_First, i_End,
+        [this](std::int64_t i_Row)
+        { std::fill_n(m_Chunks.Row(i_Row), static_cast<std::size_t>(m_Chunks.RunLength(0)) * m_Components, Missing); });
+}
+
+void VSampleRows::EnsureMissing(std::int64_t i_First, std::int64_t i_End)
+{
+    if (static_cast<std::size_t>(m_Chunks.RunLength(0)) * m_Components <= ChunkValues)
+        m_Chunks.EnsureVoid(i_First, i_End);
+    else
+        Ensure(i_First, i_End); // wider than what is shared
+}
 
 void VSampleRows::Clear()
 {
@@ -37,7 +81,7 @@ void VSampleRows::Write(std::int64_t i_Row, std::int64_t i_Count, const float* i
 {
     while (i_Count > 0)
     {
-        const std::int64_t run = std::min(Chunks::RunLength(i_Row), i_Count);
+        const std::int64_t run = std::min(m_Chunks.RunLength(i_Row), i_Count);
         float* pRow = m_Chunks.Row(i_Row);
         if (i_Stride == m_Components)
             std::copy_n(i_pValues, static_cast<std::size_t>(run) * m_Components, pRow);
@@ -55,9 +99,9 @@ void VSampleRows::WriteMissing(std::int64_t i_Row, std::int64_t i_Count)
 {
     while (i_Count > 0)
     {
-        const std::int64_t run = std::min(Chunks::RunLength(i_Row), i_Count);
-        std::fill_n(m_Chunks.Row(i_Row), static_cast<std::size_t>(run) * m_Components,
-                    std::numeric_limits<float>::quiet_NaN());
+        const std::int64_t run = std::min(m_Chunks.RunLength(i_Row), i_Count);
+        if (!m_Chunks.IsVoid(i_Row))
+            std::fill_n(m_Chunks.Row(i_Row), static_cast<std::size_t>(run) * m_Components, Missing);
         i_Row += run;
         i_Count -= run;
     }

@@ -29,21 +29,26 @@ std::int64_t VSampleStore::RowAtOrAfter(std::int64_t i_Tick) const
 }
 
 /// Memory for the rows [i_From, i_To) and the records that they complete, while [i_First, i_End) exist.
-void VSampleStore::MakeRoom(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End)
+void VSampleStore::MakeRoom(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End,
+                            bool i_bMissing)
 {
-    const bool bRows = !m_Rows.IsShared() && m_Rows.Covers(i_From, i_To);
+    const bool bRows =
+        !m_Rows.IsShared() && (i_bMissing ? m_Rows.CoversMissing(i_From, i_To) : m_Rows.Covers(i_From, i_To));
     if (bRows && (!m_pPyramid || m_pPyramid->Covers(i_From, i_To, i_First, i_End)))
         return;
     const std::unique_lock lock(m_TableMutex);
     if (m_Rows.IsShared())
         m_Rows.TakeOver(m_First.load(), m_End.load());
-    m_Rows.Ensure(i_From, i_To);
+    if (i_bMissing)
+        m_Rows.EnsureMissing(i_From, i_To);
+    else
+        m_Rows.Ensure(i_From, i_To);
     if (m_pPyramid)
         m_pPyramid->Ensure(i_From, i_To, i_First, i_End);
 }
 
 template <typename TWrite>
-void VSampleStore::AppendRows(std::int64_t i_Rows, const TWrite& i_rWrite)
+void VSampleStore::AppendRows(std::int64_t i_Rows, bool i_bMissing, const TWrite& i_rWrite)
 {
     if (i_Rows <= 0)
         return;
@@ -51,7 +56,7 @@ void VSampleStore::AppendRows(std::int64_t i_Rows, const TWrite& i_rWrite)
     const std::int64_t first = m_First.load(std::memory_order_relaxed);
     const std::int64_t from = m_End.load(std::memory_order_relaxed);
     const std::int64_t to = from + i_Rows;
-    MakeRoom(from, to, first, to);
+    MakeRoom(from, to, first, to, i_bMissing);
     i_rWrite(from);
     if (m_pPyramid)
         m_pPyramid->Build(m_Rows, from, to, first, to);
@@ -63,12 +68,12 @@ void VSampleStore::Append(std::span<const float> i_Values, std::size_t i_Stride)
     const std::size_t stride = i_Stride == 0 ? m_Components : i_Stride;
     const std::size_t rows = i_Values.size() < m_Components ? 0 : (i_Values.size() - m_Components) / stride + 1;
     const auto count = static_cast<std::int64_t>(rows);
-    AppendRows(count, [&](std::int64_t i_Row) { m_Rows.Write(i_Row, count, i_Values.data(), stride); });
+    AppendRows(count, false, [&](std::int64_t i_Row) { m_Rows.Write(i_Row, count, i_Values.data(), stride); });
 }
 
 void VSampleStore::AppendMissing(std::int64_t i_Rows)
 {
-    AppendRows(i_Rows, [&](std::int64_t i_Row) { m_Rows.WriteMissing(i_Row, i_Rows); });
+    AppendRows(i_Rows, true, [&](std::int64_t i_Row) { m_Rows.WriteMissing(i_Row, i_Rows); });
 }
 
 void VSampleStore::Prepend(std::span<const float> i_Values)
@@ -80,7 +85,7 @@ void VSampleStore::Prepend(std::span<const float> i_Values)
     const std::int64_t oldFirst = m_First.load(std::memory_order_relaxed);
     const std::int64_t first = oldFirst - count;
     const std::int64_t end = m_End.load(std::memory_order_relaxed);
-    MakeRoom(first, oldFirst, first, end);
+    MakeRoom(first, oldFirst, first, end, false);
     const std::unique_lock table(m_TableMutex); // a border bin that readers gather becomes a record
     m_Rows.Write(first, count, i_Values.data(), m_Components);
     if (m_pPyramid)

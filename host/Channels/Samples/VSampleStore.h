@@ -36,7 +36,7 @@ public:
     void AppendMissing(std::int64_t i_Rows);
     /// Before the first row that is held.
     void Prepend(std::span<const float> i_Values);
-    /// Forgets the samples before a tick. Memory is given back by the chunk of 1024 rows.
+    /// Forgets the samples before a tick. Memory is given back by the chunk of 1024 rows, fewer where rows are wide.
     void TrimBefore(std::int64_t i_Tick);
     /// New contents, new lease token. The tick is on the grid, else InvalidArgument.
     TQL::IResult ReplaceAll(std::int64_t i_FirstTick, std::span<const float> i_Values);
@@ -81,9 +81,9 @@ private:
     bool IsOnGrid(std::int64_t i_Tick) const { return (i_Tick - m_Offset) % m_Period == 0; }
     bool FindRows(const TQL::TickRange& i_rRange, std::size_t i_RowWidth, std::size_t i_SpanSize, Rows& o_rRows) const;
     Rows HeldRows(std::int64_t i_FloorTick) const;
-    void MakeRoom(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End);
+    void MakeRoom(std::int64_t i_From, std::int64_t i_To, std::int64_t i_First, std::int64_t i_End, bool i_bMissing);
     template <typename TWrite>
-    void AppendRows(std::int64_t i_Rows, const TWrite& i_rWrite);
+    void AppendRows(std::int64_t i_Rows, bool i_bMissing, const TWrite& i_rWrite);
     void GatherRows(std::int64_t i_From, std::int64_t i_To, std::span<LodRecord> o_Records) const;
     void ReadWholeBins(std::uint32_t i_Level, std::int64_t i_First, std::int64_t i_End, LodRecord* o_pRecords) const;
     void Reset(std::int64_t i_FirstRow);

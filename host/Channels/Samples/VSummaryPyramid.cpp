@@ -86,8 +86,8 @@ void VSummaryPyramid::BuildLevel(const VSampleRows& i_rRows, std::uint32_t i_Lev
     while (i_Bins.First < i_Bins.End)
     {
         std::int64_t run = std::min(Level::RunLength(i_Bins.First), i_Bins.End - i_Bins.First);
-        if (i_Level > FirstLevel)
-            run = std::min(run, Level::RunLength(2 * i_Bins.First) / 2);
+        run = std::min(run, i_Level > FirstLevel ? Level::RunLength(2 * i_Bins.First) / 2
+                                                 : i_rRows.RunLength(16 * i_Bins.First) / 16);
         const auto bins = static_cast<std::size_t>(run);
         if (i_Level == FirstLevel)
             SummariseSixteens(i_rRows.Row(16 * i_Bins.First), m_Components, bins, rTarget.Run(i_Bins.First));
