@@ -11,6 +11,8 @@
 #include <cstddef>
 #include <span>
 #include <string>
+#include <string_view>
+#include <system_error>
 #include <utility>
 
 namespace Recordings
@@ -121,6 +123,18 @@ TQL::IResult OpenRecording(const std::filesystem::path& i_rPath, VRecording& o_r
     recording.Name = i_rPath.stem().string();
     o_rRecording = std::move(recording);
     return result;
+}
+
+bool IsRecordingFile(const std::filesystem::path& i_rPath)
+{
+    std::error_code error;
+    VFileBytes file;
+    std::string ignored;
+    if (!std::filesystem::is_regular_file(i_rPath, error) || file.Open(i_rPath, ignored).IsError())
+        return false;
+    return std::any_of(Readers.begin(), Readers.end(),
+                       [&](const Reader& i_rReader)
+                       { return i_rReader.pLooksLike && i_rReader.pLooksLike(file.GetBytes()); });
 }
 
 } // namespace Recordings

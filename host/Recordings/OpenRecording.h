@@ -19,4 +19,8 @@ namespace Recordings
 [[nodiscard]] TQL::IResult OpenRecording(const std::filesystem::path& i_rPath, VRecording& o_rRecording,
                                          std::string& o_rError, const ReadOptions& i_rOptions = {});
 
+/// Whether there is a file whose content says that it is a recording. Tables of which only the ending says so are not
+/// told: nobody is surprised when one is replaced by another.
+bool IsRecordingFile(const std::filesystem::path& i_rPath);
+
 } // namespace Recordings

@@ -24,14 +24,19 @@ struct StudioRun
     QByteArray Error;
 };
 
-/// The real program, without a display.
-StudioRun RunStudio(const QStringList& i_rArguments)
+QProcessEnvironment WithoutDisplay()
 {
-    QProcess process;
     QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
     for (const char* pName : {"DISPLAY", "WAYLAND_DISPLAY", "QT_QPA_PLATFORM"})
         environment.remove(QString::fromLatin1(pName));
-    process.setProcessEnvironment(environment);
+    return environment;
+}
+
+/// The real program.
+StudioRun RunStudio(const QStringList& i_rArguments, const QProcessEnvironment& i_rEnvironment = WithoutDisplay())
+{
+    QProcess process;
+    process.setProcessEnvironment(i_rEnvironment);
     process.start(QStringLiteral(STUDIO_PROGRAM), i_rArguments);
     EXPECT_TRUE(process.waitForFinished(60'000)) << process.errorString().toStdString();
     EXPECT_EQ(process.exitStatus(), QProcess::NormalExit);
@@ -111,6 +116,8 @@ TEST_F(StudioProgram, ChecksAStoreFile)
 TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
 {
     const QString walk = Path("walk.c3d");
+    ASSERT_TRUE(QFile::copy(walk, Path("other.c3d")));
+    ASSERT_TRUE(QFile::link(walk, Path("link.csv")));
     const struct
     {
         QStringList Arguments;
@@ -126,6 +133,9 @@ TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
         {{"snapshot", walk, "--out", Path("p.png")},
          "no display: DISPLAY is not set; run it on a desktop or under xvfb-run"},
         {{walk}, "no display"},
+        {{"export", walk, "--csv", walk, "--force"}, "this is the recording that is read"},
+        {{"export", walk, "--csv", Path("link.csv")}, "this is the recording that is read"},
+        {{"export", walk, "--csv", Path("other.c3d")}, "--force"},
     };
     for (const auto& rRow : rows)
     {
@@ -139,6 +149,10 @@ TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
     }
     EXPECT_FALSE(QFile::exists(Path("o.csv")));
     EXPECT_FALSE(QFile::exists(Path("p.png")));
+    QFile one(walk), two(Path("other.c3d"));
+    ASSERT_TRUE(one.open(QIODevice::ReadOnly) && two.open(QIODevice::ReadOnly));
+    EXPECT_TRUE(one.readAll() == two.readAll()) << "a recording was overwritten";
+    EXPECT_EQ(RunStudio({"export", walk, "--csv", two.fileName(), "--force"}).Status, 0);
 }
 
 TEST_F(StudioProgram, RealRecordingsAreListed)

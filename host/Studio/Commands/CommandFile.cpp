@@ -3,6 +3,7 @@
 #include "Studio/Commands/ChannelTable.h"
 #include "Studio/Commands/CommandLine.h"
 #include "Studio/Commands/Commands.h"
+#include "Studio/Common/OutputTarget.h"
 #include "Studio/Common/Paths.h"
 #include "Studio/StoreLint/CheckStoreReport.h"
 #include "UtilsFileSystem/FileIO.h"
@@ -10,6 +11,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <cstring>
+#include <filesystem>
 #include <span>
 
 namespace Studio
@@ -63,10 +65,11 @@ int RunChannels(const CommandLine& i_rCommandLine, std::string& o_rError)
 
 int RunExport(const CommandLine& i_rCommandLine, std::string& o_rError)
 {
+    const std::filesystem::path source = PathFromText(i_rCommandLine.Files.front());
+    if (!MayWrite(PathFromText(i_rCommandLine.CsvPath), source, i_rCommandLine.bForce, o_rError))
+        return StatusFailed;
     Recordings::VRecording recording;
-    if (Recordings::OpenRecording(PathFromText(i_rCommandLine.Files.front()), recording, o_rError,
-                                  {.bResample = i_rCommandLine.bResample})
-            .IsError())
+    if (Recordings::OpenRecording(source, recording, o_rError, {.bResample = i_rCommandLine.bResample}).IsError())
         return StatusFailed;
     PrintWarnings(recording);
     const TQL::IResult result =

@@ -114,6 +114,8 @@ bool ReadSubjects(std::string_view i_Text, std::uint32_t& o_rSubjects)
 constexpr OptionRow options[] = {
     {"--resample", "", channels | table, [](CommandLine& o_r, const std::string&) { return o_r.bResample = true; }, ""},
     {"--json", "", channels, [](CommandLine& o_r, const std::string&) { return o_r.bJson = true; }, ""},
+    {"--force", "", table | snapshot | record, [](CommandLine& o_r, const std::string&) { return o_r.bForce = true; },
+     ""},
     {"--csv", "OUT", table, [](CommandLine& o_r, const std::string& i_r) { return ReadText(o_r.CsvPath, i_r); },
      "the path of the table to write"},
     {"--out", "PNG", snapshot, [](CommandLine& o_r, const std::string& i_r) { return ReadText(o_r.PicturePath, i_r); },
@@ -335,10 +337,10 @@ std::string HelpText()
            "  graphplots-studio [FILE...] --osc [ADDRESS:]PORT [--osc-rate HZ]\n"
            "  graphplots-studio [FILE...] --replay FILE [--speed X] [--loop]\n"
            "  graphplots-studio channels FILE [--json] [--resample]\n"
-           "  graphplots-studio export FILE --csv OUT [--channel PATTERN]... [--resample]\n"
+           "  graphplots-studio export FILE --csv OUT [--channel PATTERN]... [--resample] [--force]\n"
            "  graphplots-studio snapshot FILE|--live [SUBJECTS] --out PNG [--channel PATTERN]...\n"
-           "                    [--size WxH] [--range A:B] [--values A:B] [--after MS]\n"
-           "  graphplots-studio record --osc [ADDRESS:]PORT [--osc-rate HZ] --seconds N OUT.c3d\n"
+           "                    [--size WxH] [--range A:B] [--values A:B] [--after MS] [--force]\n"
+           "  graphplots-studio record --osc [ADDRESS:]PORT [--osc-rate HZ] --seconds N [--force] OUT.c3d\n"
            "  graphplots-studio check-store FILE\n"
            "\n"
            "Without arguments the studio opens empty and says what to do.\n"
@@ -346,6 +348,7 @@ std::string HelpText()
            "  --resample         rows at uneven times are interpolated to the nearest even rate\n"
            "  --size WxH         of the picture, in pixels\n"
            "  --range A:B        the time axis, in frames\n"
+           "  --force            writes over another recording\n"
            "  --values A:B       the value axes, in the units of the channels\n"
            "  --after MS         how long to wait before the picture is taken\n"
            "  --osc PORT         listens for Open Sound Control messages from this machine; with an address of this\n"

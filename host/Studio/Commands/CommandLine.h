@@ -39,6 +39,7 @@ struct CommandLine
     double Seconds = 0.0;                 ///< how long to record
     bool bResample = false;               ///< rows at uneven times are laid on an even rate
     bool bJson = false;
+    bool bForce = false; ///< another recording may be replaced
     std::string CsvPath;
     std::string PicturePath;
     std::vector<std::string> Patterns;               ///< of channel names; empty: the command's own choice

@@ -3,6 +3,7 @@
 #include "Studio/Commands/CommandLine.h"
 #include "Studio/Commands/CommandSession.h"
 #include "Studio/Commands/Commands.h"
+#include "Studio/Common/OutputTarget.h"
 #include "Studio/Common/Paths.h"
 #include "Studio/Plots/PlotContent.h"
 #include "Studio/Plots/VPlotFrame.h"
@@ -18,6 +19,7 @@
 #include <QtQuickWidgets/QQuickWidget>
 
 #include <chrono>
+#include <filesystem>
 #include <functional>
 
 namespace Studio
@@ -183,6 +185,9 @@ private:
 
 int RunSnapshot(const CommandLine& i_rCommandLine, std::string& o_rError)
 {
+    const auto source = i_rCommandLine.bLive ? std::filesystem::path() : PathFromText(i_rCommandLine.Files.front());
+    if (!MayWrite(PathFromText(i_rCommandLine.PicturePath), source, i_rCommandLine.bForce, o_rError))
+        return StatusFailed;
     VStudioSession session({i_rCommandLine.bCheck, {}});
     if (!VSnapshot(session, i_rCommandLine, o_rError).Run())
         return StatusFailed;
