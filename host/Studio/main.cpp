@@ -65,6 +65,9 @@ int Run(const CommandLine& i_rCommandLine, int& o_rArgumentCount, char** o_ppArg
         return RunChannels(i_rCommandLine, o_rError);
     case ECommand::Export:
         return RunExport(i_rCommandLine, o_rError);
+    case ECommand::Version:
+        std::fputs("graphplots-studio " GRAPHPLOTS_VERSION "\n", stdout);
+        return StatusOk;
     case ECommand::CheckStore:
         return RunCheckStore(i_rCommandLine, o_rError);
     case ECommand::Record:

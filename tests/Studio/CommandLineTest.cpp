@@ -25,7 +25,7 @@ std::vector<std::string> Words(const std::string& i_rText)
 std::string Describe(const CommandLine& i_r)
 {
     static constexpr const char* names[] = {"window",      "channels", "export", "snapshot",
-                                            "check-store", "record",   "help"};
+                                            "check-store", "record",   "help",   "version"};
     std::ostringstream text;
     text << names[static_cast<int>(i_r.Command)];
     for (const std::string& rFile : i_r.Files)

@@ -155,6 +155,13 @@ TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
     EXPECT_EQ(RunStudio({"export", walk, "--csv", two.fileName(), "--force"}).Status, 0);
 }
 
+TEST_F(StudioProgram, SaysItsVersion)
+{
+    const StudioRun run = RunStudio({"--version"});
+    EXPECT_EQ(run.Status, 0);
+    EXPECT_TRUE(run.Output.startsWith("graphplots-studio ")) << run.Output.toStdString();
+}
+
 TEST_F(StudioProgram, RealRecordingsAreListed)
 {
     const char* pData = std::getenv("GRAPHPLOTS_TEST_DATA");

@@ -205,6 +205,8 @@ public:
                 bOptions = false;
             else if (bOptions && (rWord == "--help" || rWord == "-h"))
                 m_rCommandLine.Command = ECommand::Help;
+            else if (bOptions && rWord == "--version")
+                m_rCommandLine.Command = ECommand::Version;
             else if (bOptions && rWord.size() > 1 && rWord[0] == '-')
             {
                 if (!ReadOption(rWord))
@@ -213,7 +215,7 @@ public:
             else
                 m_rCommandLine.Files.push_back(rWord);
         }
-        return m_rCommandLine.Command == ECommand::Help || IsComplete();
+        return m_rCommandLine.Command == ECommand::Help || m_rCommandLine.Command == ECommand::Version || IsComplete();
     }
 
 private:
@@ -342,6 +344,7 @@ std::string HelpText()
            "                    [--size WxH] [--range A:B] [--values A:B] [--after MS] [--force]\n"
            "  graphplots-studio record --osc [ADDRESS:]PORT [--osc-rate HZ] --seconds N [--force] OUT.c3d\n"
            "  graphplots-studio check-store FILE\n"
+           "  graphplots-studio --version\n"
            "\n"
            "Without arguments the studio opens empty and says what to do.\n"
            "  --channel PATTERN  channels by name; * stands for any characters, ? for one\n"

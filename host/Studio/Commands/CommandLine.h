@@ -20,7 +20,8 @@ enum class ECommand
     Snapshot,   ///< write a picture of a Graph Plots window
     CheckStore, ///< print what a store file holds and what is wrong with it
     Record,     ///< write what comes in over the network as a recording
-    Help
+    Help,
+    Version
 };
 
 /// What the words after the program's name ask for. Paths are UTF-8, as given.
