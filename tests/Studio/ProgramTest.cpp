@@ -6,11 +6,15 @@
 #include <QtCore/QProcess>
 #include <QtCore/QProcessEnvironment>
 #include <QtCore/QTemporaryDir>
+#include <QtNetwork/QHostAddress>
+#include <QtNetwork/QUdpSocket>
+#include <QtTest/QTest>
 
 #include "Recordings/C3d/C3dWriter.h"
 #include "Simulation/RecordWalk.h"
 #include "Simulation/VWalkSimulator.h"
 
+#include <csignal>
 #include <cstdlib>
 #include <string>
 
@@ -136,6 +140,8 @@ TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
         {{"export", walk, "--csv", walk, "--force"}, "this is the recording that is read"},
         {{"export", walk, "--csv", Path("link.csv")}, "this is the recording that is read"},
         {{"export", walk, "--csv", Path("other.c3d")}, "--force"},
+        {{"record", "--osc", "9", "--seconds", "1", Path("other.c3d")}, "--force"},
+        {{"record", "--osc", "9", "--seconds", "1", Path("no/such.c3d")}, "such.c3d"},
     };
     for (const auto& rRow : rows)
     {
@@ -161,6 +167,36 @@ TEST_F(StudioProgram, SaysItsVersion)
     EXPECT_EQ(run.Status, 0);
     EXPECT_TRUE(run.Output.startsWith("graphplots-studio ")) << run.Output.toStdString();
 }
+
+#ifdef Q_OS_UNIX
+TEST_F(StudioProgram, SignalsEndARecordingAndSaveIt)
+{
+    for (const int number : {SIGINT, SIGTERM, SIGHUP})
+    {
+        const QString out = Path("out") + QString::number(number) + ".c3d";
+        QUdpSocket port; // one that is free
+        ASSERT_TRUE(port.bind(QHostAddress::LocalHost));
+        const quint16 listen = port.localPort();
+        port.close();
+        QProcess process;
+        process.start(QStringLiteral(STUDIO_PROGRAM),
+                      {"record", "--osc", QString::number(listen), "--osc-rate", "100", "--seconds", "600", out});
+        QByteArray said;
+        while (!said.contains("Listening") && process.waitForReadyRead(60'000))
+            said += process.readAllStandardError();
+        ASSERT_TRUE(said.contains("Listening")) << said.toStdString();
+        const QByteArray packet("/a\0\0,f\0\0\x3f\x80\0\0", 12);
+        for (int i = 0; i < 10; ++i)
+            port.writeDatagram(packet, QHostAddress(QHostAddress::LocalHost), listen);
+        QTest::qWait(300); // for the other process to read them
+        ::kill(static_cast<pid_t>(process.processId()), number);
+        ASSERT_TRUE(process.waitForFinished(60'000));
+        EXPECT_EQ(process.exitStatus(), QProcess::NormalExit) << number;
+        EXPECT_EQ(process.exitCode(), 0) << number;
+        EXPECT_EQ(RunStudio({"channels", out}).Output.count('\n'), 2) << number;
+    }
+}
+#endif
 
 TEST_F(StudioProgram, RealRecordingsAreListed)
 {
