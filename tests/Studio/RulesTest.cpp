@@ -5,6 +5,7 @@
 #include "Studio/Common/Paths.h"
 #include "Studio/Common/TimeText.h"
 #include "Studio/Session/ContextNames.h"
+#include "Studio/Session/LiveInput.h"
 #include "Studio/Session/VContextSelection.h"
 #include "Studio/Session/VFrameClock.h"
 #include "Studio/Session/VLiveCapture.h"
@@ -59,6 +60,39 @@ TEST(FrameClock, FramesFollowTheRunningTimeAndPausesDoNotCount)
         EXPECT_EQ(clock.FramesDue(due), frame + 1) << "woken up in time";
         EXPECT_EQ(clock.FramesDue(due - 10us), frame) << "and not too early";
     }
+}
+
+TEST(LiveStatus, MessagesSilenceAndTheEndAreTold)
+{
+    Studio::VLiveStatus status;
+    Studio::LiveInput input;
+    std::string told;
+    const auto tell = [&](std::chrono::milliseconds i_Now)
+    {
+        const Studio::LiveStatusText text = status.Tell(input, i_Now);
+        return text.Text + (text.bWarning ? " !" : "") + (text.bEnded ? " ended" : "");
+    };
+    EXPECT_EQ(tell(0s), "");
+    input = {Studio::ELiveInput::Osc, 1, true, false, "127.0.0.1", 9000, 0};
+    EXPECT_EQ(tell(1s), "127.0.0.1:9000: no message yet");
+    EXPECT_EQ(tell(4s), "127.0.0.1:9000: no message for 3 s !");
+    for (int i = 0; i < 20; ++i)
+    {
+        input.Messages += 30;
+        told = tell(5s + i * 250ms);
+    }
+    EXPECT_EQ(told, "127.0.0.1:9000: 600 messages, 120 a second");
+    EXPECT_EQ(tell(9750ms + 2999ms).find('!'), std::string::npos);
+    EXPECT_EQ(tell(9750ms + 75s), "127.0.0.1:9000: no message for 1 min 15 s !");
+    input.bPaused = true;
+    EXPECT_EQ(tell(90s), "127.0.0.1:9000: 600 messages, paused") << "nobody waits for messages then";
+    input.bRunning = input.bPaused = false;
+    EXPECT_EQ(tell(91s), "Stopped after 600 messages ended");
+    EXPECT_EQ(tell(92s), "Stopped after 600 messages");
+    input = {Studio::ELiveInput::Replay, 2, true};
+    EXPECT_EQ(tell(93s), "");
+    input.bRunning = false;
+    EXPECT_EQ(tell(94s), "The replay has ended ended");
 }
 
 TEST(LiveCapture, FramesComeInOrderWithoutHolesAndAnErrorEndsThem)

@@ -158,12 +158,10 @@ int RunRecord(const CommandLine& i_rCommandLine, std::string& o_rError)
     return StatusFailed;
 }
 
-bool StartListening(VStudioSession& o_rSession, const CommandLine& i_rCommandLine, std::string& o_rMessage,
-                    std::string& o_rError)
+bool StartListening(VStudioSession& o_rSession, const CommandLine& i_rCommandLine, std::string& o_rError)
 {
     if (o_rSession.StartOsc(OscOptions(i_rCommandLine), o_rError).IsError())
         return false;
-    o_rMessage = ListeningText(i_rCommandLine.OscAddress, o_rSession.OscPort());
     o_rSession.ShowContext(LiveContextName);
     return true;
 }

@@ -8,9 +8,7 @@ namespace Studio
 struct CommandLine;
 class VStudioSession;
 
-/// Starts to listen where the command line says and shows what comes. o_rMessage is a line for the operator. On failure
-/// o_rError is one line.
-bool StartListening(VStudioSession& o_rSession, const CommandLine& i_rCommandLine, std::string& o_rMessage,
-                    std::string& o_rError);
+/// Starts to listen where the command line says and shows what comes. On failure o_rError is one line.
+bool StartListening(VStudioSession& o_rSession, const CommandLine& i_rCommandLine, std::string& o_rError);
 
 } // namespace Studio

@@ -58,13 +58,8 @@ int RunWindow(const CommandLine& i_rCommandLine, std::string& o_rError)
             session.StartLive(i_rCommandLine.Subjects);
             session.ShowContext(LiveContextName);
         }
-        if (i_rCommandLine.OscPort != 0)
-        {
-            std::string message;
-            if (!StartListening(session, i_rCommandLine, message, o_rError))
-                return StatusFailed;
-            window.ShowMessage(message);
-        }
+        if (i_rCommandLine.OscPort != 0 && !StartListening(session, i_rCommandLine, o_rError))
+            return StatusFailed;
         if (!i_rCommandLine.ReplayPath.empty())
             ReplayWhenRead(window, session, i_rCommandLine);
         std::vector<std::filesystem::path> files;

@@ -92,10 +92,6 @@ void VLiveActions::Listen(const Streaming::VOscInput::Options& i_rOptions)
     if (m_rSession.StartOsc(i_rOptions, error).IsError())
         return m_Tell("Not listening: " + error);
     m_rSession.ShowContext(LiveContextName);
-    m_Tell(tr("Listening for OSC messages at %1, port %2")
-               .arg(QString::fromStdString(i_rOptions.Receiver.Address))
-               .arg(m_rSession.OscPort())
-               .toStdString());
 }
 
 void VLiveActions::Replay(double i_Speed)

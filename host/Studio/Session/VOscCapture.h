@@ -43,6 +43,7 @@ public:
     void SetPaused(bool i_bPaused) { m_pInput->SetPaused(i_bPaused); }
     bool IsPaused() const { return m_pInput->IsPaused(); }
     std::uint16_t Port() const { return m_pInput->Port(); }
+    std::uint64_t MessageCount() const { return m_pInput->MessageCount(); }
 
 private:
     struct Shared; ///< with the jobs that are posted

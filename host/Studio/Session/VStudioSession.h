@@ -3,6 +3,7 @@
 #include "Recordings/Common/VRecording.h"
 #include "Services/VHostServices.h"
 #include "Streaming/VOscInput.h"
+#include "Studio/LiveInput.h"
 #include "TQL/IResult.h"
 
 #include <QtCore/QPointer>
@@ -98,6 +99,9 @@ public:
     /// Gets sentences for the operator while a live input loses data; empty for nobody. Clear it before it dies.
     void SetLiveWarning(std::function<void(const std::string&)> i_Warn) { m_LiveWarning = std::move(i_Warn); }
 
+    /// The live input that runs, or the last one when none does.
+    LiveInput GetLiveInput() const;
+
     bool IsLive() const; ///< some live input runs, or is paused
     void StopLive();     ///< the context stays, with what it has
     void SetLivePaused(bool i_bPaused);
@@ -135,6 +139,7 @@ private:
     std::unique_ptr<VLiveCapture> m_pCapture;
     std::unique_ptr<VOscCapture> m_pOsc;
     std::function<void(const std::string&)> m_LiveWarning;
+    LiveInput m_LastInput;                                ///< as it was started; its end when it was stopped
     std::unique_ptr<Services::VPluginHost> m_pPlugin;
 };
 

@@ -56,6 +56,7 @@ void VStudioSession::AddLive(const std::shared_ptr<Channels::VLiveContext>& i_rp
 void VStudioSession::StartLive(std::uint32_t i_Subjects, std::int64_t i_HistoryFrames)
 {
     StopLive();
+    m_LastInput = {ELiveInput::Simulation, m_LastInput.Number + 1};
     const auto pContext = std::make_shared<Channels::VLiveContext>(LiveContextName, m_pChannels->GetSubTypes(),
                                                                    Channels::VLiveContext::Options());
     Simulation::VWalkSimulator::Options options;
@@ -94,6 +95,7 @@ TQL::IResult VStudioSession::StartOsc(const Streaming::VOscInput::Options& i_rOp
                                                                  Channels::VLiveContext::Options());
     AddLive(pEmpty, RateOf(*pEmpty));
     m_pOsc = std::move(pOsc);
+    m_LastInput = {ELiveInput::Osc, m_LastInput.Number + 1, false, false, i_rOptions.Receiver.Address, OscPort()};
     return TQL::Result::Ok;
 }
 
@@ -129,6 +131,7 @@ TQL::IResult VStudioSession::StartReplay(const std::string& i_rContextName, doub
     for (const std::string& rWarning : pFeed->Warnings())
         Log(TQL::ELogSeverity::Warning, "%1%", rWarning);
     AddLive(pContext, pFeed->FramesPerSecond() * i_Speed);
+    m_LastInput = {ELiveInput::Replay, m_LastInput.Number + 1};
     m_pCapture = std::make_unique<VLiveCapture>([pFeed](std::int64_t i_First, std::int64_t i_Count)
                                                 { return pFeed->Produce(i_First, i_Count); },
                                                 pFeed->FramesPerSecond() * i_Speed, pFeed->FirstFrame());
@@ -140,8 +143,19 @@ bool VStudioSession::IsLive() const
     return m_pOsc || (m_pCapture && !m_pCapture->HasEnded());
 }
 
+LiveInput VStudioSession::GetLiveInput() const
+{
+    LiveInput input = m_LastInput;
+    input.bRunning = IsLive();
+    input.bPaused = IsLivePaused();
+    if (m_pOsc)
+        input.Messages = m_pOsc->MessageCount();
+    return input;
+}
+
 void VStudioSession::StopLive()
 {
+    m_LastInput = GetLiveInput();
     m_pCapture.reset();
     m_pOsc.reset();
 }

@@ -8,6 +8,7 @@
 #include "Studio/Session/VStudioSession.h"
 #include "Studio/Transport/TransportIcons.h"
 #include "Studio/Transport/TransportRules.h"
+#include "Studio/Transport/VLiveLabel.h"
 #include "Studio/Transport/VTimeSlider.h"
 #include "Studio/Transport/VTransport.h"
 
@@ -91,6 +92,7 @@ void VTransportBar::BuildSource(QBoxLayout& o_rLayout)
     m_pContexts->setMinimumContentsLength(contextsWidth);
     o_rLayout.addWidget(m_pContexts);
     AddButtons(o_rLayout, {EAction::Live, EAction::Review});
+    o_rLayout.addWidget(new VLiveLabel(m_rSession, m_rTransport, this));
 }
 
 void VTransportBar::BuildPosition(QBoxLayout& o_rLayout)
