@@ -14,11 +14,13 @@
 #include <gtest/gtest.h>
 
 #include <QtCore/QTemporaryDir>
+#include <QtCore/QTimer>
 #include <QtCore/QtEndian>
 #include <QtGui/QAction>
 #include <QtNetwork/QHostAddress>
 #include <QtNetwork/QUdpSocket>
 #include <QtTest/QTest>
+#include <QtWidgets/QAbstractButton>
 #include <QtWidgets/QMenu>
 #include <QtWidgets/QMessageBox>
 
@@ -194,6 +196,48 @@ TEST_F(LiveInput, TheMenuReplaysStopsAndSaves)
     EXPECT_TRUE(window.findChild<QMessageBox*>("liveRemarks")->informativeText().contains("segment poses"));
     action("liveStop")->trigger();
     EXPECT_FALSE(m_Session.IsLive());
+}
+
+TEST_F(LiveInput, UnsavedDataAreAskedAboutAndMarked)
+{
+    QWidget window;
+    window.setWindowTitle(QStringLiteral("Studio[*]"));
+    QMenu menu;
+    auto* pActions = new Studio::VLiveActions(m_Session, menu, window, [](const std::string&) {});
+    int asked = 0;
+    const auto answer = [&](QMessageBox::StandardButton i_Button)
+    {
+        QTimer::singleShot(0, &window,
+                           [&, i_Button]
+                           {
+                               auto* pBox = window.findChild<QMessageBox*>("liveUnsaved");
+                               asked += pBox ? 1 : 0;
+                               if (pBox)
+                                   pBox->button(i_Button)->click();
+                           });
+        return m_Session.MayLoseLive();
+    };
+    m_Session.StartLive(1, 10);
+    EXPECT_TRUE(answer(QMessageBox::Cancel)) << "a simulation can be had again";
+    std::string error;
+    Streaming::VOscInput::Options options;
+    options.Rate = 100.0;
+    ASSERT_TRUE(m_Session.StartOsc(options, error).IsSuccess()) << error;
+    EXPECT_TRUE(answer(QMessageBox::Cancel)) << "nothing came yet";
+    Send("/first", 1.0f);
+    EXPECT_TRUE(QTest::qWaitFor([&] { return m_Session.HasUnsavedLive(); }));
+    EXPECT_TRUE(QTest::qWaitFor([&] { return window.isWindowModified(); }));
+    EXPECT_EQ(asked, 0);
+    EXPECT_FALSE(answer(QMessageBox::Cancel));
+    EXPECT_TRUE(answer(QMessageBox::Discard));
+    EXPECT_EQ(asked, 2);
+    pActions->SaveTo(m_Folder / "live.c3d");
+    EXPECT_TRUE(QTest::qWaitFor([&] { return !m_Session.HasUnsavedLive(); }));
+    EXPECT_FALSE(window.isWindowModified());
+    EXPECT_TRUE(answer(QMessageBox::Cancel));
+    QCoreApplication::processEvents();
+    EXPECT_EQ(asked, 2);
+    EXPECT_EQ(m_Session.GetLiveInput().Messages, 1u);
 }
 
 } // namespace

@@ -31,7 +31,7 @@ void ReplayWhenRead(VMainWindow& i_rWindow, VStudioSession& i_rSession, const Co
                      [&i_rWindow, &i_rSession, number, speed = i_rCommandLine.Speed,
                       bLoop = i_rCommandLine.bLoop](int i_Number, const QString& i_rContextName)
                      {
-                         if (i_Number != number)
+                         if (i_Number != number || !i_rSession.MayLoseLive())
                              return;
                          std::string error;
                          if (i_rSession.StartReplay(i_rContextName.toStdString(), speed, bLoop, error).IsError())

@@ -124,6 +124,8 @@ void VFileActions::OpenSample()
 
 void VFileActions::StartSimulation()
 {
+    if (!m_rSession.MayLoseLive())
+        return;
     m_rSession.StartLive(simulatedSubjects);
     m_rSession.ShowContext(LiveContextName);
 }

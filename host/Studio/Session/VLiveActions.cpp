@@ -8,11 +8,17 @@
 #include "Studio/Session/VStudioSession.h"
 #include "TQL/Log.h"
 
+#include <QtCore/QEventLoop>
+#include <QtCore/QScopedValueRollback>
+#include <QtCore/QTimer>
 #include <QtGui/QAction>
 #include <QtGui/QKeySequence>
 #include <QtWidgets/QFileDialog>
 #include <QtWidgets/QMenu>
 #include <QtWidgets/QMessageBox>
+
+#include <chrono>
+#include <utility>
 
 namespace Studio
 {
@@ -48,13 +54,22 @@ VLiveActions::VLiveActions(VStudioSession& i_rSession, QMenu& i_rMenu, QWidget& 
     connect(&i_rMenu, &QMenu::aboutToShow, this, &VLiveActions::Refresh);
     connect(m_pSaver, &VLiveSaver::Saved, this, &VLiveActions::TellSaved);
     connect(m_pSaver, &VLiveSaver::Failed, this,
-            [this](const QString& i_rMessage) { m_Tell("Not saved: " + i_rMessage.toStdString()); });
+            [this](const QString& i_rMessage)
+            {
+                m_pSaving.reset();
+                m_Tell("Not saved: " + i_rMessage.toStdString());
+            });
+    auto* pMark = new QTimer(this);
+    connect(pMark, &QTimer::timeout, this, &VLiveActions::MarkUnsaved);
+    pMark->start(std::chrono::milliseconds(500));
+    m_rSession.SetAskBeforeLoss([this] { return AskBeforeLoss(); });
     m_rSession.SetLiveWarning([this](const std::string& i_rText) { m_Tell("Live input: " + i_rText); });
 }
 
 VLiveActions::~VLiveActions()
 {
     m_rSession.SetLiveWarning({});
+    m_rSession.SetAskBeforeLoss({});
 }
 
 void VLiveActions::AddReplayMenu(QMenu& i_rMenu)
@@ -82,7 +97,7 @@ void VLiveActions::Refresh()
 void VLiveActions::AskAndListen()
 {
     VOscDialog dialog(&m_rWindow);
-    if (dialog.exec() == QDialog::Accepted)
+    if (dialog.exec() == QDialog::Accepted && m_rSession.MayLoseLive())
         Listen(dialog.Options());
 }
 
@@ -96,6 +111,8 @@ void VLiveActions::Listen(const Streaming::VOscInput::Options& i_rOptions)
 
 void VLiveActions::Replay(double i_Speed)
 {
+    if (!m_rSession.MayLoseLive())
+        return;
     std::string error;
     if (m_rSession.StartReplay(m_rSession.CurrentContextName(), i_Speed, m_pLoop->isChecked(), error).IsError())
         return m_Tell("Not replayed: " + error);
@@ -110,23 +127,73 @@ void VLiveActions::AskAndSave()
         m_pSave->setEnabled(true); // so that its key answers the next time
         return m_Tell(m_pSaver->IsSaving() ? "Live data are being saved already" : "There are no live data to save");
     }
+    if (const auto path = AskPath(); !path.empty())
+        SaveTo(path);
+}
+
+std::filesystem::path VLiveActions::AskPath()
+{
     QString path = QFileDialog::getSaveFileName(&m_rWindow, tr("Save live data"), QStringLiteral("live.c3d"),
                                                 tr("C3D files (*.c3d)"));
-    if (path.isEmpty())
-        return;
-    if (!path.endsWith(QStringLiteral(".c3d"), Qt::CaseInsensitive))
+    if (!path.isEmpty() && !path.endsWith(QStringLiteral(".c3d"), Qt::CaseInsensitive))
         path += QStringLiteral(".c3d");
-    SaveTo(PathFromText(path.toStdString()));
+    return PathFromText(path.toStdString());
 }
 
 void VLiveActions::SaveTo(const std::filesystem::path& i_rPath)
 {
-    if (!m_pSaver->Save(m_rSession.Channels().FindContext(LiveContextName), i_rPath))
-        m_Tell("There are no live data to save");
+    const auto pContext = m_rSession.Channels().FindContext(LiveContextName);
+    const std::int64_t until = pContext ? pContext->GetTickRange().Last : 0; // what comes from now on may miss it
+    if (!m_pSaver->Save(pContext, i_rPath))
+        return m_Tell("There are no live data to save");
+    m_pSaving = pContext;
+    m_SavingUntil = until;
+}
+
+bool VLiveActions::AskBeforeLoss()
+{
+    if (m_bAsking) // a window can be told to close while it asks
+        return false;
+    const QScopedValueRollback asking(m_bAsking, true);
+    QMessageBox box(QMessageBox::Warning, tr("Unsaved live data"),
+                    tr("The live data are in no file yet. Save them before they are gone?"),
+                    QMessageBox::Save | QMessageBox::Discard | QMessageBox::Cancel, &m_rWindow);
+    box.setObjectName(QStringLiteral("liveUnsaved"));
+    box.setDefaultButton(QMessageBox::Save);
+    const int answer = box.exec();
+    return answer == QMessageBox::Discard || (answer == QMessageBox::Save && SaveAndWait());
+}
+
+bool VLiveActions::SaveAndWait()
+{
+    const std::filesystem::path path = AskPath();
+    if (path.empty())
+        return false;
+    m_rSession.StopLive(); // what came after the file was made would be lost
+    const auto wait = [this]
+    {
+        QEventLoop loop;
+        connect(m_pSaver, &VLiveSaver::Saved, &loop, &QEventLoop::quit);
+        connect(m_pSaver, &VLiveSaver::Failed, &loop, &QEventLoop::quit);
+        if (m_pSaver->IsSaving())
+            loop.exec(QEventLoop::ExcludeUserInputEvents);
+    };
+    wait(); // for one that was begun before
+    SaveTo(path);
+    wait();
+    return !m_rSession.HasUnsavedLive();
+}
+
+void VLiveActions::MarkUnsaved()
+{
+    if (m_rWindow.windowTitle().contains(QStringLiteral("[*]")))
+        m_rWindow.setWindowModified(m_rSession.HasUnsavedLive());
 }
 
 void VLiveActions::TellSaved(const QString& i_rPath, const QStringList& i_rRemarks)
 {
+    m_rSession.NoteSaved(std::exchange(m_pSaving, nullptr), m_SavingUntil);
+    MarkUnsaved();
     m_Tell("Saved live data as " + i_rPath.toStdString());
     for (const QString& rRemark : i_rRemarks)
         TQL::Log::Format(TQL::Log::GetCategory("Live"), TQL::ELogSeverity::Warning, "%1%: %2%", i_rPath.toStdString(),

@@ -102,6 +102,15 @@ public:
     /// The live input that runs, or the last one when none does.
     LiveInput GetLiveInput() const;
 
+    /// Whether what is live came from outside and is in no file yet. What was simulated or replayed can be had again.
+    bool HasUnsavedLive() const;
+    /// What a context had up to a tick is in a file.
+    void NoteSaved(const std::shared_ptr<const Channels::VChannelContext>& i_rpContext, std::int64_t i_EndTick);
+    /// Asks the operator before unsaved live data are lost; false: they shall not be. Clear it before it dies.
+    void SetAskBeforeLoss(std::function<bool()> i_Ask) { m_AskBeforeLoss = std::move(i_Ask); }
+    /// Call it before something that takes the live data away.
+    bool MayLoseLive() const { return !HasUnsavedLive() || !m_AskBeforeLoss || m_AskBeforeLoss(); }
+
     bool IsLive() const; ///< some live input runs, or is paused
     void StopLive();     ///< the context stays, with what it has
     void SetLivePaused(bool i_bPaused);
@@ -139,7 +148,10 @@ private:
     std::unique_ptr<VLiveCapture> m_pCapture;
     std::unique_ptr<VOscCapture> m_pOsc;
     std::function<void(const std::string&)> m_LiveWarning;
+    std::function<bool()> m_AskBeforeLoss;
     LiveInput m_LastInput;                                ///< as it was started; its end when it was stopped
+    std::weak_ptr<Channels::VChannelContext> m_pCaptured; ///< from outside
+    std::int64_t m_SavedUntil = 0;                        ///< tick of it
     std::unique_ptr<Services::VPluginHost> m_pPlugin;
 };
 

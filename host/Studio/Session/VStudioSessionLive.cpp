@@ -12,6 +12,8 @@
 #include "Studio/Session/VStudioSession.h"
 #include "TQL/Log.h"
 
+#include <algorithm>
+
 // The live inputs of the session: simulated, over Open Sound Control, replayed.
 namespace Studio
 {
@@ -78,7 +80,11 @@ TQL::IResult VStudioSession::StartOsc(const Streaming::VOscInput::Options& i_rOp
         if (m_pChannels->FindContext(LiveContextName) == i_rpContext)
             m_pChannels->AddContext(i_rpContext); // tells that it has other channels now
         else
+        {
             AddLive(i_rpContext, RateOf(*i_rpContext));
+            m_pCaptured = i_rpContext;
+            m_SavedUntil = i_rpContext->GetTickRange().First;
+        }
     };
     const auto warn = [this](const std::string& i_rText)
     {
@@ -151,6 +157,20 @@ LiveInput VStudioSession::GetLiveInput() const
     if (m_pOsc)
         input.Messages = m_pOsc->MessageCount();
     return input;
+}
+
+bool VStudioSession::HasUnsavedLive() const
+{
+    const auto pCaptured = m_pCaptured.lock();
+    return pCaptured && pCaptured == m_pChannels->FindContext(LiveContextName) &&
+           !pCaptured->GetTickRange().IsEmpty() && pCaptured->GetTickRange().Last > m_SavedUntil;
+}
+
+void VStudioSession::NoteSaved(const std::shared_ptr<const Channels::VChannelContext>& i_rpContext,
+                               std::int64_t i_EndTick)
+{
+    if (i_rpContext && i_rpContext == m_pCaptured.lock())
+        m_SavedUntil = std::max(m_SavedUntil, i_EndTick);
 }
 
 void VStudioSession::StopLive()

@@ -276,6 +276,8 @@ void VMainWindow::SaveLayout() const
 
 void VMainWindow::closeEvent(QCloseEvent* i_pEvent)
 {
+    if (!m_rSession.MayLoseLive())
+        return i_pEvent->ignore();
     SaveLayout();
     QMainWindow::closeEvent(i_pEvent);
 }
