@@ -2,6 +2,7 @@
 #include "Studio/Commands/CommandLive.h"
 #include "Studio/Commands/CommandSession.h"
 #include "Studio/Commands/Commands.h"
+#include "Studio/Commands/VEndSignals.h"
 #include "Studio/Common/Paths.h"
 #include "Studio/Files/VOpenFiles.h"
 #include "Studio/Log/VLogModel.h"
@@ -52,6 +53,8 @@ int RunWindow(const CommandLine& i_rCommandLine, std::string& o_rError)
         VMainWindow window(session, &log);
         if (!window.Restore(o_rError))
             return StatusFailed;
+        const VEndSignals signals;
+        QObject::connect(&signals, &VEndSignals::Asked, &window, &QWidget::close);
         window.show();
         if (i_rCommandLine.bLive)
         {
