@@ -1,6 +1,7 @@
 #include "Services/VGlobalLogSink.h"
 #include "Studio/Commands/CommandLine.h"
 #include "Studio/Commands/Commands.h"
+#include "Studio/Commands/OpenGLCheck.h"
 #include "Studio/Commands/QtMessages.h"
 
 #include <QtCore/QCoreApplication>
@@ -43,6 +44,9 @@ int RunWithDisplay(const CommandLine& i_rCommandLine, int& o_rArgumentCount, cha
     const QApplication application(o_rArgumentCount, o_ppArguments);
     NoteApplicationStarted();
     Name();
+    o_rError = FindOpenGLProblem();
+    if (!o_rError.empty())
+        return StatusFailed;
     if (i_rCommandLine.Command == ECommand::Window)
     {
         const Services::VGlobalLogSink shown(0, nullptr, stderr);
@@ -61,13 +65,13 @@ int Run(const CommandLine& i_rCommandLine, int& o_rArgumentCount, char** o_ppArg
     case ECommand::Help:
         std::fputs(HelpText().c_str(), stdout);
         return StatusOk;
+    case ECommand::Version:
+        std::fputs("graphplots-studio " GRAPHPLOTS_VERSION "\n", stdout);
+        return StatusOk;
     case ECommand::Channels:
         return RunChannels(i_rCommandLine, o_rError);
     case ECommand::Export:
         return RunExport(i_rCommandLine, o_rError);
-    case ECommand::Version:
-        std::fputs("graphplots-studio " GRAPHPLOTS_VERSION "\n", stdout);
-        return StatusOk;
     case ECommand::CheckStore:
         return RunCheckStore(i_rCommandLine, o_rError);
     case ECommand::Record:

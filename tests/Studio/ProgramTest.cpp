@@ -161,6 +161,23 @@ TEST_F(StudioProgram, FailuresAreOneLineAndStatusTwo)
     EXPECT_EQ(RunStudio({"export", walk, "--csv", two.fileName(), "--force"}).Status, 0);
 }
 
+TEST_F(StudioProgram, WithoutOpenGLThereIsOneSentence)
+{
+    QProcessEnvironment environment = QProcessEnvironment::systemEnvironment();
+    if (environment.value(QStringLiteral("DISPLAY")).isEmpty())
+        GTEST_SKIP() << "no X display";
+    environment.insert(QStringLiteral("QT_QPA_PLATFORM"), QStringLiteral("xcb"));
+    environment.insert(QStringLiteral("QT_XCB_GL_INTEGRATION"), QStringLiteral("none"));
+    for (const QStringList& rArguments :
+         {QStringList{"snapshot", Path("walk.c3d"), "--out", Path("p.png")}, QStringList{Path("walk.c3d")}})
+    {
+        const StudioRun run = RunStudio(rArguments, environment);
+        EXPECT_EQ(run.Status, 2);
+        EXPECT_TRUE(run.Error.contains("no OpenGL")) << run.Error.toStdString();
+        EXPECT_EQ(run.Error.count('\n'), 1) << run.Error.toStdString();
+    }
+}
+
 TEST_F(StudioProgram, SaysItsVersion)
 {
     const StudioRun run = RunStudio({"--version"});
