@@ -195,7 +195,7 @@ TEST(Paths, TheSampleIsFoundBesideAnInstalledProgramAndInTheTree)
         const QTemporaryDir temporary;
         const std::filesystem::path root = temporary.path().toStdString();
         const bool bInstalled = std::string(pPlace) != "samples";
-        const auto program = root / (bInstalled ? "bin" : "build/dev/bin");
+        const auto program = root / (bInstalled ? "lib/graphplots" : "build/dev/bin");
         std::filesystem::create_directories(program);
         EXPECT_EQ(Studio::FindSample(program), std::filesystem::path());
         std::filesystem::create_directories(root / pPlace / "walk.c3d"); // a folder of that name is no sample

@@ -23,7 +23,7 @@ std::filesystem::path DefaultModulePath(const std::filesystem::path& i_rProgramF
 
 std::filesystem::path FindSample(const std::filesystem::path& i_rProgramFolder)
 {
-    constexpr const char* folders[] = {"../share/graphplots/samples", "../../../samples", "../samples", "samples"};
+    constexpr const char* folders[] = {"../../share/graphplots/samples", "../../../samples", "../samples", "samples"};
     for (const char* pFolder : folders)
     {
         const std::filesystem::path path = i_rProgramFolder / pFolder / "walk.c3d";

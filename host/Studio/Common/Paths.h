@@ -13,8 +13,8 @@ std::string TextFromPath(const std::filesystem::path& i_rPath);
 /// The module that lies beside the program, whether it is there or not.
 std::filesystem::path DefaultModulePath(const std::filesystem::path& i_rProgramFolder);
 
-/// The recording that comes with the studio: installed beside the program, or in the tree that it was built in. Empty
-/// when it is nowhere.
+/// The recording that comes with the studio: as installed, with the program in lib/graphplots, or in the tree that it
+/// was built in. Empty when it is nowhere.
 std::filesystem::path FindSample(const std::filesystem::path& i_rProgramFolder);
 
 } // namespace Studio
