@@ -70,7 +70,8 @@ void LoadRotations(const RotationForm& i_rForm, ConstRows i_Rows, std::span<cons
 {
     const auto angles = [&](const float* i_pRow)
     {
-        return Vector3d(i_pRow[0] * i_Radians[0], i_pRow[1] * i_Radians[1], i_pRow[2] * i_Radians[2]);
+        return Vector3d(double{i_pRow[0]} * i_Radians[0], double{i_pRow[1]} * i_Radians[1],
+                        double{i_pRow[2]} * i_Radians[2]);
     };
     switch (i_rForm.Form)
     {
@@ -79,7 +80,7 @@ void LoadRotations(const RotationForm& i_rForm, ConstRows i_Rows, std::span<cons
     case ERotation::AxisAndAngle:
         return LoadEach(i_Rows, o_Rotations,
                         [&](const float* i_pRow)
-                        { return RotationOfAxis(ReadVector(i_pRow), i_pRow[3] * i_Radians[3]); });
+                        { return RotationOfAxis(ReadVector(i_pRow), double{i_pRow[3]} * i_Radians[3]); });
     case ERotation::Quaternion:
         return LoadEach(i_Rows, o_Rotations,
                         [](const float* i_pRow)

@@ -92,7 +92,7 @@ void VDerivative::StepNumbers(const float* i_pRows, std::size_t i_Steps, Workspa
         double* pStep = io_rWorkspace.Steps.data() + (step + 1) * GetWidth() - count;
         for (std::size_t i = 0; i < count; ++i)
         {
-            const double difference = double{pRow[i + m_Plan.InputWidth]} - pRow[i];
+            const double difference = double{pRow[i + m_Plan.InputWidth]} - double{pRow[i]};
             pStep[i] = m_Plan.Turn == 0.0 ? difference : std::remainder(difference, m_Plan.Turn);
         }
     }

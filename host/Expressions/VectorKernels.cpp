@@ -14,7 +14,7 @@ double Length(const float* i_pRow, std::size_t i_Width)
 {
     double sum = 0.0;
     for (std::size_t i = 0; i < i_Width; ++i)
-        sum += double{i_pRow[i]} * i_pRow[i];
+        sum += double{i_pRow[i]} * double{i_pRow[i]};
     return std::sqrt(sum);
 }
 
@@ -28,8 +28,8 @@ double AngleBetween(const float* i_pA, const float* i_pB, std::size_t i_Width)
     double difference = 0.0;
     for (std::size_t i = 0; i < i_Width; ++i)
     {
-        const double a = i_pA[i] / lengthA;
-        const double b = i_pB[i] / lengthB;
+        const double a = double{i_pA[i]} / lengthA;
+        const double b = double{i_pB[i]} / lengthB;
         sum += (a + b) * (a + b);
         difference += (a - b) * (a - b);
     }
@@ -67,7 +67,7 @@ void ScaleRows(ConstRows i_Rows, std::size_t i_Count, std::span<const double> i_
 {
     for (std::size_t row = 0; row < i_Count; ++row)
         for (std::size_t i = 0; i < i_Factors.size(); ++i)
-            o_Rows[row][i] = static_cast<float>(i_Rows[row][i] * i_Factors[i]);
+            o_Rows[row][i] = static_cast<float>(double{i_Rows[row][i]} * i_Factors[i]);
 }
 
 void SubtractRows(ConstRows i_A, ConstRows i_B, std::size_t i_Count, std::size_t i_Width, Rows o_Rows)
@@ -98,7 +98,7 @@ void DotRows(ConstRows i_A, ConstRows i_B, std::size_t i_Count, std::size_t i_Wi
     {
         double sum = 0.0;
         for (std::size_t i = 0; i < i_Width; ++i)
-            sum += double{i_A[row][i]} * i_B[row][i];
+            sum += double{i_A[row][i]} * double{i_B[row][i]};
         *o_Rows[row] = static_cast<float>(sum);
     }
 }
