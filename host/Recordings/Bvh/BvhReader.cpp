@@ -264,7 +264,7 @@ private:
             if (m_Filled == m_Frame.size())
                 continue;
             double& rValue = m_Frame[m_Filled++];
-            m_Unreadable += ReadNumber(word, false, rValue) == ECell::Number ? 0 : 1;
+            m_Unreadable += ReadNumber(word, false, rValue) == ECell::Number ? 0u : 1u;
             if (i_bWrapped && m_Filled == m_Frame.size())
                 TakeFrame();
         }
@@ -273,7 +273,7 @@ private:
 
     void EndLine(std::size_t i_Words)
     {
-        m_UnequalLines += i_Words == m_Frame.size() ? 0 : 1;
+        m_UnequalLines += i_Words == m_Frame.size() ? 0u : 1u;
         m_Absent += m_Frame.size() - m_Filled;
         TakeFrame();
     }

@@ -22,7 +22,7 @@ std::size_t RecordedChannel::MissingCount() const
         {
             return std::isnan(i_Value);
         };
-        missing += std::any_of(first, first + static_cast<std::ptrdiff_t>(components), isMissing) ? 1 : 0;
+        missing += std::any_of(first, first + static_cast<std::ptrdiff_t>(components), isMissing) ? 1u : 0u;
     }
     return missing;
 }

@@ -130,7 +130,7 @@ bool HasCommonStep(const UsableRows& i_rRows)
     const double step = MedianStep(i_rRows.Times);
     std::size_t same = 0;
     for (std::size_t i = 1; i < i_rRows.Size(); ++i)
-        same += std::abs(i_rRows.Times[i] - i_rRows.Times[i - 1] - step) <= 1e-6 * step ? 1 : 0;
+        same += std::abs(i_rRows.Times[i] - i_rRows.Times[i - 1] - step) <= 1e-6 * step ? 1u : 0u;
     return same * 2 > i_rRows.Size() - 1;
 }
 
