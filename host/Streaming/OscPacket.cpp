@@ -40,7 +40,7 @@ float Load(const void* i_pArgument, std::size_t& io_rOutOfRange)
     T value{};
     std::memcpy(&value, i_pArgument, sizeof(T));
     const auto wide = static_cast<double>(value);
-    if (std::abs(wide) <= std::numeric_limits<float>::max())
+    if (std::abs(wide) <= double{std::numeric_limits<float>::max()})
         return static_cast<float>(wide);
     io_rOutOfRange += std::isnan(wide) ? 0 : 1;
     return std::numeric_limits<float>::quiet_NaN();

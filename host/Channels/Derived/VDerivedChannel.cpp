@@ -210,7 +210,7 @@ bool VDerivedChannel::MakeOperationLocked(std::vector<TQL::ComponentDescription>
     const bool bKnown = m_Operation.pOperation || !m_Operation.Error.empty();
     if (!bKnown || i_Descriptions != m_Descriptions || i_SecondsPerRow != m_SecondsPerRow)
     {
-        m_OwnRevision += bKnown && i_Descriptions != m_Descriptions ? 1 : 0;
+        m_OwnRevision += bKnown && i_Descriptions != m_Descriptions ? 1u : 0u;
         m_Operation = m_pTable->Make(m_Request, i_Descriptions, i_SecondsPerRow);
         m_Descriptions = std::move(i_Descriptions);
         m_SecondsPerRow = i_SecondsPerRow;

@@ -1,4 +1,4 @@
-#include "Studio/OpenGLCheck.h"
+#include "Studio/Commands/OpenGLCheck.h"
 
 #include <QtGui/QOffscreenSurface>
 #include <QtGui/QOpenGLContext>

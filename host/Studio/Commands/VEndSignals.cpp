@@ -1,4 +1,4 @@
-#include "Studio/VEndSignals.h"
+#include "Studio/Commands/VEndSignals.h"
 
 #include <QtCore/QSocketNotifier>
 #include <QtCore/QtGlobal>

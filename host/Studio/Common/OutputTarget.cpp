@@ -1,7 +1,7 @@
-#include "Studio/OutputTarget.h"
+#include "Studio/Common/OutputTarget.h"
 
 #include "Recordings/OpenRecording.h"
-#include "Studio/Paths.h"
+#include "Studio/Common/Paths.h"
 
 #include <system_error>
 

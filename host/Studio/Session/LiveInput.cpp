@@ -1,4 +1,4 @@
-#include "Studio/LiveInput.h"
+#include "Studio/Session/LiveInput.h"
 
 #include <cmath>
 

@@ -172,7 +172,7 @@ float VSimulatedFeed::CountSamples(std::size_t i_Row) const
         const auto row =
             std::span<const float>(rSource.Values).subspan(i_Row * rSource.ValuesPerFrame, rSource.ValuesPerFrame);
         for (std::size_t i = 0; i < row.size(); i += rSource.ValuesPerChannel)
-            count += std::isnan(row[i]) ? 0 : 1;
+            count += std::isnan(row[i]) ? 0u : 1u;
     }
     return static_cast<float>(count);
 }

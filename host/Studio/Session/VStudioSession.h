@@ -3,7 +3,7 @@
 #include "Recordings/Common/VRecording.h"
 #include "Services/VHostServices.h"
 #include "Streaming/VOscInput.h"
-#include "Studio/LiveInput.h"
+#include "Studio/Session/LiveInput.h"
 #include "TQL/IResult.h"
 
 #include <QtCore/QPointer>

@@ -1,7 +1,7 @@
-#include "Studio/VLiveLabel.h"
+#include "Studio/Transport/VLiveLabel.h"
 
-#include "Studio/VStudioSession.h"
-#include "Studio/VTransport.h"
+#include "Studio/Session/VStudioSession.h"
+#include "Studio/Transport/VTransport.h"
 
 #include <QtCore/QTimer>
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "Studio/LiveInput.h"
+#include "Studio/Session/LiveInput.h"
 
 #include <QtWidgets/QLabel>
 
