@@ -75,7 +75,7 @@ std::size_t VActiveChannelRows::FindPlace(const QString& i_rName) const
 void VActiveChannelRows::Insert(std::size_t i_Place, RowPointer i_pRow)
 {
     m_RowsById.insert_or_assign(i_pRow->pChannel->GetInstanceId(), i_pRow);
-    m_PinnedCount += i_pRow->bPinned ? 1 : 0;
+    m_PinnedCount += i_pRow->bPinned ? 1u : 0u;
     m_bNumbered = false;
     m_Rows.insert(m_Rows.begin() + static_cast<std::ptrdiff_t>(i_Place), std::move(i_pRow));
 }
@@ -87,7 +87,7 @@ void VActiveChannelRows::Erase(std::size_t i_First, std::size_t i_Count)
     for (auto row = first; row != last; ++row)
     {
         m_RowsById.erase((*row)->pChannel->GetInstanceId());
-        m_PinnedCount -= (*row)->bPinned ? 1 : 0;
+        m_PinnedCount -= (*row)->bPinned ? 1u : 0u;
     }
     m_Rows.erase(first, last);
     m_bNumbered = false;

@@ -123,7 +123,8 @@ RowRange VisibleRows(const ChannelDraw& i_rChannel, float i_Width, float i_Reach
         return {0, count};
 
     const double scale = i_rChannel.LodScale;
-    const double rounding = 4.0 * std::numeric_limits<float>::epsilon() * (std::abs(start) + length + count * scale);
+    const double rounding =
+        4.0 * double{std::numeric_limits<float>::epsilon()} * (std::abs(start) + length + count * scale);
     const double margin = static_cast<double>(i_Reach) * length / static_cast<double>(i_Width) + rounding;
     const double first = std::ceil((start - margin) / scale);
     const double end = std::floor((start + length + margin) / scale) + 1.0;

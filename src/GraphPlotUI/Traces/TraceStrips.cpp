@@ -61,7 +61,7 @@ RowRange VisibleStrips(const StripLayout& i_rLayout, const ChannelDraw& i_rChann
     const int count = static_cast<int>(i_rChannel.Info.SampleCount);
     if (count == 0)
         return {};
-    const double pixelsPerSample = static_cast<double>(i_ViewportWidth) / i_rChannel.AxisLength;
+    const double pixelsPerSample = static_cast<double>(i_ViewportWidth) / static_cast<double>(i_rChannel.AxisLength);
     const double left = -static_cast<double>(i_rChannel.AxisStart) * pixelsPerSample;
     const double right = left + (count - 1) * static_cast<double>(i_rChannel.LodScale) * pixelsPerSample;
     const auto strip = [&](double i_Pixel)
