@@ -61,6 +61,11 @@ function(graphplots_room name)
     else()
         add_library(${name} STATIC ${ROOM_SOURCES})
     endif()
+    if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU")
+        # Silent changes of a number, which clang and g++ see differently.
+        target_compile_options(${name} PRIVATE
+            -Wconversion -Wsign-conversion -Wdouble-promotion -Wduplicated-cond -Wlogical-op)
+    endif()
     target_include_directories(${name} PUBLIC "${door}")
     target_link_libraries(${name} PUBLIC ${below} ${ROOM_LINKS} PRIVATE GraphPlotsOptions ${ROOM_PRIVATE_LINKS})
     if(ROOM_QT)
