@@ -132,9 +132,8 @@ bool IsRecordingFile(const std::filesystem::path& i_rPath)
     std::string ignored;
     if (!std::filesystem::is_regular_file(i_rPath, error) || file.Open(i_rPath, ignored).IsError())
         return false;
-    return std::any_of(Readers.begin(), Readers.end(),
-                       [&](const Reader& i_rReader)
-                       { return i_rReader.pLooksLike && i_rReader.pLooksLike(file.GetBytes()); });
+    return std::ranges::any_of(GetFileFormats(), [&](const FileFormat& i_rFormat)
+                               { return i_rFormat.pLooksLike && i_rFormat.pLooksLike(file.GetBytes()); });
 }
 
 } // namespace Recordings

@@ -42,7 +42,7 @@ float Load(const void* i_pArgument, std::size_t& io_rOutOfRange)
     const auto wide = static_cast<double>(value);
     if (std::abs(wide) <= double{std::numeric_limits<float>::max()})
         return static_cast<float>(wide);
-    io_rOutOfRange += std::isnan(wide) ? 0 : 1;
+    io_rOutOfRange += std::isnan(wide) ? 0u : 1u;
     return std::numeric_limits<float>::quiet_NaN();
 }
 
