@@ -198,6 +198,29 @@ std::shared_ptr<TQL::IChannel> VChannelService::MakeCache(std::uint64_t i_Hash,
     return pChannel;
 }
 
+std::vector<std::shared_ptr<VCacheChannel>> VChannelService::FindCaches() const
+{
+    std::vector<std::shared_ptr<VCacheChannel>> caches;
+    const std::shared_lock lock(m_Mutex);
+    for (const auto& [rId, rpWeak] : m_Derived)
+        if (auto pCache = std::dynamic_pointer_cast<VCacheChannel>(rpWeak.lock()))
+            caches.push_back(std::move(pCache));
+    return caches;
+}
+
+bool VChannelService::IsReadEnough() const
+{
+    const auto caches = FindCaches();
+    return !caches.empty() &&
+           std::ranges::all_of(caches, [](const auto& i_rpCache) { return i_rpCache->IsReadEnough(); });
+}
+
+void VChannelService::ForgetReads()
+{
+    for (const auto& rpCache : FindCaches())
+        rpCache->ForgetReads();
+}
+
 std::shared_ptr<TQL::IChannel>
 VChannelService::MakeOrFind(std::string_view i_Operation, const OperationRequest& i_rRequest,
                             const ChannelSystem::VDerivedChannelParameters& i_rParameters,

@@ -16,6 +16,7 @@
 namespace Channels
 {
 
+class VCacheChannel;
 class VDerivedChannel;
 class VOperationTable;
 struct OperationRequest;
@@ -47,6 +48,12 @@ public:
     /// Channels of another type came into a context that is listed already.
     void NotifyTypesChanged() { m_pTypeListChanged->Invoke(); }
 
+    /// Whether the readers of all "Cache" channels, such as the plots of a window, have read what they want; false
+    /// while there is no such channel. What grows is never read enough. ForgetReads begins anew, for readers that were
+    /// told to show something else.
+    bool IsReadEnough() const;
+    void ForgetReads();
+
     // IChannelService
     std::shared_ptr<ChannelSystem::IChannelContext> GetContextByName(std::string_view i_Name) const override;
     std::shared_ptr<TQL::IChangeSignal> ContextListChanged() const override { return m_pContextListChanged; }
@@ -74,6 +81,7 @@ private:
                                               const ChannelSystem::VDerivedChannelParameters& i_rParameters,
                                               const std::vector<std::shared_ptr<TQL::IChannel>>& i_rInputs);
     bool IsLive(const TQL::IChannel& i_rChannel) const;
+    std::vector<std::shared_ptr<VCacheChannel>> FindCaches() const;
     void RememberLocked(const std::shared_ptr<TQL::IChannel>& i_rpChannel);
 
     const std::shared_ptr<VSubTypeTable> m_pSubTypes;

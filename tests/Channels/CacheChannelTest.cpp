@@ -197,6 +197,29 @@ TEST_F(CacheChannel, SharesTheStoreOfItsInputWhereNothingIsAltered)
     EXPECT_EQ(pOuter->GetOutput()->GetBlock()->GetShape().SummaryPeriods.size(), 1u) << "without SupportLodding";
 }
 
+TEST_F(CacheChannel, KnowsWhenItsReaderHasReadWhatItWants)
+{
+    AddFrames(100);
+    EXPECT_FALSE(m_Service.IsReadEnough()) << "nobody reads";
+    const auto pCache = MakeCache("Labelled Reconstructions", false, 0);
+    EXPECT_FALSE(m_Service.IsReadEnough()) << "nobody asked for data yet";
+    const auto look = [&](int i_Times)
+    {
+        for (TickRange range; i_Times > 0; --i_Times)
+            pCache->GetOutput()->GetBlock()->GetRange(range);
+    };
+    look(10);
+    EXPECT_FALSE(m_Service.IsReadEnough()) << "looked, and never read";
+    ReadSecond(*pCache);
+    EXPECT_FALSE(m_Service.IsReadEnough()) << "may read on";
+    look(4);
+    EXPECT_TRUE(m_Service.IsReadEnough());
+    m_Service.ForgetReads();
+    EXPECT_FALSE(m_Service.IsReadEnough()) << "was told to show something else";
+    look(4);
+    EXPECT_TRUE(m_Service.IsReadEnough());
+}
+
 TEST_F(CacheChannel, OutputIsStaleForEverAfterReplacement)
 {
     struct Case

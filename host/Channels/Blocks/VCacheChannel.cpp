@@ -56,6 +56,7 @@ std::shared_ptr<TQL::IChannelOutput> VCacheChannel::GetOutput() const
 {
     const auto pSelf = std::const_pointer_cast<VCacheChannel>(shared_from_this());
     const std::lock_guard lock(m_Mutex);
+    m_bAsked = true;
     if (!m_pOutput || m_pOutput->IsStale())
     {
         m_bLevels = m_pParameters->Get<bool>(LevelsParameter);
@@ -63,6 +64,25 @@ std::shared_ptr<TQL::IChannelOutput> VCacheChannel::GetOutput() const
         m_pOutput = MakeOutputLocked();
     }
     return VChannelOutput::HandOut(m_pOutput, pSelf);
+}
+
+std::shared_ptr<VSampleBlock> VCacheChannel::FindBlockLocked() const
+{
+    return m_pOutput ? std::dynamic_pointer_cast<VSampleBlock>(m_pOutput->GetBlock()) : nullptr;
+}
+
+bool VCacheChannel::IsReadEnough() const
+{
+    const std::lock_guard lock(m_Mutex);
+    const std::shared_ptr<VSampleBlock> pBlock = FindBlockLocked();
+    return m_bAsked && (!pBlock || pBlock->IsReadEnough());
+}
+
+void VCacheChannel::ForgetReads()
+{
+    const std::lock_guard lock(m_Mutex);
+    if (const std::shared_ptr<VSampleBlock> pBlock = FindBlockLocked())
+        pBlock->ForgetReads();
 }
 
 /// Null while the input has no data.

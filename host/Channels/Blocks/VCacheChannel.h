@@ -11,6 +11,7 @@ namespace Channels
 {
 
 struct BlockWindow;
+class VSampleBlock;
 
 /// The channel that keeps what a reader wants of its input: with summary levels ("SupportLodding"), with rotations made
 /// continuous ("EnableRotationUnwrapping"), at least the newest "CacheRangeTicks" ticks (0, or an input that does not
@@ -31,6 +32,10 @@ public:
     /// Has to be called once, when a shared pointer owns the channel.
     void ConnectParameters();
 
+    /// Whether the reader has read what it wants (see VSampleBlock::IsReadEnough). False before it asked for anything.
+    bool IsReadEnough() const;
+    void ForgetReads();
+
     // IChannel
     std::shared_ptr<TQL::IChannelParameters> GetParameters() const override { return m_pParameters; }
     void GetDependentChannels(std::vector<std::shared_ptr<TQL::IChannel>>& o_rChannels) const override;
@@ -42,6 +47,7 @@ public:
 private:
     void OnParameterChange();
     std::shared_ptr<VChannelOutput> MakeOutputLocked() const;
+    std::shared_ptr<VSampleBlock> FindBlockLocked() const;
 
     const TQL::IChannelInstanceId m_Id;
     const std::shared_ptr<TQL::IChannel> m_pInput;
@@ -51,6 +57,7 @@ private:
     mutable std::shared_ptr<VChannelOutput> m_pOutput; // guarded by m_Mutex
     mutable bool m_bLevels = false;                    // guarded by m_Mutex: as m_pOutput was made
     mutable bool m_bUnwrap = false;                    // guarded by m_Mutex: the same
+    mutable bool m_bAsked = false;                     // guarded by m_Mutex: for its output
 };
 
 } // namespace Channels

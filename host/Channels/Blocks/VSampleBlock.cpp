@@ -14,6 +14,7 @@ namespace
 
 constexpr std::uint32_t FloatSamples = 1; ///< the one format of samples in this host
 constexpr std::int64_t NoTick = std::numeric_limits<std::int64_t>::min();
+constexpr std::uint32_t LooksEnough = 4; ///< a reader may look twice before it reads
 
 } // namespace
 
@@ -58,6 +59,7 @@ void VSampleBlock::Follow() const
 void VSampleBlock::GetRange(TQL::TickRange& o_rRange) const
 {
     Follow();
+    m_LooksSinceRead.fetch_add(1, std::memory_order_relaxed);
     o_rRange = m_pSamples->GetRange();
     if (!m_pWindow)
         return;
@@ -65,6 +67,19 @@ void VSampleBlock::GetRange(TQL::TickRange& o_rRange) const
     if (window > 0 && window < o_rRange.Last - o_rRange.First)
         o_rRange.First = TQL::AlignDown(o_rRange.Last - window, m_Shape.SamplePeriod, m_Shape.GridOffset);
     m_ReportedFirst.store(o_rRange.First, std::memory_order_relaxed);
+}
+
+void VSampleBlock::NoteRead() const
+{
+    m_bWasRead.store(true, std::memory_order_relaxed);
+    m_LooksSinceRead.store(0, std::memory_order_relaxed);
+}
+
+bool VSampleBlock::IsReadEnough() const
+{
+    const TQL::TickRange range = m_pSamples->GetRange();
+    return m_LooksSinceRead.load(std::memory_order_relaxed) >= LooksEnough &&
+           (m_bWasRead.load(std::memory_order_relaxed) || range.First >= range.Last);
 }
 
 /// What lies before is not to be read.
@@ -82,12 +97,14 @@ std::int64_t VSampleBlock::Floor() const
 
 TQL::IResult VSampleBlock::ReadSamples(const TQL::TickRange& i_rRange, std::span<float> o_Samples, std::uint32_t) const
 {
+    NoteRead();
     return i_rRange.First < Floor() ? TQL::Result::InvalidArgument : m_pSamples->ReadSamples(i_rRange, o_Samples);
 }
 
 std::size_t VSampleBlock::ReadSummary(const TQL::TickRange& i_rRange, std::uint32_t i_Level,
                                       std::span<LodRecord> o_Records, std::uint32_t) const
 {
+    NoteRead();
     if (i_Level >= m_Shape.SummaryPeriods.size())
         return 0;
     return m_pSamples->ReadSummary(i_rRange, i_Level, o_Records, Floor());
@@ -96,6 +113,7 @@ std::size_t VSampleBlock::ReadSummary(const TQL::TickRange& i_rRange, std::uint3
 TQL::IResult VSampleBlock::ReadComponent(const TQL::TickRange& i_rRange, std::span<float> o_Samples,
                                          std::uint32_t i_Component, std::uint32_t) const
 {
+    NoteRead();
     if (i_rRange.First < Floor())
         return TQL::Result::InvalidArgument;
     return m_pSamples->ReadComponent(i_rRange, o_Samples, i_Component);
@@ -103,6 +121,7 @@ TQL::IResult VSampleBlock::ReadComponent(const TQL::TickRange& i_rRange, std::sp
 
 TQL::IResult VSampleBlock::Summarise(const TQL::TickRange& i_rRange, std::span<LodRecord> o_Records) const
 {
+    NoteRead();
     return m_pSamples->Summarise(i_rRange, o_Records, Floor());
 }
 

@@ -45,6 +45,11 @@ public:
     std::shared_ptr<VCacheFeed> GetContinuous(const RotationPart& i_rRotation);
     bool ShowsAll() const { return m_pWindow == nullptr; }
 
+    /// Whether a reader that looks again and again has read what it wants: there is nothing, or it has read, and then
+    /// looked at the range some times without reading more. Since ForgetReads, if that was called.
+    bool IsReadEnough() const;
+    void ForgetReads() { m_LooksSinceRead.store(0, std::memory_order_relaxed); }
+
     // IChannelBlock
     const ChannelSystem::ChannelBlockShape& GetShape() const override { return m_Shape; }
     const std::shared_ptr<ChannelSystem::IChannelStore>& GetStore() const override { return m_pStore; }
@@ -59,6 +64,7 @@ public:
 
 private:
     void Follow() const;
+    void NoteRead() const;
     std::int64_t Floor() const;
 
     const std::shared_ptr<VSampleStore> m_pSamples;
@@ -68,6 +74,8 @@ private:
     const EFollow m_Follow;
     ChannelSystem::ChannelBlockShape m_Shape;
     mutable std::atomic<std::int64_t> m_ReportedFirst;
+    mutable std::atomic<std::uint32_t> m_LooksSinceRead{0};
+    mutable std::atomic<bool> m_bWasRead{false};
     std::mutex m_Mutex;
     std::weak_ptr<VCacheFeed> m_pContinuous; // guarded by m_Mutex
 };

@@ -353,7 +353,7 @@ std::string HelpText()
            "  --size WxH         of the picture, in pixels\n"
            "  --range A:B        the time axis, in frames\n"
            "  --values A:B       the value axes, in the units of the channels\n"
-           "  --after MS         how long to wait before the picture is taken\n"
+           "  --after MS         how long to wait at most for the data to be drawn; of live data, until the picture\n"
            "  --osc PORT         listens for Open Sound Control messages from this machine; with an address of this\n"
            "                     machine before it (0.0.0.0: all) also from others\n"
            "  --osc-rate HZ      the rate at which they come (default: measured on the first ones)\n"

@@ -18,6 +18,7 @@
 #include <QtQml/QQmlError>
 #include <QtQuickWidgets/QQuickWidget>
 
+#include <algorithm>
 #include <chrono>
 #include <filesystem>
 #include <functional>
@@ -31,7 +32,9 @@ namespace
 using Milliseconds = std::chrono::milliseconds;
 
 constexpr Milliseconds patience{20'000};    // for the window to have data
-constexpr Milliseconds settleRecorded{300}; // for a picture of it after that
+constexpr Milliseconds longestFill{60'000}; // for all of a recording's samples to be in the traces
+constexpr Milliseconds shortestFill{2'000}; // however short the operator's patience
+constexpr int turnsToDraw = 20;             // of 10 ms and more
 constexpr Milliseconds settleLive{1'500};
 constexpr std::int64_t liveHistory = 1200; // frames: a live window shows the last ten seconds
 constexpr std::pair<int, int> usualSize{1280, 720};
@@ -162,9 +165,33 @@ private:
             return Fail("the module does not let its time range be set; leave --range out");
         if (m_rCommandLine.Values && SetValueRange(*m_pQuickWidget, point(*m_rCommandLine.Values)).IsError())
             return Fail("the module does not let its value range be set; leave --values out");
-        const Milliseconds usual = m_rCommandLine.bLive ? settleLive : settleRecorded;
-        WaitAlways(m_rCommandLine.AfterMilliseconds ? Milliseconds(*m_rCommandLine.AfterMilliseconds) : usual);
-        return m_SceneError.empty() || Fail("no picture without OpenGL: " + m_SceneError);
+        const bool bWhole = m_rCommandLine.bLive ? WaitLive() : WaitUntilFilled();
+        if (!m_SceneError.empty())
+            return Fail("no picture without OpenGL: " + m_SceneError);
+        return bWhole || Fail("the window had not read all of its traces in time; try again with a longer --after");
+    }
+
+    bool WaitLive()
+    {
+        WaitAlways(m_rCommandLine.AfterMilliseconds ? Milliseconds(*m_rCommandLine.AfterMilliseconds) : settleLive);
+        return true;
+    }
+
+    /// Until every trace that has data is filled and drawn; at the latest when the operator's patience ends.
+    bool WaitUntilFilled()
+    {
+        const Milliseconds longest =
+            m_rCommandLine.AfterMilliseconds ? Milliseconds(*m_rCommandLine.AfterMilliseconds) : longestFill;
+        Channels::VChannelService& rChannels = m_rSession.Channels();
+        rChannels.ForgetReads();
+        // Rows that were read are drawn by one of the next turns of the scene's clock.
+        int turns = 0;
+        return WaitFor(std::max(longest, shortestFill),
+                       [&]
+                       {
+                           turns = rChannels.IsReadEnough() ? turns + 1 : 0;
+                           return turns > turnsToDraw;
+                       });
     }
 
     bool Save()
