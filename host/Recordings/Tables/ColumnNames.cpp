@@ -218,7 +218,9 @@ void GroupColumns(const std::vector<ColumnHead>& i_rHeads, std::size_t i_TimeCol
     o_rColumns.assign(i_rHeads.size(), {});
     for (std::size_t column = 0; column < i_rHeads.size();)
     {
-        if (column == i_TimeColumn)
+        const bool bFrames =
+            column == 0 && i_TimeColumn != TableColumn::Nothing && Contains(FrameWords, BareName(i_rHeads[0]));
+        if (column == i_TimeColumn || bFrames)
         {
             ++column;
             continue;

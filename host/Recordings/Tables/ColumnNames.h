@@ -49,8 +49,8 @@ bool CountsRows(const ColumnHead& i_rHead);
 
 /// Groups columns to channels: three neighbours NAME.X, NAME.Y, NAME.Z (or with '_', in small letters) are a marker if
 /// their unit is a length, or if they have none and the name is not that of another quantity or of a quaternion;
-/// NAME.RX to NAME.TZ are a pose; all others are columns. i_TimeColumn feeds nothing. The channels get names that
-/// differ, components, units and subjects.
+/// NAME.RX to NAME.TZ are a pose; all others are columns. i_TimeColumn feeds nothing, nor does a
+/// first column of frame numbers beside it. The channels get names that differ, components, units and subjects.
 void GroupColumns(const std::vector<ColumnHead>& i_rHeads, std::size_t i_TimeColumn,
                   std::vector<TableColumn>& o_rColumns, std::vector<RecordedChannel>& o_rChannels);
 
