@@ -447,7 +447,9 @@ TEST_F(FboItemTest, ATickAsksForAFrameWhereOneWouldShowSomethingElse)
         rCase.Change();
         EXPECT_EQ(tick(), rCase.bDrawn) << rCase.pName;
         if (rCase.bDrawn)
+        {
             EXPECT_FALSE(tick()) << rCase.pName << ", and then nothing";
+        }
     }
 }
 

@@ -139,8 +139,8 @@ TEST_F(Following, EachSubplotTellsWhatIsInIt)
     Choose("d2 mag");
     Settle();
     EXPECT_EQ(Subplots(), "Acceleration Between (Magnitude) (mm/s<sup>2</sup>): "
-                          "Acceleration Between (Magnitude) - Anna:LASI ➞ Anna:RASI#0\n");
-    EXPECT_EQ(ToolTip(0), "<b>Channels:</b><br>Acceleration Between (Magnitude) - Anna:LASI ➞ Anna:RASI<br>"
+                          "Acceleration Between (Magnitude) - Anna:LASI (reference) ➞ Anna:RASI#0\n");
+    EXPECT_EQ(ToolTip(0), "<b>Channels:</b><br>Acceleration Between (Magnitude) - Anna:LASI (reference) ➞ Anna:RASI<br>"
                           "<b>Units:</b><br>mm/s<sup>2</sup><br><b>Data contexts:</b><br>Take");
 }
 
@@ -183,12 +183,12 @@ TEST_F(Following, TakesItsStateBack)
     PickType("_DifferenceBetween");
     Choose("d1 cm rad f4");
     pSystem->GetSubplotManager()->SetSubplotLayoutMode(SingleSubplot);
-    SwitchComponent("Velocity Between - Anna:LASI ➞ Anna:RASI", 2, false);
-    Pin("Velocity Between - Anna:LASI ➞ Anna:RASI");
+    SwitchComponent("Velocity Between - Anna:LASI (reference) ➞ Anna:RASI", 2, false);
+    Pin("Velocity Between - Anna:LASI (reference) ➞ Anna:RASI");
     Settle();
     const std::string seen = Subplots();
-    EXPECT_EQ(seen, ": Velocity Between - Anna:LASI ➞ Anna:RASI : TX#0, "
-                    "Velocity Between - Anna:LASI ➞ Anna:RASI : TY#1\n");
+    EXPECT_EQ(seen, ": Velocity Between - Anna:LASI (reference) ➞ Anna:RASI : TX#0, "
+                    "Velocity Between - Anna:LASI (reference) ➞ Anna:RASI : TY#1\n");
     const GraphPlotState state = SaveState();
 
     EXPECT_EQ(ApplyState(GraphPlotState()), TQL::Result::Ok);

@@ -92,7 +92,7 @@ TEST_F(Names, OfRotationsInEveryFormat)
         {"Anna:Pelvis", Auto, "d1 f4", "Pose 1st Derivative - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | °/s[3] mm/s[3]"},
         {"Anna:Pelvis", Auto, "d2 frame rad",
          "Pose 2nd Derivative - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | rad/frame^2[3] mm/frame^2[3] | "
-         "rad/frame<sup>2</sup>[3] mm/frame<sup>2</sup>[3]"},
+         "rad/frame<sup>2</sup> mm/frame<sup>2</sup>"},
         {"Anna:Pelvis", "SubjectSegmentPose", "", "Pose (Helical) - Anna:Pelvis | RX,RY,RZ,TX,TY,TZ | °[3] mm[3]"},
         {"Knee", Auto, "", "Joint Angles (Helical) - Knee | RX,RY,RZ | °[3]"},
         {"Knee", Auto, "f1 rad", "Joint Angles (Axis and Angle) - Knee | X,Y,Z,A | [3] rad"},

@@ -262,6 +262,7 @@ TEST_F(TimeControllerTest, TellsOfSourcesAndOfTheModeOfTheCurrentOne)
                                                { names += i_rName + " "; });
     };
     AddReview("Jump", 0, 1)->StateChanged()->Add([pOwned = std::shared_ptr<void>(nullptr, note)] {}, nullptr);
+    m_pUi->RunAll(); // what is posted for a source keeps it
     note(nullptr);
     EXPECT_EQ(names, "Jump Live ");
     EXPECT_TRUE(m_pController->RemoveSource("Jump"));
