@@ -135,7 +135,11 @@ TEST(LogModel, KeepsTheNewestOfManyThreads)
     TestSupport::LogGuard guard;
     constexpr int limit = 50;
     Studio::VLogModel model(limit);
+    Studio::VSeverityFilter filter;
+    filter.setSourceModel(&model);
+    filter.SetMostDetail(static_cast<int>(TQL::ELogSeverity::Error));
     const QAbstractItemModelTester tester(&model, FailureMode::Fatal);
+    const QAbstractItemModelTester filterTester(&filter, FailureMode::Fatal);
     std::vector<std::thread> threads;
     for (int thread = 0; thread < 4; ++thread)
         threads.emplace_back(
@@ -155,6 +159,7 @@ TEST(LogModel, KeepsTheNewestOfManyThreads)
     EXPECT_EQ(model.rowCount(), limit);
     EXPECT_EQ(model.index(limit - 1, 3).data().toString(), "late 29");
     EXPECT_EQ(model.index(limit - 31, 3).data().toString(), "burst");
+    EXPECT_EQ(filter.rowCount(), 30);
 
     // What waits when the model goes must not find it.
     {
