@@ -1,6 +1,8 @@
 #pragma once
 
+#ifndef Q_MOC_RUN // which stumbles over what this includes of the standard library
 #include "TQL/Log.h"
+#endif
 
 #include <QtCore/QAbstractTableModel>
 #include <QtCore/QDateTime>
