@@ -122,19 +122,21 @@ public:
 private:
     void CountFrame()
     {
-        if (++m_Drawn == m_Wanted)
-            QMetaObject::invokeMethod(
-                this, [this] { Look(); }, Qt::QueuedConnection); // not while it draws
+        ++m_Drawn;
+        QMetaObject::invokeMethod(
+            this, [this] { Look(); }, Qt::QueuedConnection); // not while it draws
     }
 
     void Look()
     {
-        if (m_rScene.quickWindow()->rendererInterface()->graphicsApi() != QSGRendererInterface::OpenGL)
+        if (m_Drawn < m_Wanted)
+            m_rScene.quickWindow()->update(); // a plot draws no frame that would show the same again
+        else if (m_rScene.quickWindow()->rendererInterface()->graphicsApi() != QSGRendererInterface::OpenGL)
             End("this display offers no OpenGL");
         else if (ShowsTrace(m_rScene.grabFramebuffer()))
             End({});
         else
-            m_Wanted = m_Drawn + 1; // the data may come a few frames later than the window
+            m_rScene.quickWindow()->update(); // the data may come a few frames later than the window
     }
 
     void End(const QString& i_rProblem)
@@ -144,7 +146,7 @@ private:
     }
 
     QQuickWidget& m_rScene;
-    int m_Wanted;
+    const int m_Wanted;
     int m_Drawn = 0;
     QString m_Problem;
 };
