@@ -1,5 +1,6 @@
 #include <gtest/gtest.h>
 
+#include <QtCore/QDir>
 #include <QtCore/QFile>
 #include <QtCore/QJsonArray>
 #include <QtCore/QJsonDocument>
@@ -196,6 +197,7 @@ TEST_F(StudioProgram, SignalsEndARecordingAndSaveIt)
         const quint16 listen = port.localPort();
         port.close();
         QProcess process;
+        process.setReadChannel(QProcess::StandardError);
         process.start(QStringLiteral(STUDIO_PROGRAM),
                       {"record", "--osc", QString::number(listen), "--osc-rate", "100", "--seconds", "600", out});
         QByteArray said;
@@ -203,9 +205,18 @@ TEST_F(StudioProgram, SignalsEndARecordingAndSaveIt)
             said += process.readAllStandardError();
         ASSERT_TRUE(said.contains("Listening")) << said.toStdString();
         const QByteArray packet("/a\0\0,f\0\0\x3f\x80\0\0", 12);
-        for (int i = 0; i < 10; ++i)
+        const auto recorded = [this]
+        {
+            const QFileInfoList growing = QDir(Path("")).entryInfoList({".recording-*"}, QDir::Files | QDir::Hidden);
+            return growing.isEmpty() ? 0 : growing.front().size();
+        };
+        const qint64 before = recorded();
+        const auto sendUntilRecorded = [&]
+        {
             port.writeDatagram(packet, QHostAddress(QHostAddress::LocalHost), listen);
-        QTest::qWait(300); // for the other process to read them
+            return recorded() > before;
+        };
+        ASSERT_TRUE(QTest::qWaitFor(sendUntilRecorded, 60'000)) << number;
         ::kill(static_cast<pid_t>(process.processId()), number);
         ASSERT_TRUE(process.waitForFinished(60'000));
         EXPECT_EQ(process.exitStatus(), QProcess::NormalExit) << number;
