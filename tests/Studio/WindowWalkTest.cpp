@@ -157,6 +157,17 @@ protected:
 
     QList<QMdiSubWindow*> Plots() const { return Find<QMdiArea>("plots")->subWindowList(); }
 
+    /// Whether something coloured is drawn left of the key: a trace.
+    static bool ShowsTrace(QQuickWidget& i_rQuick)
+    {
+        const QImage picture = i_rQuick.grabFramebuffer();
+        int coloured = 0;
+        for (int x = 0; x < picture.width() * 6 / 10; ++x)
+            for (int y = 0; y < picture.height(); ++y)
+                coloured += picture.pixelColor(x, y).saturation() > 150 ? 1 : 0;
+        return coloured > 50;
+    }
+
     bool AllPlotsHaveData() const
     {
         const auto plots = m_pWindow->findChildren<Studio::VPlotFrame*>();
@@ -164,7 +175,7 @@ protected:
                                    [](const Studio::VPlotFrame* i_pFrame)
                                    {
                                        QQuickWidget* pQuick = Studio::FindQuickWidget(*i_pFrame->Content());
-                                       return pQuick && Studio::HasTraceData(*pQuick);
+                                       return pQuick && Studio::HasTraceData(*pQuick) && ShowsTrace(*pQuick);
                                    });
     }
 

@@ -92,12 +92,13 @@ VGraphPlotFBO::Contents VGraphPlotFBO::FindContents() const
 
 bool VGraphPlotFBO::IsSeen() const
 {
-    if (!isVisible() || window() == nullptr || !window()->isVisible())
+    if (!isVisible() || window() == nullptr)
         return false;
-    // The scene of a widget has a window of its own that is never on the screen; the widget's window is.
+    // The scene of a widget has a window of its own that is never on the screen, and does not always know whether the
+    // widget is shown. The widget's window is on the screen; a widget that is hidden in it draws nothing by itself.
     const QWindow* pOuter = QQuickRenderControl::renderWindowFor(window());
     const QWindow* pWindow = pOuter != nullptr ? pOuter : window();
-    return pWindow->isExposed() && !pWindow->windowStates().testFlag(Qt::WindowMinimized);
+    return pWindow->isVisible() && pWindow->isExposed() && !pWindow->windowStates().testFlag(Qt::WindowMinimized);
 }
 
 QSGNode* VGraphPlotFBO::updatePaintNode(QSGNode* i_pNode, UpdatePaintNodeData* i_pData)
