@@ -55,8 +55,8 @@ C3dLayout ShapeOfHeader(const C3dHeader& i_rHeader, C3dLayout i_Layout)
 {
     i_Layout.Points = i_rHeader.Points;
     i_Layout.AnalogSamplesPerFrame = i_rHeader.AnalogSamplesPerFrame;
-    i_Layout.AnalogChannels =
-        i_rHeader.AnalogSamplesPerFrame == 0 ? 0 : i_rHeader.AnalogPerFrame / i_rHeader.AnalogSamplesPerFrame;
+    const std::size_t perFrame = i_rHeader.AnalogPerFrame;
+    i_Layout.AnalogChannels = i_rHeader.AnalogSamplesPerFrame == 0 ? 0 : perFrame / i_rHeader.AnalogSamplesPerFrame;
     return i_Layout;
 }
 
