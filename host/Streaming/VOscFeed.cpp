@@ -74,6 +74,7 @@ TQL::IResult VOscFeed::AddChannels(const std::vector<OscChannel>& i_rChannels)
         else
         {
             definition.TypeName = Channels::ModelOutputType;
+            definition.TypeText = Channels::ColumnText;
             definition.First = m_ColumnCount++;
             definition.Text = rChannel.Name.Name;
             definition.ComponentNames = ComponentNamesOfColumn(rChannel.Components);

@@ -47,7 +47,7 @@ QLabel* MakeTimeLabel(const char* i_pName, const QString& i_rToolTip, const QStr
     pLabel->setToolTip(i_rToolTip);
     pLabel->setAccessibleName(i_rToolTip);
     pLabel->setAlignment(Qt::AlignRight | Qt::AlignVCenter);
-    pLabel->setMinimumWidth(pLabel->fontMetrics().horizontalAdvance(i_rWidest));
+    pLabel->setMinimumWidth(pLabel->fontMetrics().horizontalAdvance(i_rWidest + QStringLiteral("  ")));
     return pLabel;
 }
 

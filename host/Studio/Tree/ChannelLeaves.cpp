@@ -79,9 +79,9 @@ QStringList Texts(const std::vector<std::string>& i_rTexts)
 /// What plots call by another name than that of the type stands under that name here too.
 QString BranchOf(const SelectableThing& i_rThing)
 {
-    if (i_rThing.TypeText == "Column")
+    if (i_rThing.TypeText == Channels::ColumnText)
         return QCoreApplication::translate("ChannelTree", "Columns");
-    if (i_rThing.TypeText == "Joint Angles")
+    if (i_rThing.TypeText == Channels::JointAnglesText)
         return QCoreApplication::translate("ChannelTree", "Joint angles");
     static constexpr struct
     {
