@@ -180,8 +180,8 @@ void VStore::PostInTurn(const CommitNotices& i_rNotices, VFirstFault& io_rFault)
         std::unique_lock lock(m_PostMutex);
         m_TurnMoved.wait(lock, [&] { return m_Posted + 1 == i_rNotices.Turn; });
     }
-    for (const auto& [rpHandler, what] : i_rNotices.List)
-        RunGuarded([&] { rpHandler->Post(what, i_rNotices.Commit, io_rFault); }, io_rFault);
+    for (const auto& rNotice : i_rNotices.List)
+        RunGuarded([&] { rNotice.first->Post(rNotice.second, i_rNotices.Commit, io_rFault); }, io_rFault);
     {
         const std::lock_guard lock(m_PostMutex);
         m_Posted = i_rNotices.Turn;
